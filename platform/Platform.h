@@ -1,0 +1,71 @@
+#pragma once
+
+#include "platform/base/Runtime.h"
+#include "platform/base/Url.h"
+
+#include <functional>
+#include <memory>
+#include <optional>
+#include <string>
+
+namespace platform {
+
+class CloudAccountService;
+class CloudDocumentService;
+class CloudService;
+class DirectoryWatcher;
+class FileProgressSubscription;
+class JotService;
+class NotifyService;
+class PreferencesStore;
+class StandardPreferences;
+
+/// What a platform is put together from. Empty slots get the real thing.
+struct PlatformParts {
+    std::unique_ptr<Clock> clock;
+    std::optional<Folders> folders;
+    std::unique_ptr<JotService> jot;
+    std::unique_ptr<NotifyService> notify;
+    std::unique_ptr<PreferencesStore> preferences;
+    /// Where an administrator's settings lie.
+    std::string managedSettingsFile = "/etc/tavrin/managed-settings.json";
+    /// Answers whether a file exists, for marker files outside the user's folders.
+    std::function<bool(const std::string& path)> markerExists;
+};
+
+/// The one global: the services that the product runs on. The process entry installs the real one,
+/// a test one on a temporary folder with a manual clock. Made and destroyed on the main thread.
+class Platform {
+public:
+    explicit Platform(PlatformParts parts = {});
+    ~Platform();
+    Platform(const Platform&) = delete;
+    Platform& operator=(const Platform&) = delete;
+
+    static Platform& current();
+    static bool installed();
+
+    Runtime& runtime();
+    Clock& clock() { return runtime().clock; }
+    MainQueue& mainQueue() { return runtime().mainQueue; }
+    NotificationCenter& notifications() { return runtime().notifications; }
+    JotService& jot();
+    NotifyService& notify();
+    PreferencesStore& preferences();
+    StandardPreferences& standardPreferences();
+    DirectoryWatcher& directoryWatcher();
+    FileProgressSubscription& fileProgress();
+    CloudService& cloud();
+    CloudAccountService& accounts();
+    CloudDocumentService& documents();
+
+    /// The data container of an application: a folder of its own in the user's data folder.
+    std::optional<Url> dataContainerURL(std::string_view application) const;
+    bool markerExists(const std::string& path) const;
+
+private:
+    struct State;
+    std::unique_ptr<State> state_;
+};
+
+} // namespace platform

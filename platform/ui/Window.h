@@ -1,0 +1,52 @@
+#pragma once
+
+#include "platform/ui/ViewController.h"
+
+namespace platform {
+
+/// The text and the states that the strip at the top of the window shows.
+struct StatusStripContent {
+    std::string account;
+    std::string network;
+    bool activity = false;
+    bool operator==(const StatusStripContent&) const = default;
+};
+
+/// The program's window: a status strip above its root screen, overlays above both, one solver for
+/// the constraints of its whole tree.
+class Window {
+public:
+    explicit Window(Rect frame);
+    ~Window();
+    Window(const Window&) = delete;
+    Window& operator=(const Window&) = delete;
+
+    void setRootViewController(std::shared_ptr<ViewController> root);
+    std::shared_ptr<ViewController> rootViewController() const;
+    void setBackgroundColor(Color color);
+    void makeKeyAndVisible();
+    bool isVisible() const;
+    void close();
+
+    Size size() const;
+    /// As a user's resize or rotation does.
+    void resize(Size size);
+    TraitCollection traitCollection() const;
+    Orientation orientation() const;
+    Rect statusBarFrame() const;
+    void setStatusStrip(const StatusStripContent& content);
+    const StatusStripContent& statusStrip() const;
+
+    /// Lays everything out now; true when something was dirty.
+    bool layoutIfNeeded();
+    /// The window as a PNG, at `scale` pixels a point.
+    Bytes snapshotPng(double scale = 1) const;
+
+    struct Impl;
+    Impl& impl() const { return *impl_; }
+
+private:
+    std::unique_ptr<Impl> impl_;
+};
+
+} // namespace platform
