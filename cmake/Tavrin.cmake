@@ -1,11 +1,14 @@
 # How every target of the project is compiled. One interface target, linked by tavrin_library() and
 # tavrin_program(), carries the warnings, the sanitizers and the paths, so no folder repeats them.
+file(RELATIVE_PATH TAVRIN_RELATIVE_ROOT "${CMAKE_BINARY_DIR}" "${CMAKE_SOURCE_DIR}")
+string(REGEX REPLACE "/$" "" TAVRIN_RELATIVE_ROOT "${TAVRIN_RELATIVE_ROOT}")
 add_library(tavrin_flags INTERFACE)
 target_include_directories(tavrin_flags INTERFACE "${CMAKE_SOURCE_DIR}")
 target_compile_options(tavrin_flags INTERFACE
   -Wall -Wextra -Wshadow -Wconversion -Wnon-virtual-dtor -Woverloaded-virtual
-  # A log record names its source file; the path starts at the root of the project.
-  "-fmacro-prefix-map=${CMAKE_SOURCE_DIR}/=")
+  # A log record names its source file; the path starts at the root of the project, also when a
+  # compiler cache hands the compiler relative paths.
+  "-fmacro-prefix-map=${CMAKE_SOURCE_DIR}/=" "-fmacro-prefix-map=${TAVRIN_RELATIVE_ROOT}/=")
 target_compile_definitions(tavrin_flags INTERFACE QT_NO_KEYWORDS QT_NO_CAST_FROM_ASCII
   QT_NO_CAST_TO_ASCII)
 if(TAVRIN_WERROR)

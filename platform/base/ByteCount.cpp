@@ -16,12 +16,8 @@ struct Unit {
     int decimals;
 };
 
-constexpr std::array<Unit, 6> units = {{{"%@ KB", 0},
-                                        {"%@ MB", 1},
-                                        {"%@ GB", 2},
-                                        {"%@ TB", 2},
-                                        {"%@ PB", 2},
-                                        {"%@ EB", 2}}};
+constexpr std::array<Unit, 6> units = {
+    {{"%@ KB", 0}, {"%@ MB", 1}, {"%@ GB", 2}, {"%@ TB", 2}, {"%@ PB", 2}, {"%@ EB", 2}}};
 
 double rounded(double number, int decimals) {
     const double scale = std::pow(10.0, decimals);
@@ -50,14 +46,15 @@ std::string byteCountText(std::uint64_t bytes, ByteCountStyle style, bool withUn
 
 double localizedNumberValue(std::string_view text) {
     bool ok = false;
-    const double number =
-        QLocale().toDouble(QString::fromUtf8(text.data(), static_cast<qsizetype>(text.size())), &ok);
+    const double number = QLocale().toDouble(
+        QString::fromUtf8(text.data(), static_cast<qsizetype>(text.size())), &ok);
     return ok ? number : 0;
 }
 
 std::string localizedNumberText(double number, int decimals) {
     int needed = 0;
-    while (needed < decimals && std::fabs(rounded(number, needed) - rounded(number, decimals)) > 1e-9)
+    while (needed < decimals &&
+           std::fabs(rounded(number, needed) - rounded(number, decimals)) > 1e-9)
         ++needed;
     return QLocale().toString(number, 'f', needed).toStdString();
 }

@@ -29,7 +29,8 @@ QString dayText(const QDateTime& moment, DateStyle style) {
     case DateStyle::medium:
         return locale.toString(moment.date(), patternWithoutWeekday(locale, QStringLiteral("MMM")));
     case DateStyle::longStyle:
-        return locale.toString(moment.date(), patternWithoutWeekday(locale, QStringLiteral("MMMM")));
+        return locale.toString(moment.date(),
+                               patternWithoutWeekday(locale, QStringLiteral("MMMM")));
     case DateStyle::full:
         return locale.toString(moment.date(), QLocale::LongFormat);
     }

@@ -15,43 +15,45 @@ void describe(std::string& out, double number);
 
 /// Types that say of themselves how "%@" writes them, by an `appendDescription(std::string&, T)`
 /// found by argument-dependent look-up.
-template <class T>
-concept SelfDescribing = requires(std::string& out, const T& value) { appendDescription(out, value); };
+template<class T>
+concept SelfDescribing = requires(std::string& out, const T& value) {
+    appendDescription(out, value);
+};
 
-template <class T>
+template<class T>
 concept TextLike = std::convertible_to<const T&, std::string_view>;
 
-template <class T>
+template<class T>
 concept PairLike = requires(const T& pair) {
     pair.first;
     pair.second;
 };
 
-template <class T>
+template<class T>
 concept RangeLike = !TextLike<T> && requires(const T& range) {
     range.begin();
     range.end();
 };
 
-template <class T>
+template<class T>
 struct IsOptional : std::false_type {};
-template <class T>
+template<class T>
 struct IsOptional<std::optional<T>> : std::true_type {};
 
-template <class T>
+template<class T>
 concept PointerLike = !TextLike<T> && (std::is_pointer_v<T> || requires(const T& p) {
     p.get();
     *p;
 });
 
 /// Anything "%@" can write.
-template <class T>
+template<class T>
 concept Describable = SelfDescribing<T> || TextLike<T> || std::is_arithmetic_v<T> ||
-                      IsOptional<T>::value || RangeLike<T> || PairLike<T> || PointerLike<T>;
+    IsOptional<T>::value || RangeLike<T> || PairLike<T> || PointerLike<T>;
 
 /// Appends what "%@" writes for the value: text as it is, numbers in decimal, booleans as 0 and 1,
 /// "(null)" for none, the elements of a range in brackets.
-template <Describable T>
+template<Describable T>
 void describe(std::string& out, const T& value) {
     if constexpr (SelfDescribing<T>) {
         appendDescription(out, value);
@@ -87,7 +89,7 @@ void describe(std::string& out, const T& value) {
     }
 }
 
-template <Describable T>
+template<Describable T>
 std::string description(const T& value) {
     std::string out;
     describe(out, value);

@@ -32,7 +32,8 @@ const char* textKey(ErrorCode code) {
     case ErrorCode::folderNotEmpty:
         return "The folder “%1$@” is not empty.";
     case ErrorCode::outOfSpace:
-        return "There is not enough free space on the disk for “%1$@”. Free some space and try again.";
+        return "There is not enough free space on the disk for “%1$@”. Free some space and try "
+               "again.";
     case ErrorCode::readOnlyVolume:
         return "“%1$@” cannot be changed because its disk is read-only.";
     case ErrorCode::userCancelled:
@@ -58,7 +59,8 @@ const char* textKey(ErrorCode code) {
     case ErrorCode::quotaExceeded:
         return "There is no space left in your Pelmora account. Delete something to make room.";
     case ErrorCode::databaseFromLaterVersion:
-        return "The store was used by a later version of this program. Update the program to open it.";
+        return "The store was used by a later version of this program. Update the program to open "
+               "it.";
     case ErrorCode::databaseUnusable:
         return "The store's records cannot be opened.";
     }

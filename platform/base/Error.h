@@ -62,7 +62,8 @@ struct Error {
 Error makeError(ErrorCode code, std::string_view subject = {});
 /// An error of the general domain with a description of its own.
 Error makeErrorWithText(ErrorCode code, std::string description);
-/// Translates an errno of an operation on `url`; `writing` chooses between "read" and "write" codes.
+/// Translates an errno of an operation on `url`; `writing` chooses between "read" and "write"
+/// codes.
 Error posixError(int number, const Url& url, bool writing);
 
 /// "domain (code): description", for logs.

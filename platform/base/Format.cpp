@@ -14,7 +14,7 @@ void appendReal(std::string& out, double number, std::chars_format shape, int pr
         out.append(buffer.data(), end);
 }
 
-template <class Integer>
+template<class Integer>
 void appendInteger(std::string& out, Integer number, int base) {
     std::array<char, 72> buffer{};
     const auto [end, fault] =
@@ -54,8 +54,7 @@ void appendArgument(std::string& out, char conversion, const FormatArgument& arg
 
 void describe(std::string& out, double number) {
     std::array<char, 64> buffer{};
-    const auto [end, fault] =
-        std::to_chars(buffer.data(), buffer.data() + buffer.size(), number);
+    const auto [end, fault] = std::to_chars(buffer.data(), buffer.data() + buffer.size(), number);
     if (fault == std::errc())
         out.append(buffer.data(), end);
 }

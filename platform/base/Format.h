@@ -16,7 +16,7 @@ namespace platform {
 /// What an argument is, as far as a placeholder cares.
 enum class ArgumentKind { signedInteger, unsignedInteger, real, object };
 
-template <class T>
+template<class T>
 constexpr ArgumentKind argumentKindOf() {
     if constexpr (std::is_same_v<T, bool> || (std::is_integral_v<T> && std::is_unsigned_v<T>))
         return ArgumentKind::unsignedInteger;
@@ -37,7 +37,7 @@ struct FormatArgument {
     double real;
 };
 
-template <class T>
+template<class T>
 FormatArgument makeFormatArgument(const T& value) {
     FormatArgument argument{argumentKindOf<T>(), &value, nullptr, 0, 0};
     argument.describe = [](std::string& out, const void* object) {
@@ -104,7 +104,7 @@ void appendFormatted(std::string& out, std::string_view format,
                      std::span<const FormatArgument> arguments);
 
 /// A literal format string whose placeholders fit `Args`; anything else does not compile.
-template <class... Args>
+template<class... Args>
 class FormatString {
 public:
     consteval FormatString(const char* text) : text_(text) { // NOLINT(google-explicit-constructor)
@@ -142,7 +142,7 @@ private:
 };
 
 /// The format filled with the arguments. Locale-independent: decimal point, no grouping.
-template <class... Args>
+template<class... Args>
 std::string format(std::type_identity_t<FormatString<Args...>> text, const Args&... args) {
     const std::array<FormatArgument, sizeof...(Args)> arguments{makeFormatArgument(args)...};
     return formatRuntime(text.text(), arguments);

@@ -25,7 +25,7 @@ bool logAccepts(LogLevel level);
 void logMessage(LogLevel level, std::string message, const std::source_location& where);
 
 /// A format with the place where it stands.
-template <class... Args>
+template<class... Args>
 struct LogFormat {
     consteval LogFormat(const char* text, // NOLINT(google-explicit-constructor)
                         std::source_location place = std::source_location::current())
@@ -35,7 +35,7 @@ struct LogFormat {
 };
 
 /// Logs from platform code; the product's own code uses VXLog.
-template <class... Args>
+template<class... Args>
 void platformLog(LogLevel level, std::type_identity_t<LogFormat<Args...>> text,
                  const Args&... args) {
     if (!logAccepts(level))

@@ -59,7 +59,9 @@ MainQueue::MainQueue(Clock& clock)
 
 MainQueue::~MainQueue() = default;
 
-void MainQueue::async(Job job) { state_->add(std::move(job)); }
+void MainQueue::async(Job job) {
+    state_->add(std::move(job));
+}
 
 void MainQueue::after(Duration delay, Job job) {
     clock_.setAlarm(delay, [state = std::weak_ptr(state_), job = std::move(job)]() mutable {

@@ -4,7 +4,8 @@
 
 namespace platform {
 
-ManualClock::ManualClock(Date start) : wall_(start) {}
+ManualClock::ManualClock(Date start) : wall_(start) {
+}
 
 Date ManualClock::now() const {
     const std::lock_guard lock(mutex_);

@@ -13,7 +13,8 @@ struct NotificationCenter::State {
     std::map<std::string, std::vector<std::weak_ptr<Handler>>, std::less<>> observers;
 };
 
-NotificationCenter::NotificationCenter() : state_(std::make_unique<State>()) {}
+NotificationCenter::NotificationCenter() : state_(std::make_unique<State>()) {
+}
 NotificationCenter::~NotificationCenter() = default;
 
 Observation NotificationCenter::observe(std::string_view name, Handler handler) {

@@ -35,9 +35,8 @@ struct OperationQueue::State {
             if (self->waiting.empty()) {
                 ++self->sleeping;
                 if (!self->closing)
-                    self->changed.wait_for(lock, idleTime, [&] {
-                        return self->closing || !self->waiting.empty();
-                    });
+                    self->changed.wait_for(lock, idleTime,
+                                           [&] { return self->closing || !self->waiting.empty(); });
                 --self->sleeping;
                 if (self->waiting.empty())
                     break;

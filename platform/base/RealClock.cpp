@@ -87,6 +87,8 @@ private:
 
 } // namespace
 
-std::unique_ptr<Clock> makeRealClock() { return std::make_unique<RealClock>(); }
+std::unique_ptr<Clock> makeRealClock() {
+    return std::make_unique<RealClock>();
+}
 
 } // namespace platform

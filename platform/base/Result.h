@@ -9,11 +9,11 @@ namespace platform {
 
 /// A value, or the error that stood in its way. Test before reading: value() on an error, or
 /// error() on a value, is a programming fault and terminates.
-template <class T>
+template<class T>
 class [[nodiscard]] Result {
 public:
-    Result(T value) : state_(std::in_place_index<0>, std::move(value)) {}          // NOLINT
-    Result(Error error) : state_(std::in_place_index<1>, std::move(error)) {}      // NOLINT
+    Result(T value) : state_(std::in_place_index<0>, std::move(value)) {}     // NOLINT
+    Result(Error error) : state_(std::in_place_index<1>, std::move(error)) {} // NOLINT
 
     bool ok() const { return state_.index() == 0; }
     explicit operator bool() const { return ok(); }
@@ -29,9 +29,7 @@ public:
 
     const Error& error() const { return std::get<1>(state_); }
     /// The value, or none with the error dropped.
-    std::optional<T> toOptional() const {
-        return ok() ? std::optional<T>(value()) : std::nullopt;
-    }
+    std::optional<T> toOptional() const { return ok() ? std::optional<T>(value()) : std::nullopt; }
 
 private:
     std::variant<T, Error> state_;

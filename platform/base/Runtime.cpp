@@ -20,7 +20,9 @@ Runtime& Runtime::current() {
     return *runtime;
 }
 
-bool Runtime::installed() { return installedRuntime.load(std::memory_order_acquire) != nullptr; }
+bool Runtime::installed() {
+    return installedRuntime.load(std::memory_order_acquire) != nullptr;
+}
 
 void Runtime::install(Runtime* runtime) {
     installedRuntime.store(runtime, std::memory_order_release);

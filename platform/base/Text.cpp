@@ -39,7 +39,9 @@ std::string lookUp(std::string_view key, int count) {
 
 /// The count by which a language chooses the form for a number that is not whole. Arabic has a form
 /// of its own for these ("other", as for 100); elsewhere it is that of 2.
-int countForFraction() { return tableLanguage() == "ar" ? 100 : 2; }
+int countForFraction() {
+    return tableLanguage() == "ar" ? 100 : 2;
+}
 
 std::string replaceAll(std::string text, std::string_view what, std::string_view with) {
     for (std::size_t at = text.find(what); at != std::string::npos;
@@ -71,7 +73,8 @@ std::string systemLanguage() {
 
 std::string loadLocalizedTexts(std::string_view language) {
     initializeResources();
-    const QString wanted = QString::fromUtf8(language.data(), static_cast<qsizetype>(language.size()));
+    const QString wanted =
+        QString::fromUtf8(language.data(), static_cast<qsizetype>(language.size()));
     const QString code = wanted.section(QLatin1Char('_'), 0, 0).section(QLatin1Char('-'), 0, 0);
     // Numbers and dates follow the texts: a sentence in one language with the figures of another
     // reads like a fault.
@@ -87,13 +90,15 @@ std::string loadLocalizedTexts(std::string_view language) {
     return tableLanguage();
 }
 
-std::string localized(std::string_view key) { return lookUp(key, -1); }
+std::string localized(std::string_view key) {
+    return lookUp(key, -1);
+}
 
 std::string localizedPlural(std::string_view key, long long count) {
     // The forms depend on the last digits and on small numbers only.
     const long long magnitude = std::llabs(count);
-    const int chosen = static_cast<int>(magnitude > 1'000'000 ? magnitude % 1'000'000 + 1'000'000
-                                                              : magnitude);
+    const int chosen =
+        static_cast<int>(magnitude > 1'000'000 ? magnitude % 1'000'000 + 1'000'000 : magnitude);
     const std::string number = QLocale().toString(count).toStdString();
     return replaceAll(lookUp(key, chosen), "%n", number);
 }

@@ -26,7 +26,7 @@ std::string localizedPlural(std::string_view key, long long count);
 std::string localizedPluralText(std::string_view key, double number, std::string_view text);
 
 /// A localised format ("“%1$@” is %2$@") filled with the arguments.
-template <class... Args>
+template<class... Args>
 std::string localizedFormat(std::string_view key, const Args&... args) {
     const std::array<FormatArgument, sizeof...(Args)> arguments{makeFormatArgument(args)...};
     return formatRuntime(localized(key), arguments);

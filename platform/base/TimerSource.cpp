@@ -57,9 +57,12 @@ struct TimerSource::State : std::enable_shared_from_this<State> {
 };
 
 TimerSource::TimerSource(Clock& clock, Executor& queue)
-    : state_(std::make_shared<State>(clock, queue)) {}
+    : state_(std::make_shared<State>(clock, queue)) {
+}
 
-TimerSource::~TimerSource() { cancel(); }
+TimerSource::~TimerSource() {
+    cancel();
+}
 
 void TimerSource::schedule(Duration delay, Duration interval, Duration /*leeway*/) {
     // The alarm thread coalesces nothing, so every leeway is met.

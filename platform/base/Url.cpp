@@ -16,8 +16,12 @@ int hexDigit(char c) {
     return -1;
 }
 
-bool isAlpha(char c) { return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z'); }
-bool isDigit(char c) { return c >= '0' && c <= '9'; }
+bool isAlpha(char c) {
+    return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z');
+}
+bool isDigit(char c) {
+    return c >= '0' && c <= '9';
+}
 bool isUnreserved(char c) {
     return isAlpha(c) || isDigit(c) || c == '-' || c == '.' || c == '_' || c == '~';
 }
@@ -157,7 +161,9 @@ std::string_view Url::lastPathComponent() const {
     return slash == std::string_view::npos ? path : path.substr(slash + 1);
 }
 
-std::string_view Url::pathExtension() const { return pathExtensionOf(lastPathComponent()); }
+std::string_view Url::pathExtension() const {
+    return pathExtensionOf(lastPathComponent());
+}
 
 std::vector<std::string_view> Url::pathComponents() const {
     std::vector<std::string_view> components;
@@ -262,6 +268,8 @@ std::string_view stemOf(std::string_view name) {
     return extension.empty() ? name : name.substr(0, name.size() - extension.size() - 1);
 }
 
-void appendDescription(std::string& out, const Url& url) { out += url.absoluteString(); }
+void appendDescription(std::string& out, const Url& url) {
+    out += url.absoluteString();
+}
 
 } // namespace platform

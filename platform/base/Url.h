@@ -94,7 +94,7 @@ void appendDescription(std::string& out, const Url& url);
 
 } // namespace platform
 
-template <>
+template<>
 struct std::hash<platform::Url> {
     std::size_t operator()(const platform::Url& url) const noexcept {
         return std::hash<std::string>{}(url.path());

@@ -50,7 +50,7 @@ bool Value::operator==(const Value& other) const {
     return data_ == other.data_;
 }
 
-void appendDescription(std::string& out, const Value& value) {
+void Value::describeTo(std::string& out) const {
     std::visit(
         [&out](const auto& held) {
             using Held = std::decay_t<decltype(held)>;
@@ -64,7 +64,7 @@ void appendDescription(std::string& out, const Value& value) {
             else
                 describe(out, held);
         },
-        value.data_);
+        data_);
 }
 
 } // namespace platform

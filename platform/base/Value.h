@@ -3,6 +3,7 @@
 #include "platform/base/Date.h"
 #include "platform/base/Url.h"
 
+#include <concepts>
 #include <cstddef>
 #include <cstdint>
 #include <initializer_list>
@@ -29,16 +30,16 @@ public:
     using Map = std::map<std::string, Value, std::less<>>;
 
     Value() = default;
-    Value(bool v) : data_(v) {}                                    // NOLINT(google-explicit-constructor)
-    Value(int v) : data_(static_cast<std::int64_t>(v)) {}          // NOLINT(google-explicit-constructor)
-    Value(std::int64_t v) : data_(v) {}                            // NOLINT(google-explicit-constructor)
-    Value(double v) : data_(v) {}                                  // NOLINT(google-explicit-constructor)
-    Value(const char* v) : data_(std::string(v)) {}                // NOLINT(google-explicit-constructor)
-    Value(std::string v) : data_(std::move(v)) {}                  // NOLINT(google-explicit-constructor)
-    Value(std::string_view v) : data_(std::string(v)) {}           // NOLINT(google-explicit-constructor)
-    Value(Bytes v) : data_(std::move(v)) {}                        // NOLINT(google-explicit-constructor)
-    Value(Date v) : data_(v) {}                                    // NOLINT(google-explicit-constructor)
-    Value(Url v) : data_(std::move(v)) {}                          // NOLINT(google-explicit-constructor)
+    Value(bool v) : data_(v) {}                           // NOLINT(google-explicit-constructor)
+    Value(int v) : data_(static_cast<std::int64_t>(v)) {} // NOLINT(google-explicit-constructor)
+    Value(std::int64_t v) : data_(v) {}                   // NOLINT(google-explicit-constructor)
+    Value(double v) : data_(v) {}                         // NOLINT(google-explicit-constructor)
+    Value(const char* v) : data_(std::string(v)) {}       // NOLINT(google-explicit-constructor)
+    Value(std::string v) : data_(std::move(v)) {}         // NOLINT(google-explicit-constructor)
+    Value(std::string_view v) : data_(std::string(v)) {}  // NOLINT(google-explicit-constructor)
+    Value(Bytes v) : data_(std::move(v)) {}               // NOLINT(google-explicit-constructor)
+    Value(Date v) : data_(v) {}                           // NOLINT(google-explicit-constructor)
+    Value(Url v) : data_(std::move(v)) {}                 // NOLINT(google-explicit-constructor)
     Value(List v) : data_(std::make_shared<const List>(std::move(v))) {} // NOLINT
     Value(Map v) : data_(std::make_shared<const Map>(std::move(v))) {}   // NOLINT
 
@@ -58,15 +59,18 @@ public:
     const Map* map() const;
 
     bool operator==(const Value& other) const;
+    void describeTo(std::string& out) const;
 
 private:
     std::variant<std::monostate, bool, std::int64_t, double, std::string, Bytes, Date, Url,
                  std::shared_ptr<const List>, std::shared_ptr<const Map>>
         data_;
-
-    friend void appendDescription(std::string& out, const Value& value);
 };
 
-void appendDescription(std::string& out, const Value& value);
+/// For values themselves only: what merely converts to one is described as what it is.
+template<std::same_as<Value> V>
+void appendDescription(std::string& out, const V& value) {
+    value.describeTo(out);
+}
 
 } // namespace platform

@@ -125,15 +125,21 @@ void WorkQueue::sync(const Job& job) {
     done.wait(lock, [&] { return finished; });
 }
 
-const std::string& WorkQueue::label() const { return state_->label; }
+const std::string& WorkQueue::label() const {
+    return state_->label;
+}
 
 bool WorkQueue::isCurrent() const {
     const std::lock_guard lock(state_->mutex);
     return state_->thread.get_id() == std::this_thread::get_id();
 }
 
-std::string_view WorkQueue::currentLabel() { return currentLabelOfThread; }
+std::string_view WorkQueue::currentLabel() {
+    return currentLabelOfThread;
+}
 
-void setCurrentQueueLabel(std::string_view label) { currentLabelOfThread = label; }
+void setCurrentQueueLabel(std::string_view label) {
+    currentLabelOfThread = label;
+}
 
 } // namespace platform

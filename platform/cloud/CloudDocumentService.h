@@ -25,7 +25,8 @@ public:
     virtual std::optional<std::string> pathRelativeToShelfroot(const Url& url) const = 0;
 
     /// The container that holds the item (or is it).
-    virtual Result<std::shared_ptr<const CloudContainer>> containerForItemAtURL(const Url& url) const = 0;
+    virtual Result<std::shared_ptr<const CloudContainer>>
+    containerForItemAtURL(const Url& url) const = 0;
     virtual std::vector<std::shared_ptr<const CloudContainer>> containers() const = 0;
     virtual std::string localizedNameForDefaultContainer() const = 0;
     /// Local URL of the default container's documents; none without an account.
@@ -33,7 +34,8 @@ public:
 
     /// What is known of a document, also when only its placeholder is on the device. Fails for an
     /// item that the store does not know; then plainAttributes may still answer.
-    virtual Result<ResourceValues> promisedItemAttributes(const Url& url, ResourceKeys keys) const = 0;
+    virtual Result<ResourceValues> promisedItemAttributes(const Url& url,
+                                                          ResourceKeys keys) const = 0;
     /// What the file system says of what stands at the URL.
     virtual Result<ResourceValues> plainAttributes(const Url& url, ResourceKeys keys) const = 0;
 

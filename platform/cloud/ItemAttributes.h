@@ -43,7 +43,9 @@ inline constexpr std::string_view thumbnailSize1024 = "1024x1024";
 /// The attributes that a read answered: one slot a key, none where the item has no such attribute.
 class ResourceValues {
 public:
-    const Value& operator[](ResourceKey key) const { return values_[static_cast<std::size_t>(key)]; }
+    const Value& operator[](ResourceKey key) const {
+        return values_[static_cast<std::size_t>(key)];
+    }
     void set(ResourceKey key, Value value) {
         values_[static_cast<std::size_t>(key)] = std::move(value);
     }

@@ -21,16 +21,16 @@ public:
     virtual ~DocumentListControllerDelegate() = default;
     /// A folder or container was tapped; `next` is a new, unconfigured list for it.
     virtual void documentListControllerDidSelectContainerWithViewController(
-        DocumentListController& /*list*/, const std::shared_ptr<DocumentListController>& /*next*/) {}
+        DocumentListController& /*list*/, const std::shared_ptr<DocumentListController>& /*next*/) {
+    }
     virtual void documentListControllerDidSelectItemAtURL(DocumentListController& /*list*/,
                                                           const Url& /*url*/) {}
     /// The contained items or the selection changed.
     virtual void documentListControllerItemsChanged(DocumentListController& /*list*/) {}
     /// A row action was chosen. `completion` must be called once it is dealt with.
-    virtual void documentListControllerPerformAction(DocumentListController& /*list*/, int /*action*/,
-                                                     const Url& /*url*/,
-                                                     const std::shared_ptr<View>& /*originatingView*/,
-                                                     std::function<void()> completion) {
+    virtual void documentListControllerPerformAction(
+        DocumentListController& /*list*/, int /*action*/, const Url& /*url*/,
+        const std::shared_ptr<View>& /*originatingView*/, std::function<void()> completion) {
         completion();
     }
 };

@@ -13,7 +13,16 @@ namespace platform {
 
 /// One thing that happened in a watched folder. Two of a rename share their cookie.
 struct DirectoryChange {
-    enum class Kind { created, removed, modified, attributes, movedFrom, movedTo, folderGone, overflow };
+    enum class Kind {
+        created,
+        removed,
+        modified,
+        attributes,
+        movedFrom,
+        movedTo,
+        folderGone,
+        overflow
+    };
     Kind kind = Kind::modified;
     std::string name;
     bool isDirectory = false;

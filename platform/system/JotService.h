@@ -12,9 +12,7 @@ namespace platform {
 /// One structured log record: text keys to text values, in the order in which they were set.
 class JotRecord {
 public:
-    void set(std::string_view key, std::string_view value) {
-        fields_.emplace_back(key, value);
-    }
+    void set(std::string_view key, std::string_view value) { fields_.emplace_back(key, value); }
     const std::vector<std::pair<std::string, std::string>>& fields() const { return fields_; }
 
 private:
@@ -25,8 +23,8 @@ private:
 using JotHandle = std::uint64_t;
 
 /// The structured system log: journald where there is one, else a rotating file in the state
-/// folder. A connection limits its own rate unless the environment has JOT_QUOTA_DISABLED=1; what it
-/// leaves out it counts and says. One connection is used from one queue at a time.
+/// folder. A connection limits its own rate unless the environment has JOT_QUOTA_DISABLED=1; what
+/// it leaves out it counts and says. One connection is used from one queue at a time.
 class JotService {
 public:
     virtual ~JotService() = default;

@@ -25,7 +25,9 @@ public:
     bool isEnabled() const { return enabled_; }
     void setEnabled(bool enabled);
     /// Asked when the action is chosen: false keeps the alert open and its handler silent.
-    void setShouldDismissHandler(std::function<bool()> handler) { shouldDismiss_ = std::move(handler); }
+    void setShouldDismissHandler(std::function<bool()> handler) {
+        shouldDismiss_ = std::move(handler);
+    }
     /// Called by the alert that shows it, to hear of changes.
     void setChangeHandler(std::function<void()> handler) { changed_ = std::move(handler); }
 

@@ -43,7 +43,9 @@ public:
         return false;
     }
     virtual void applicationWillResignActive(Application& /*application*/) {}
-    virtual bool applicationShouldSaveApplicationState(Application& /*application*/) { return false; }
+    virtual bool applicationShouldSaveApplicationState(Application& /*application*/) {
+        return false;
+    }
     virtual bool applicationShouldRestoreApplicationState(Application& /*application*/) {
         return false;
     }

@@ -9,7 +9,9 @@ struct Color {
     double blue = 0;
     double alpha = 1;
 
-    static constexpr Color gray(double white, double alpha = 1) { return {white, white, white, alpha}; }
+    static constexpr Color gray(double white, double alpha = 1) {
+        return {white, white, white, alpha};
+    }
     /// From 0xRRGGBB.
     static constexpr Color hex(unsigned rgb) {
         return {((rgb >> 16) & 255) / 255.0, ((rgb >> 8) & 255) / 255.0, (rgb & 255) / 255.0, 1};

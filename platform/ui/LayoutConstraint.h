@@ -32,8 +32,8 @@ inline constexpr LayoutPriority layoutRequired = 1000;
 inline constexpr LayoutPriority layoutHigh = 750;
 inline constexpr LayoutPriority layoutLow = 250;
 
-/// first.attribute (relation) second.attribute * multiplier + constant. Works while it is active and
-/// both views live in one window's tree; the views are not owned. Main thread.
+/// first.attribute (relation) second.attribute * multiplier + constant. Works while it is active
+/// and both views live in one window's tree; the views are not owned. Main thread.
 ///
 /// Requirements that contradict each other never fail: the weakest, and among equals the one
 /// activated last, gives way, and one log line names it.

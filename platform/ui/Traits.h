@@ -5,7 +5,13 @@ namespace platform {
 enum class DeviceIdiom { phone, tablet };
 /// The values are those of the interface that screens ask by.
 enum class SizeClass { unspecified = 0, compact = 1, regular = 2 };
-enum class Orientation { unknown = 0, portrait = 1, portraitUpsideDown = 2, landscapeLeft = 3, landscapeRight = 4 };
+enum class Orientation {
+    unknown = 0,
+    portrait = 1,
+    portraitUpsideDown = 2,
+    landscapeLeft = 3,
+    landscapeRight = 4
+};
 
 struct TraitCollection {
     SizeClass horizontal = SizeClass::unspecified;

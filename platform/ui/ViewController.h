@@ -21,7 +21,8 @@ enum class PresentationStyle { fullScreen, overCurrentContext };
 class TransitionCoordinator {
 public:
     virtual ~TransitionCoordinator() = default;
-    virtual void animateAlongside(std::function<void()> animation, std::function<void()> completion) = 0;
+    virtual void animateAlongside(std::function<void()> animation,
+                                  std::function<void()> completion) = 0;
 };
 
 /// Keys and values of state restoration.
