@@ -1,7 +1,5 @@
 #include "platform/base/OperationQueue.h"
 
-#include "platform/base/WorkQueue.h"
-
 #include <chrono>
 #include <condition_variable>
 #include <deque>
@@ -19,6 +17,7 @@ constexpr auto idleTime = std::chrono::seconds(2);
 struct OperationQueue::State {
     std::string name;
     unsigned width = 1;
+    WorkPriority priority = WorkPriority::standard;
     std::mutex mutex;
     std::condition_variable changed;
     std::condition_variable idle;
@@ -30,6 +29,7 @@ struct OperationQueue::State {
 
     static void run(const std::shared_ptr<State>& self) {
         setCurrentQueueLabel(self->name);
+        setThreadPriority(self->priority);
         std::unique_lock lock(self->mutex);
         for (;;) {
             if (self->waiting.empty()) {
@@ -55,10 +55,11 @@ struct OperationQueue::State {
     }
 };
 
-OperationQueue::OperationQueue(std::string name, unsigned width)
+OperationQueue::OperationQueue(std::string name, unsigned width, WorkPriority priority)
     : state_(std::make_shared<State>()) {
     state_->name = std::move(name);
     state_->width = width;
+    state_->priority = priority;
 }
 
 OperationQueue::~OperationQueue() {

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "platform/base/Executor.h"
+#include "platform/base/WorkQueue.h"
 
 #include <memory>
 #include <string>
@@ -11,7 +11,8 @@ namespace platform {
 /// come and go with the work. Destroying it lets what was submitted finish, without waiting.
 class OperationQueue final : public Executor {
 public:
-    explicit OperationQueue(std::string name = {}, unsigned width = 4);
+    explicit OperationQueue(std::string name = {}, unsigned width = 4,
+                            WorkPriority priority = WorkPriority::standard);
     ~OperationQueue() override;
     OperationQueue(const OperationQueue&) = delete;
     OperationQueue& operator=(const OperationQueue&) = delete;

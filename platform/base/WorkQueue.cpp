@@ -33,7 +33,8 @@ int niceValue(WorkPriority priority, int relative) {
 
 struct WorkQueue::State {
     std::string label;
-    int nice = 0;
+    WorkPriority priority = WorkPriority::standard;
+    int relative = 0;
     std::mutex mutex;
     std::condition_variable changed;
     std::vector<Job> waiting;
@@ -46,8 +47,7 @@ struct WorkQueue::State {
         currentLabelOfThread = self->label;
         const std::string shortName = self->label.substr(self->label.rfind('.') + 1).substr(0, 15);
         pthread_setname_np(pthread_self(), shortName.c_str());
-        if (self->nice != 0)
-            setpriority(PRIO_PROCESS, static_cast<id_t>(syscall(SYS_gettid)), self->nice);
+        setThreadPriority(self->priority, self->relative);
         std::vector<Job> batch;
         std::unique_lock lock(self->mutex);
         for (;;) {
@@ -73,7 +73,8 @@ struct WorkQueue::State {
 WorkQueue::WorkQueue(std::string label, WorkPriority priority, int relative)
     : state_(std::make_shared<State>()) {
     state_->label = std::move(label);
-    state_->nice = niceValue(priority, relative);
+    state_->priority = priority;
+    state_->relative = relative;
 }
 
 WorkQueue::~WorkQueue() {
@@ -136,6 +137,11 @@ bool WorkQueue::isCurrent() const {
 
 std::string_view WorkQueue::currentLabel() {
     return currentLabelOfThread;
+}
+
+void setThreadPriority(WorkPriority priority, int relative) {
+    if (const int nice = niceValue(priority, relative); nice != 0)
+        setpriority(PRIO_PROCESS, static_cast<id_t>(syscall(SYS_gettid)), nice);
 }
 
 void setCurrentQueueLabel(std::string_view label) {

@@ -39,6 +39,8 @@ private:
     std::shared_ptr<State> state_;
 };
 
+/// Lowers the calling thread's priority to that of the class (raising it back is not possible).
+void setThreadPriority(WorkPriority priority, int relative = 0);
 /// Marks the calling thread as serving the queue of that label, for WorkQueue::currentLabel.
 /// The text must outlive the thread.
 void setCurrentQueueLabel(std::string_view label);
