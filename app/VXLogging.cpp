@@ -87,10 +87,13 @@ void fillRecord(platform::JotRecord& record, const Message& message) {
 }
 
 void sendMessage(const Message& message) {
-    platform::JotService& jot = Platform::current().jot();
-    if (const std::unique_ptr<platform::JotRecord> record = jot.createRecord()) {
-        fillRecord(*record, message);
-        jot.send(VXJotClient::JotClient()->jotClient(), *record);
+    // At the very end of the process the console is all that is left.
+    if (Platform::installed()) {
+        platform::JotService& jot = Platform::current().jot();
+        if (const std::unique_ptr<platform::JotRecord> record = jot.createRecord()) {
+            fillRecord(*record, message);
+            jot.send(VXJotClient::JotClient()->jotClient(), *record);
+        }
     }
     platform::writeConsoleLine(message.text);
 }

@@ -1,0 +1,48 @@
+#include "items/UrlExtensions.h"
+
+#include "platform/Platform.h"
+#include "platform/cloud/CloudDocumentService.h"
+
+namespace tavrin {
+namespace {
+
+platform::CloudDocumentService& documents() {
+    return platform::Platform::current().documents();
+}
+
+} // namespace
+
+std::optional<platform::Url> tavrin_URLByResolvingBookmark(const platform::Url& url) {
+    if (!documents().isExternalDocumentReference(url))
+        return std::nullopt;
+    const platform::Result<platform::Url> target =
+        documents().resolveExternalDocumentReference(url);
+    if (!target)
+        return std::nullopt;
+    if (std::optional<platform::Url> promised = tavrin_URLByResolvingPromise(*target))
+        return promised;
+    return *target;
+}
+
+std::optional<platform::Url> tavrin_URLByResolvingPromise(const platform::Url& url) {
+    if (!documents().isPromiseAtURL(url))
+        return std::nullopt;
+    const std::optional<platform::Url> logical = documents().logicalURLOfPromise(url);
+    if (!logical)
+        return std::nullopt;
+    return logical->withPhysicalUrl(url);
+}
+
+bool wantsDefaultMediaPlayer(const platform::Url& /*url*/) {
+    return true;
+}
+
+bool dossa_isDocumentsContainer(const platform::Url& url) {
+    return documents().isDocumentsContainer(url);
+}
+
+bool dossa_isInShelfroot(const platform::Url& url) {
+    return documents().isInShelfroot(url);
+}
+
+} // namespace tavrin
