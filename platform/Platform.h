@@ -11,13 +11,17 @@
 namespace platform {
 
 class CloudAccountService;
+class CloudDatabase;
 class CloudDocumentService;
 class CloudService;
 class DirectoryWatcher;
 class FileProgressSubscription;
 class JotService;
+class KeyValueCloudStore;
+class NetworkActivityIndicator;
 class NotifyService;
 class PreferencesStore;
+class ReachabilityService;
 class StandardPreferences;
 
 /// What a platform is put together from. Empty slots get the real thing.
@@ -55,9 +59,14 @@ public:
     StandardPreferences& standardPreferences();
     DirectoryWatcher& directoryWatcher();
     FileProgressSubscription& fileProgress();
+    ReachabilityService& reachability();
+    NetworkActivityIndicator& networkActivityIndicator();
     CloudService& cloud();
     CloudAccountService& accounts();
     CloudDocumentService& documents();
+    KeyValueCloudStore& keyValueStore();
+    /// The private database of the container with that identifier.
+    CloudDatabase& privateDatabase(std::string_view containerIdentifier);
 
     /// The data container of an application: a folder of its own in the user's data folder.
     std::optional<Url> dataContainerURL(std::string_view application) const;
