@@ -14,14 +14,15 @@ class CancelFlag {
 public:
     void cancel();
     bool isCancelled() const { return cancelled_.load(std::memory_order_acquire); }
-    /// Runs `handler` when cancelled (at once when that has happened), on the cancelling thread.
-    /// Replaces the earlier handler; an empty one takes it away and waits for one that runs.
+    /// Runs `handler` once when cancelled (at once when that has happened), on the cancelling
+    /// thread. Replaces the earlier handler; an empty one takes it away. Waits for one that runs on
+    /// another thread, so a handler must not wait for a thread that is in here.
     void setHandler(std::function<void()> handler);
 
 private:
     std::atomic<bool> cancelled_{false};
-    std::mutex mutex_;
-    std::function<void()> handler_;
+    std::recursive_mutex mutex_;
+    std::function<void()> handler_; // guarded by mutex_
 };
 
 /// Who can fetch the contents of a promised document: implemented by the cloud service, asked by

@@ -44,7 +44,7 @@ private:
     std::atomic<std::int64_t> completed_{0};
     std::atomic<std::int64_t> total_{0};
     std::recursive_mutex mutex_;
-    std::vector<std::pair<ObserverId, Observer>> observers_; // guarded by mutex_
+    std::vector<std::pair<ObserverId, std::shared_ptr<Observer>>> observers_; // guarded by mutex_
     ObserverId lastId_ = 0;
 };
 
@@ -55,7 +55,8 @@ class FileProgressSubscription {
 public:
     using Unpublished = std::function<void()>;
     /// Called for each progress published for the file, also for one that is under way already;
-    /// answers what to call when that progress is withdrawn (may be empty).
+    /// answers what to call, once, when that progress is withdrawn or the subscription ends (may
+    /// be empty). Runs on the thread that publishes or subscribes.
     using Published = std::function<Unpublished(const std::shared_ptr<Progress>& progress)>;
     using Token = std::shared_ptr<void>;
 
@@ -64,7 +65,9 @@ public:
     FileProgressSubscription(const FileProgressSubscription&) = delete;
     FileProgressSubscription& operator=(const FileProgressSubscription&) = delete;
 
-    /// Subscribed until the token is removed (or dropped).
+    /// Subscribed until the token is removed (or dropped). Nothing is called for it any more once
+    /// removeSubscriber() has returned, unless that is called from within an observer of a progress
+    /// or one of these handlers.
     [[nodiscard]] Token addSubscriber(const Url& file, Published handler);
     void removeSubscriber(const Token& token);
 
