@@ -4,6 +4,7 @@
 #include <algorithm>
 #include <condition_variable>
 #include <unordered_map>
+#include <utility>
 
 namespace platform {
 namespace {
@@ -24,7 +25,7 @@ using Links = std::vector<std::shared_ptr<Link>>;
 
 struct Subscriber {
     FileProgressSubscription::Published handler;
-    /// Handlers of this subscriber that run just now.
+    /// Handlers of this subscriber that run just now or are about to.
     int running = 0;
 };
 
@@ -71,26 +72,22 @@ struct FileProgressSubscription::State {
         std::unique_lock lock(mutex);
         link.stage = link.over ? Link::Stage::ended : Link::Stage::told;
         if (link.over)
-            call(lock, unpublished);
+            call(lock, std::move(unpublished));
         else
             link.unpublished = std::move(unpublished);
         finished(*link.subscriber);
     }
 
-    /// Takes the links back. One that is being told just now is taken back by who tells it.
+    /// Takes unlinked links back. One that is being told just now is taken back by who tells it.
     void end(const Links& links) {
         for (const auto& link : links) {
             std::unique_lock lock(mutex);
             link->over = true;
-            const bool told = link->stage == Link::Stage::told;
-            if (link->stage == Link::Stage::telling || link->stage == Link::Stage::ended)
-                continue;
-            link->stage = Link::Stage::ended;
-            if (!told)
-                continue;
-            ++link->subscriber->running;
-            const Unpublished unpublished = std::move(link->unpublished);
-            call(lock, unpublished);
+            const Link::Stage stage = link->stage;
+            if (stage != Link::Stage::telling)
+                link->stage = Link::Stage::ended;
+            if (stage == Link::Stage::told)
+                call(lock, std::exchange(link->unpublished, nullptr));
             finished(*link->subscriber);
         }
     }
@@ -118,8 +115,11 @@ struct FileProgressSubscription::State {
         }));
         std::unique_lock lock(mutex);
         finished(*subscriber);
-        if (!ProgressCallbackScope::active())
-            quiet.wait(lock, [&] { return subscriber->running == 0; });
+        if (ProgressCallbackScope::active())
+            return;
+        quiet.wait(lock, [&] { return subscriber->running == 0; });
+        const Published released = std::exchange(subscriber->handler, nullptr);
+        lock.unlock();
     }
 
     void publish(const Url& key, const std::shared_ptr<Progress>& progress) {
@@ -152,7 +152,8 @@ private:
         return topic.links.back();
     }
 
-    /// Takes one end (called with no link) and its links out of the file's topic.
+    /// Takes one end (called with no link) and its links out of the file's topic. Each link counts
+    /// as running until end() has seen it, so that its subscriber's removal waits for that.
     template<class Match>
     Links unlink(const Url& key, const Match& match) {
         Links taken;
@@ -164,19 +165,23 @@ private:
             std::stable_partition(topic.links.begin(), topic.links.end(),
                                   [&](const auto& one) { return !match(topic, &*one); });
         taken.assign(rest, topic.links.end());
+        for (const auto& one : taken)
+            ++one->subscriber->running;
         topic.links.erase(rest, topic.links.end());
         if (topic.subscribers.empty() && topic.progresses.empty())
             topics.erase(found);
         return taken;
     }
 
-    static void call(std::unique_lock<std::mutex>& lock, const Unpublished& unpublished) {
+    /// Calls and releases the handler without the lock: what it holds may come back here.
+    static void call(std::unique_lock<std::mutex>& lock, Unpublished unpublished) {
         if (!unpublished)
             return;
         lock.unlock();
         {
             const ProgressCallbackScope inCallback;
             unpublished();
+            unpublished = nullptr;
         }
         lock.lock();
     }

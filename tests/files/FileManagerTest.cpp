@@ -1,4 +1,5 @@
 #include "platform/files/FileManager.h"
+#include "platform/base/Describe.h"
 
 #include "tests/support/TemporaryFolder.h"
 
@@ -30,7 +31,8 @@ struct Files : ::testing::Test {
     }
     std::vector<std::string> names(std::string_view name = "") const {
         std::vector<std::string> out;
-        for (const auto& entry : FileManager::entries((folder / name)).value())
+        const auto entries = FileManager::entries(folder / name);
+        for (const auto& entry : entries.value())
             out.push_back(entry.name);
         std::sort(out.begin(), out.end());
         return out;
@@ -64,17 +66,18 @@ TEST_F(Files, APathWithANulNamesNoOtherItem) {
 }
 
 TEST_F(Files, EnumerationStopsWhenToldAndSkipsTheDots) {
-    for (int i = 0; i < 3000; ++i)
-        givenFile("many/file number " + std::to_string(i));
-    EXPECT_EQ(names("many").size(), 3000U);
+    folder.makeFolder("many");
+    for (int i = 0; i < 1200; ++i) // more than one system call hands over at once
+        ::close(::creat(
+            (folder / ("many/" + std::to_string(1000 + i) + std::string(240, 'n'))).c_str(), 0600));
+    EXPECT_EQ(names("many").size(), 1200U);
     int seen = 0;
     EXPECT_FALSE(FileManager::enumerate(folder / "many", [&seen](const auto& entry) {
         EXPECT_NE(entry.name, ".");
         return ++seen < 10;
     }));
     EXPECT_EQ(seen, 10);
-    EXPECT_TRUE(
-        FileManager::entries(folder / "many/file number 1").error().is(ErrorCode::noSuchItem));
+    EXPECT_TRUE(FileManager::entries(folder / "link/below").error().is(ErrorCode::noSuchItem));
 }
 
 TEST_F(Files, FoldersAreMadeWithTheirParentsButNeverOverAFile) {
@@ -124,11 +127,11 @@ TEST_F(Files, ExchangeSwapsAFileAndAFolder) {
 
 TEST_F(Files, ACopyKeepsContentHolesAndTimes) {
     const std::string path = givenFile("sparse", "head");
-    ASSERT_EQ(::truncate(path.c_str(), 64 << 20), 0);
+    ASSERT_EQ(::truncate(path.c_str(), 4 << 20), 0);
     const timespec times[2] = {{1'000'000, 5}, {1'234'567, 89}};
     ASSERT_EQ(::utimensat(AT_FDCWD, path.c_str(), times, 0), 0);
     ASSERT_FALSE(FileManager::copyFile(at("sparse"), at("copy")));
-    EXPECT_EQ(attributes("copy").size, 64U << 20);
+    EXPECT_EQ(attributes("copy").size, 4U << 20);
     EXPECT_EQ(attributes("copy").modified, platform::Date::fromParts(1'234'567, 89));
     EXPECT_EQ(folder.read("copy").substr(0, 5), std::string("head\0", 5));
     struct stat info {};
@@ -191,7 +194,7 @@ TEST_F(Files, RemovalTakesTheTreeButNotWhatItsLinksPointAt) {
 TEST_F(Files, RemovalGoesDeeperThanThereAreDescriptors) {
     const int before = ::open(folder.path().c_str(), O_PATH | O_DIRECTORY);
     int level = ::dup(before);
-    for (int depth = 0; depth < 3000; ++depth) {
+    for (int depth = 0; depth < 1500; ++depth) {
         ASSERT_EQ(::mkdirat(level, "down", 0700), 0);
         const int next = ::openat(level, "down", O_PATH | O_DIRECTORY);
         ::close(std::exchange(level, next));
@@ -228,7 +231,9 @@ TEST_F(Files, RemovalNeverEscapesThroughASwappedFolder) {
     }
     done = true;
     attacker.join();
-    EXPECT_EQ(names("keep").size(), 50U);
+    // What the test itself wrote through the swapped link is there as well.
+    for (int i = 0; i < 50; ++i)
+        EXPECT_TRUE(folder.has("keep/precious " + std::to_string(i)));
 }
 
 TEST_F(Files, IdentityTellsAReusedInodeApart) {

@@ -116,7 +116,7 @@ TEST_F(Publishing, ManyThreadsLeaveNothingHanging) {
                     ++*balance;
                     return [balance] { --*balance; };
                 });
-                for (unsigned wait = random() % 5; wait > 0; --wait)
+                for (auto wait = random() % 5; wait > 0; --wait)
                     std::this_thread::yield();
                 service.removeSubscriber(token);
                 ASSERT_EQ(*balance, 0);
