@@ -30,8 +30,10 @@ struct DirectoryChange {
 };
 
 /// Watches the direct entries of folders by the kernel's notices. Reports arrive in batches on the
-/// given queue; an overflow, or a watch limit that is reached, is reported as `overflow` and means
-/// that the folder must be read again. Safe from any thread.
+/// given queue. An `overflow` means that notices were lost and the folder must be read again; where
+/// the machine has no watch left for a folder, it comes every half minute. After `folderGone` (the
+/// folder itself was removed, moved or unmounted) nothing more comes. Repeated changes of one entry
+/// may arrive as one. A change somewhere above the folder is not noticed. Safe from any thread.
 class DirectoryWatcher {
 public:
     using Handler = std::function<void(const std::vector<DirectoryChange>& changes)>;
@@ -42,7 +44,8 @@ public:
     DirectoryWatcher(const DirectoryWatcher&) = delete;
     DirectoryWatcher& operator=(const DirectoryWatcher&) = delete;
 
-    /// Watched until the token is dropped; empty when the folder cannot be watched (logged).
+    /// Watched until the token or the watcher is dropped; empty when the folder cannot be watched
+    /// (logged). No handler starts after that; the queue must live until then.
     [[nodiscard]] Token watch(const Url& folder, Executor& queue, Handler handler);
 
 private:

@@ -11,14 +11,18 @@ namespace platform {
 
 /// Somebody who shows a file or a folder and wants to hear what others do to it. Notices arrive on
 /// presentedItemOperationQueue(), in the order of the changes, for changes made through a
-/// FileCoordinator and for those that any other program makes.
+/// FileCoordinator and for those that any other program makes. Of a folder's contents a presenter
+/// hears as change of the folder: at any depth when it was coordinated, of direct entries when it
+/// was not. What another program moves or deletes is told a quarter of a second later: programs
+/// save by putting a new file in the place of the old one.
 class FilePresenter {
 public:
     using DeletionHandler = std::function<void(const Failure&)>;
 
     virtual ~FilePresenter() = default;
 
-    /// Asked at registration and before every notice, on any thread.
+    /// Asked at registration, on that thread, and before every notice, on any. A new answer moves
+    /// the registration there. Must not wait for anything that coordinates files.
     virtual std::optional<Url> presentedItemURL() const = 0;
     virtual std::shared_ptr<Executor> presentedItemOperationQueue() const = 0;
 
