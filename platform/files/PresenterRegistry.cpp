@@ -5,6 +5,7 @@
 #include "platform/files/PathText.h"
 
 #include <algorithm>
+#include <set>
 
 namespace platform {
 namespace {
@@ -125,7 +126,8 @@ void PresenterRegistry::setPath(const PresenterRecordPointer& record, const std:
         watch.swap(record->watch);
         entriesWatch.swap(record->entriesWatch);
     }
-    refresh(*record, false);
+    if (refresh(*record, false).isFolder())
+        noteAllEntries(*record, path);
 }
 
 /// Reads the item's state anew and keeps it. A missing item is kept as such only with
@@ -258,15 +260,31 @@ bool PresenterRegistry::changedByWrite(const WriteScope& scope,
 /// entries is known from then on.
 void PresenterRegistry::noteEntries(PresenterRecord& record, const WriteScope& scope,
                                     const std::string& folder) {
-    std::vector<std::string> names;
+    const auto noteOne = [&](const std::string& path) {
+        if (folderOf(path) == folder)
+            entryChanged(record, std::string(nameOf(path)), PresentedItemState::read(path));
+    };
+    for (const auto& [from, to] : scope.moves) {
+        noteOne(from);
+        noteOne(to);
+    }
     for (const WriteScope::Item& item : scope.items) {
-        if (folderOf(item.path) == folder)
-            names.emplace_back(nameOf(item.path));
-        else if (isAtOrBelow(folder, item.path))
-            (void)FileManager::enumerate(folder, [&names](const DirectoryEntry& entry) {
-                names.push_back(entry.name);
-                return names.size() < entryLimit;
-            });
+        if (isAtOrBelow(folder, item.path))
+            noteAllEntries(record, folder);
+        noteOne(item.path);
+    }
+}
+
+void PresenterRegistry::noteAllEntries(PresenterRecord& record, const std::string& folder) {
+    std::set<std::string> names;
+    (void)FileManager::enumerate(folder, [&names](const DirectoryEntry& entry) {
+        names.insert(entry.name);
+        return names.size() < entryLimit;
+    });
+    {
+        const std::lock_guard lock(mutex_); // those that are gone by now
+        for (const auto& known : record.entries)
+            names.insert(known.first);
     }
     for (const std::string& name : names)
         entryChanged(record, name, PresentedItemState::read(folder + '/' + name));

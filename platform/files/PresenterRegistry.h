@@ -29,7 +29,7 @@ struct PresenterRecord : std::enable_shared_from_this<PresenterRecord> {
     ItemHandle handle;
     /// Counts every change of path and state.
     std::uint64_t version = 0;
-    /// Of a folder: entries whose present state the presenter knows, by name.
+    /// Of a folder: the state of its direct entries that the presenter knows, by name.
     std::map<std::string, PresentedItemState> entries;
     /// When the item was first found missing; it is given a moment to come back.
     std::optional<Duration> missingSince;
@@ -106,7 +106,7 @@ private:
     bool entryChanged(PresenterRecord& record, const std::string& name,
                       const PresentedItemState& now);
     void noteEntries(PresenterRecord& record, const WriteScope& scope, const std::string& folder);
-    bool takeFolderState(PresenterRecord& record, const PresentedItemState& now);
+    void noteAllEntries(PresenterRecord& record, const std::string& folder);
     bool beingWritten(std::string_view path) const;
 
     mutable std::mutex mutex_;

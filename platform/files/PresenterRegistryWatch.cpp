@@ -7,6 +7,7 @@
 #include "platform/files/PresenterRegistry.h"
 
 #include <algorithm>
+#include <utility>
 
 namespace platform {
 namespace {
@@ -33,13 +34,13 @@ bool leftFolder(const DirectoryChange& change, const std::vector<DirectoryChange
 }
 
 /// The same item to its presenter. What happens to a folder's entries is told apart from that: it
-/// moves the folder's modification date.
-bool sameItem(const PresentedItemState& a, const PresentedItemState& b) {
-    if (!a.isFolder() || !b.isFolder())
-        return a == b;
-    return a.attributes.identity == b.attributes.identity &&
-           (a.attributes.modified != b.attributes.modified ||
-            a.attributes.changed == b.attributes.changed);
+/// leaves the folder with equal times of modification and change.
+bool sameItem(const PresentedItemState& now, const PresentedItemState& known) {
+    if (!now.isFolder() || !known.isFolder())
+        return now == known;
+    const FileAttributes& folder = now.attributes;
+    return folder.identity == known.attributes.identity &&
+           (folder.changed == folder.modified || folder.changed == known.attributes.changed);
 }
 
 } // namespace
@@ -143,51 +144,34 @@ void PresenterRegistry::watchEntries(PresenterRecord& record) {
         });
 }
 
-/// Keeps the presented folder's new state. Answers whether entries came or went since the last.
-bool PresenterRegistry::takeFolderState(PresenterRecord& record, const PresentedItemState& now) {
-    const std::lock_guard lock(mutex_);
-    if (!now.isFolder() || !sameItem(now, record.state) || beingWritten(record.path))
-        return false;
-    const bool changed = now != record.state;
-    if (changed)
-        store(record, now);
-    return changed;
-}
-
 void PresenterRegistry::entriesChanged(const PresenterRecordPointer& record,
                                        const std::vector<DirectoryChange>& changes) {
     const std::string folder = pathOf(*record);
-    const bool structure = takeFolderState(*record, PresentedItemState::read(folder));
+    if (!PresentedItemState::read(folder).isFolder())
+        return; // the folder went with its entries, which examine() tells
     {
         const std::lock_guard lock(mutex_);
         if (record->path != folder || beingWritten(folder))
             return;
     }
-    bool changed = false;
-    std::vector<Url> removed;
+    bool told = false; // one notice a batch that the folder changed
     for (const DirectoryChange& change : changes) {
-        if (change.name.empty()) { // an overflow; a folder that is gone is found by examine()
-            changed = changed || change.kind == Kind::overflow;
+        // A folder that is gone is found by examine().
+        const bool overflow = change.kind == Kind::overflow;
+        if (change.name.empty() && !overflow)
             continue;
-        }
         const Url entry = Url::file(folder + '/' + change.name, change.isDirectory);
         const auto now = PresentedItemState::read(entry.path());
-        const bool absent = now.presence == PresentedItemState::Presence::absent;
-        const bool isNews = entryChanged(*record, change.name, now);
-        const bool structural = change.kind != Kind::modified && change.kind != Kind::attributes;
-        if (!isNews || (structural && !structure))
+        if (!overflow && !entryChanged(*record, change.name, now))
             continue;
+        const bool absent = now.presence == PresentedItemState::Presence::absent;
         if (absent && leftFolder(change, changes) && !change.name.starts_with('.'))
-            removed.push_back(entry);
-        else
-            changed = true;
+            post(record, [entry](FilePresenter& presenter) {
+                presenter.accommodatePresentedSubitemDeletionAtURL(entry, [](const Failure&) {});
+            });
+        else if (!std::exchange(told, true))
+            tellChange(record);
     }
-    for (const Url& entry : removed)
-        post(record, [entry](FilePresenter& presenter) {
-            presenter.accommodatePresentedSubitemDeletionAtURL(entry, [](const Failure&) {});
-        });
-    if (changed)
-        tellChange(record);
 }
 
 } // namespace platform

@@ -55,7 +55,12 @@ public:
         give(std::move(handler));
     }
 
-    /// Waits until at least one notice more than were heard before has come.
+    /// Waits until the notices that were handed to its queue have been heard.
+    void drain() const {
+        if (const auto work = std::dynamic_pointer_cast<platform::WorkQueue>(queue_))
+            work->sync([] {});
+    }
+    /// Waits until that many notices have come.
     bool waitForNotices(std::size_t count) {
         std::unique_lock lock(mutex_);
         return heard_.wait_for(lock, std::chrono::seconds(20),
