@@ -17,7 +17,7 @@ public:
         if (path.find('\0') != std::string_view::npos)
             path = {};
         if (path.size() < short_.size()) {
-            std::memcpy(short_.data(), path.data(), path.size());
+            path.copy(short_.data(), path.size());
             short_[path.size()] = '\0';
         } else {
             long_ = path;

@@ -114,10 +114,15 @@ TEST_F(Watching, AFolderThatGoesIsReportedAndSaysNothingMore) {
 TEST_F(Watching, ATokenMayBeDroppedWithinItsHandlerAndWithTheWatcher) {
     DirectoryWatcher::Token token;
     const auto note = handler();
-    token = watcher.watch(Url::file(folder.path()), queue, [&](const auto& batch) {
-        token.reset();
-        note(batch);
-    });
+    std::mutex assignment;
+    {
+        const std::lock_guard lock(assignment);
+        token = watcher.watch(Url::file(folder.path()), queue, [&](const auto& batch) {
+            const std::lock_guard inner(assignment);
+            token.reset();
+            note(batch);
+        });
+    }
     folder.write("a");
     ASSERT_TRUE(waitFor(Kind::created, "a"));
     auto other = std::make_unique<DirectoryWatcher>();
@@ -184,6 +189,9 @@ TEST_F(Watching, AnItemIsHeardOfThroughAllComingAndGoingOfItsFolders) {
 
 /// With no descriptor left for the kernel's notices, as when the machine's watches are used up.
 TEST_F(Watching, WithoutWatchesFoldersAreReportedAsOverflownFromTimeToTime) {
+#ifdef __SANITIZE_ADDRESS__
+    GTEST_SKIP() << "its checks need descriptors themselves";
+#endif
     platform::ManualClock clock;
     platform::MainQueue main(clock);
     platform::NotificationCenter notifications;
