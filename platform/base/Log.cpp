@@ -1,5 +1,7 @@
 #include "platform/base/Log.h"
 
+#include "platform/base/OperationQueue.h"
+
 #include <cstdio>
 #include <memory>
 #include <mutex>
@@ -31,6 +33,13 @@ void logMessage(LogLevel level, std::string message, const std::source_location&
         currentSink.write(static_cast<int>(level), std::move(message), where);
     else
         std::fprintf(stderr, "%s\n", message.c_str());
+}
+
+void logMessageLater(LogLevel level, std::string message, const std::source_location& where) {
+    OperationQueue::global().async([level, message = std::move(message), where] {
+        if (logAccepts(level))
+            logMessage(level, message, where);
+    });
 }
 
 } // namespace platform

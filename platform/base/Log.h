@@ -23,6 +23,8 @@ struct LogSink {
 void setLogSink(LogSink sink);
 bool logAccepts(LogLevel level);
 void logMessage(LogLevel level, std::string message, const std::source_location& where);
+/// Logs from the process-wide queue, later.
+void logMessageLater(LogLevel level, std::string message, const std::source_location& where);
 
 /// A format with the place where it stands.
 template<class... Args>
@@ -42,6 +44,15 @@ void platformLog(LogLevel level, std::type_identity_t<LogFormat<Args...>> text,
         return;
     const std::array<FormatArgument, sizeof...(Args)> arguments{makeFormatArgument(args)...};
     logMessage(level, formatRuntime(text.format.text(), arguments), text.where);
+}
+
+/// The same from code that the log service itself rests on (preferences, notices, watched folders):
+/// it may be the log service's own start that calls it, and then nobody may log on that thread.
+template<class... Args>
+void platformLogLater(LogLevel level, std::type_identity_t<LogFormat<Args...>> text,
+                      const Args&... args) {
+    const std::array<FormatArgument, sizeof...(Args)> arguments{makeFormatArgument(args)...};
+    logMessageLater(level, formatRuntime(text.format.text(), arguments), text.where);
 }
 
 } // namespace platform

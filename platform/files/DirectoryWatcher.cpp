@@ -21,7 +21,7 @@ bool isLimit(int number) {
 void sayLimitOnce() {
     static std::atomic<bool> said{false};
     if (!said.exchange(true))
-        platformLog(LogLevel::warning, "The system's limit of watched folders is reached; some "
+        platformLogLater(LogLevel::warning, "The system's limit of watched folders is reached; some "
                                        "folders are read again every half minute instead. Raise "
                                        "fs.inotify.max_user_watches to avoid this.");
 }
@@ -109,7 +109,7 @@ DirectoryWatcher::Token DirectoryWatcher::watch(const Url& folder, Executor& que
         std::make_shared<WatchRegistration>(folder.path(), queue, std::move(handler));
     const int number = InotifyLoop::shared().add(registration);
     if (number != 0 && !isLimit(number)) {
-        platformLog(LogLevel::warning, "Cannot watch the folder %@: %@", folder,
+        platformLogLater(LogLevel::warning, "Cannot watch the folder %@: %@", folder,
                     posixError(number, folder, false));
         return {};
     }

@@ -1,5 +1,7 @@
 #pragma once
 
+#include "platform/base/Clock.h"
+
 #include <cstdint>
 #include <memory>
 #include <string>
@@ -30,7 +32,8 @@ public:
     virtual ~JotService() = default;
     virtual JotHandle open(std::string_view sender, std::string_view facility,
                            std::uint32_t options) = 0;
-    /// Bit n set lets records of level n through; 0xFF after opening.
+    /// Bit n set lets records of level n (the text of their key "Level") through; 0xFF after
+    /// opening. A record whose level has no bit of its own passes.
     virtual void setFilter(JotHandle handle, std::uint32_t mask) = 0;
     /// None when the service cannot make one.
     virtual std::unique_ptr<JotRecord> createRecord() = 0;
@@ -38,8 +41,10 @@ public:
     virtual void close(JotHandle handle) = 0;
 };
 
-/// The machine's journal when it answers, else files "log", "log.1", … in `stateFolder`.
-std::unique_ptr<JotService> makeJotService(std::string stateFolder);
+/// The machine's journal when it answers, else files "log", "log.1", … in `stateFolder`: a JSON
+/// object a line, a few megabytes each, shared by all processes that log there. `clock` times the
+/// limit of the rate (none: the machine's) and outlives the service.
+std::unique_ptr<JotService> makeJotService(std::string stateFolder, const Clock* clock = nullptr);
 
 /// Writes one line to the console (standard error) with time and process before it.
 void writeConsoleLine(std::string_view line);

@@ -37,7 +37,9 @@ public:
     virtual void setValue(const PreferencesDomain& domain, std::string_view key, Value value) = 0;
 };
 
-/// Files below `configFolder`; `managedFile` holds the administrator's values (may be missing).
+/// Files below `configFolder`, one a domain, written whole or not at all and one process at a time;
+/// a damaged one is set aside as "….damaged" and made anew from what is known. `managedFile` holds
+/// the administrator's values (may be missing): a JSON object of keys and values for every domain.
 std::unique_ptr<PreferencesStore> makeFilePreferences(std::string configFolder,
                                                       std::string managedFile);
 
@@ -47,7 +49,7 @@ public:
     explicit StandardPreferences(PreferencesStore& store);
     bool synchronize();
     Value value(std::string_view key);
-    /// 0 when the key is absent or no number.
+    /// 0 when the key is absent or no number; a number with decimals is truncated.
     std::int64_t integer(std::string_view key);
     void setValue(std::string_view key, Value value);
     void removeValue(std::string_view key) { setValue(key, {}); }
