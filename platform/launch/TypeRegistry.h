@@ -32,16 +32,19 @@ inline constexpr std::string_view markdown = "public.markdown";
 } // namespace types
 
 /// The type system, over the desktop's shared MIME database: every type is an identifier in
-/// reverse-domain form; families conform to one another. By name alone, so that a promised file has
-/// its type without its content. Immutable; safe from any thread.
+/// reverse-domain form; families conform to one another. The well-known have names of their own
+/// ("public.png"), the others "org.freedesktop.mime." with the MIME type's two parts. By name
+/// alone, so that a promised file has its type without its content. A type that is merely stored in
+/// an archive's format (a text document, a book) is no archive. Safe from any thread.
 class TypeRegistry {
 public:
     /// The identifier for a file-name extension (without its dot, any letter case). An extension
     /// that nobody knows gets a made-up one ("dyn.EXT") that conforms to public.data; none for "".
     static std::optional<std::string> preferredIdentifierForExtension(std::string_view extension);
-    /// By the whole file name (for names such as "Makefile" or "x.tar.gz").
+    /// By the whole file name (for names such as "Makefile" or "x.tar.gz"). A package's name
+    /// answers the package's type; one that nobody knows is as its extension says, or public.data.
     static std::string identifierForFileName(std::string_view name);
-    /// By the name, then by the content's first bytes.
+    /// By what stands there: a file's name, then its content's first bytes; folders by their names.
     static std::string identifierForFile(std::string_view path);
     static std::string identifierForMimeType(std::string_view mimeType);
     /// "application/octet-stream" when there is none.
