@@ -3,6 +3,7 @@
 #include "platform/base/Text.h"
 #include "platform/base/Url.h"
 #include "platform/launch/TypeCache.h"
+#include "platform/launch/TypeNameRules.h"
 #include "platform/launch/TypeTable.h"
 
 #include <QLocale>
@@ -32,14 +33,6 @@ using Table = std::map<std::string_view, std::string_view>;
 
 QString qtText(std::string_view text) {
     return QString::fromUtf8(text.data(), static_cast<qsizetype>(text.size()));
-}
-
-std::string lowercase(std::string_view text) {
-    std::string out(text);
-    for (char& c : out)
-        if (c >= 'A' && c <= 'Z')
-            c = static_cast<char>(c - 'A' + 'a');
-    return out;
 }
 
 const QMimeDatabase& database() {
@@ -182,12 +175,19 @@ std::string unknownIdentifier(std::string_view extension) {
                              : std::string(unknownPrefix) + lowercase(extension);
 }
 
-/// The database's answer for a name; none when it knows no rule for it.
-std::optional<std::string> identifierByName(std::string_view name) {
+std::optional<std::string> askByName(std::string_view name) {
     const QList<QMimeType> found = database().mimeTypesForFileName(qtText(name));
     if (found.isEmpty())
         return std::nullopt;
     return identifierOf(found.front().name().toStdString());
+}
+
+/// The database's answer for a name; none when it knows no rule for it.
+std::optional<std::string> identifierByName(std::string_view name) {
+    static TypeCache<std::optional<std::string>> cache;
+    if (const auto end = TypeNameRules::shared().decidingEnd(name))
+        return cache.get(*end, [name](const std::string&) { return askByName(name); });
+    return askByName(name);
 }
 
 /// The first bytes of a file; fewer when it is shorter, none when it cannot be read.

@@ -50,6 +50,18 @@ TEST(Types, TheWellKnownHaveNamesOfTheirOwn) {
     EXPECT_EQ(typeOf("Offer.XYZZY"), "dyn.xyzzy");
 }
 
+TEST(Types, NamesThatEndAlikeMayStillDiffer) {
+    EXPECT_EQ(typeOf("lists.txt"), types::plainText);
+    EXPECT_EQ(typeOf("CMakeLists.txt"), "org.freedesktop.mime.text.x-cmake");
+    EXPECT_EQ(typeOf("picture.gz"), "public.gzip-archive");
+    EXPECT_EQ(typeOf("v1.2 picture.svg.gz"), "org.freedesktop.mime.image.svg+xml-compressed");
+    EXPECT_EQ(typeOf("README.xyzzy"), "org.freedesktop.mime.text.x-readme");
+    EXPECT_EQ(typeOf("a.c"), "public.c-source");
+    EXPECT_EQ(typeOf("a.C"), "public.c-plus-plus-source") << "case tells these apart";
+    EXPECT_EQ(typeOf(".xyzzy"), types::data) << "a hidden name is no extension";
+    EXPECT_EQ(typeOf("a.xyzzy"), "dyn.xyzzy");
+}
+
 TEST(Types, FamiliesAreThoseThatAPersonExpects) {
     EXPECT_EQ(familiesOf("a.png"), "iCD");
     EXPECT_EQ(familiesOf("a.svg"), "itpCD") << "a picture that is written as text";
