@@ -17,14 +17,15 @@ namespace {
 /// The one context under which every text stands in the translation files.
 constexpr const char* context = "tavrin";
 
+/// Both live as long as the process: other threads may still make texts while it ends.
 std::unique_ptr<QTranslator>& table() {
-    static std::unique_ptr<QTranslator> translator;
-    return translator;
+    static auto* const translator = new std::unique_ptr<QTranslator>();
+    return *translator;
 }
 
 std::string& tableLanguage() {
-    static std::string language = "en";
-    return language;
+    static auto* const language = new std::string("en");
+    return *language;
 }
 
 std::string lookUp(std::string_view key, int count) {

@@ -55,6 +55,7 @@ AccessArbiter& AccessArbiter::shared() {
 
 AccessArbiter::Outcome AccessArbiter::acquire(AccessClaim& claim) {
     std::unique_lock lock(mutex_);
+    claim.stage_ = AccessClaim::Stage::waiting; // it may have been granted and released before
     if (claim.cancel_.isCancelled())
         return Outcome::cancelled;
     if (canBeGranted(claim)) {

@@ -21,9 +21,10 @@ bool isLimit(int number) {
 void sayLimitOnce() {
     static std::atomic<bool> said{false};
     if (!said.exchange(true))
-        platformLogLater(LogLevel::warning, "The system's limit of watched folders is reached; some "
-                                       "folders are read again every half minute instead. Raise "
-                                       "fs.inotify.max_user_watches to avoid this.");
+        platformLogLater(LogLevel::warning,
+                         "The system's limit of watched folders is reached; some "
+                         "folders are read again every half minute instead. Raise "
+                         "fs.inotify.max_user_watches to avoid this.");
 }
 
 } // namespace
@@ -110,7 +111,7 @@ DirectoryWatcher::Token DirectoryWatcher::watch(const Url& folder, Executor& que
     const int number = InotifyLoop::shared().add(registration);
     if (number != 0 && !isLimit(number)) {
         platformLogLater(LogLevel::warning, "Cannot watch the folder %@: %@", folder,
-                    posixError(number, folder, false));
+                         posixError(number, folder, false));
         return {};
     }
     {

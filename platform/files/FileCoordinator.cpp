@@ -262,6 +262,10 @@ void FileCoordinator::removeFilePresenter(const FilePresenter* presenter) {
     PresenterRegistry::shared().remove(presenter);
 }
 
+void FileCoordinator::waitUntilIdle() {
+    PresenterRegistry::shared().waitUntilIdle();
+}
+
 void FileCoordinator::setContentProvider(ContentProvider* provider) {
     ContentProviderSlot::shared().set(provider);
 }

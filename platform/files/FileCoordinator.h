@@ -81,6 +81,10 @@ public:
     /// The same for a presenter that is being destroyed.
     static void removeFilePresenter(const FilePresenter* presenter);
 
+    /// Waits until what the kernel has reported of presented items so far is dealt with. Before the
+    /// installed runtime goes away, so that nobody uses its clock any more.
+    static void waitUntilIdle();
+
     /// Who fetches promised contents; none before there is a store. Not owned. Replacing it cancels
     /// what it fetches and waits until nobody is inside it any more.
     static void setContentProvider(ContentProvider* provider);

@@ -13,7 +13,7 @@
 namespace platform {
 namespace {
 
-constexpr std::size_t copyStep = 1024 * 1024;
+constexpr std::size_t copyStep = 1024UL * 1024;
 
 /// Copies [start, end) through memory.
 int copyThroughMemory(int from, int to, off_t start, off_t end) {

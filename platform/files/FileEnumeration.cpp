@@ -12,7 +12,7 @@ namespace platform {
 namespace {
 
 /// One system call's worth of entries: a few thousand names.
-constexpr std::size_t bufferSize = 256 * 1024;
+constexpr std::size_t bufferSize = 256UL * 1024;
 
 FileKind kindOf(unsigned char type) {
     switch (type) {

@@ -103,7 +103,7 @@ Result<Bytes> FileManager::contents(const Url& file, std::uint64_t limit) {
     if (!S_ISREG(info.st_mode))
         return posixError(EINVAL, file, false);
     // The size is a hint only: the file may grow meanwhile, and some file systems tell none.
-    constexpr std::size_t step = 64 * 1024;
+    constexpr std::size_t step = 64UL * 1024;
     Bytes bytes(std::min<std::uint64_t>(static_cast<std::uint64_t>(info.st_size) + 1, limit));
     std::size_t length = 0;
     while (length < limit) {

@@ -81,6 +81,11 @@ public:
     void noteMove(WriteScope& scope, const std::string& from, const std::string& to);
     void endWrite(const WriteScope& scope);
 
+    /// Until all that is queued for examination has been examined.
+    void waitUntilIdle() {
+        queue_.sync([] {});
+    }
+
 private:
     PresenterRegistry() = default;
 

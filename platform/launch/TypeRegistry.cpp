@@ -26,7 +26,7 @@ constexpr std::string_view unknownPrefix = "dyn.";
 constexpr std::string_view noMimeType = "application/octet-stream";
 constexpr std::string_view archiveIcon = "package-x-generic";
 /// As much of a file as the database's rules for contents look at.
-constexpr std::size_t headSize = 16 * 1024;
+constexpr std::size_t headSize = 16UL * 1024;
 
 using Names = std::set<std::string, std::less<>>;
 using Table = std::map<std::string_view, std::string_view>;

@@ -13,7 +13,7 @@
 namespace platform {
 namespace {
 
-constexpr off_t sizeLimit = 4 * 1024 * 1024;
+constexpr off_t sizeLimit = 4L * 1024 * 1024;
 /// "log" itself and four older ones.
 constexpr int fileCount = 5;
 

@@ -5,7 +5,6 @@
 #include <algorithm>
 #include <cerrno>
 #include <cstring>
-#include <map>
 #include <sys/socket.h>
 #include <sys/uio.h>
 #include <sys/un.h>
@@ -18,11 +17,13 @@ namespace {
 constexpr const char* journalSocket = "/run/systemd/journal/socket";
 constexpr std::size_t longestField = 64;
 
-/// The journal's own names for what every record says.
-const std::map<std::string_view, const char*>& wellKnownFields() {
-    static const std::map<std::string_view, const char*> fields = {
-        {"Source", "CODE_FILE"}, {"Line", "CODE_LINE"}, {"Function", "CODE_FUNC"}};
-    return fields;
+/// The journal's own name for what every record says; "" for other keys.
+std::string_view wellKnownField(std::string_view key) {
+    if (key == "Source")
+        return "CODE_FILE";
+    if (key == "Line")
+        return "CODE_LINE";
+    return key == "Function" ? "CODE_FUNC" : "";
 }
 
 /// The journal takes capitals, digits and underscores, not in front an underscore or a digit.
@@ -60,12 +61,13 @@ public:
             add(field, value);
             if (!saysTheSame(key, field))
                 add("KEY_OF_" + field.substr(0, longestField - 7), key);
-            if (const auto known = wellKnownFields().find(key); known != wellKnownFields().end())
-                add(known->second, value);
+            if (const std::string_view known = wellKnownField(key); !known.empty())
+                add(known, value);
             if (key == "Level")
                 add("PRIORITY", value.size() == 1 && value < "8" ? value : "7");
         }
         std::vector<iovec> parts;
+        parts.reserve(fields.size());
         for (std::string& field : fields)
             parts.push_back({field.data(), field.size()});
         return sd_journal_sendv(parts.data(), static_cast<int>(parts.size())) == 0;

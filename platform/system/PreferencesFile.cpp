@@ -15,7 +15,7 @@ namespace platform {
 namespace {
 
 /// Far more than settings need; a larger file is none of ours.
-constexpr std::uint64_t sizeLimit = 16 * 1024 * 1024;
+constexpr std::uint64_t sizeLimit = 16UL * 1024 * 1024;
 constexpr int damagedFilesKept = 100;
 
 /// A file name for any text: nothing in it leads to another folder.

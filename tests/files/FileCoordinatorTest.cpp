@@ -301,13 +301,23 @@ TEST_F(Promises, AFailedDownloadIsTheReadsError) {
 }
 
 TEST_F(Promises, ADocumentEvictedBeforeItsReadIsFetchedAgain) {
-    Holder writer([&](const auto& inside) { write(item, WritingOptions::forReplacing, inside); });
+    auto first = std::make_unique<Holder>(
+        [&](const auto& inside) { write(item, WritingOptions::forReplacing, inside); });
     std::optional<Worker> reader;
     startReading(reader);
-    provider.finish(2);
+    provider.finish(1);
     reader->untilBlocked(); // it has the content and waits for the writer
     provider.promise(item);
-    writer.end();
+    first.reset();
+    provider.waitForDownloads(2);
+    Holder second([&](const auto& inside) { write(item, WritingOptions::forReplacing, inside); });
+    provider.finish(2);
+    while (provider.isPromised(item))
+        std::this_thread::yield();
+    reader->untilBlocked();
+    EXPECT_FALSE(reader->done()) << "it waits again, like anybody";
+    EXPECT_EQ(seen, "");
+    second.end();
     reader.reset();
     EXPECT_EQ(result, "granted");
     EXPECT_EQ(provider.started(), 2);

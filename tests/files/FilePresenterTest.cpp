@@ -299,6 +299,7 @@ struct PresentingInTime : Presenting {
     PresentingInTime() { platform::Runtime::install(&runtime); }
     ~PresentingInTime() override {
         presenters.clear();
+        FileCoordinator::waitUntilIdle();
         platform::Runtime::install(nullptr);
     }
 };
