@@ -25,6 +25,7 @@ enum class FileKind { file, directory, symbolicLink, other };
 struct FileAttributes {
     FileKind kind = FileKind::file;
     std::uint64_t size = 0;
+    /// Date{} when the file system reports no birth time.
     Date created;
     Date modified;
     /// Time of the last change of content or attributes (ctime).
@@ -58,16 +59,19 @@ public:
     /// Makes the folder, with missing parents when `intermediates`. An existing folder is success
     /// then, and fileExists otherwise.
     static Failure createDirectory(const Url& folder, bool intermediates);
-    /// Removes a file, a link, or a folder with its contents. Stops at the first failure.
+    /// Removes a file, a link, or a folder with its contents. Stops at the first failure. Follows
+    /// no link and enters no other mounted disk (itemBusy).
     static Failure removeItem(const Url& item);
     /// Renames without ever replacing: fileExists when something stands at `to`. On another file
     /// system it answers unsupportedOperation with errno EXDEV's reason.
     static Failure moveItem(const Url& from, const Url& to);
     /// Swaps two items of one file system at once.
     static Failure exchangeItems(const Url& a, const Url& b);
-    /// Copies one file's content and times into a new file; removes the copy when that fails.
+    /// Copies one file's content and times into a new file; removes the copy when that fails, also
+    /// when the file changed meanwhile (changedWhileRead).
     static Failure copyFile(const Url& from, const Url& to);
 
+    /// The first `limit` bytes, or all when the file is shorter. Regular files only; never waits.
     static Result<Bytes> contents(const Url& file, std::uint64_t limit);
     /// Writes beside the target, syncs, renames over it, syncs the folder: after a crash either the
     /// old content or the whole new one is there.
