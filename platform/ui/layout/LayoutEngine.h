@@ -2,6 +2,7 @@
 
 #include "platform/ui/layout/LayoutItem.h"
 
+#include <functional>
 #include <memory>
 
 namespace platform {
@@ -17,22 +18,33 @@ public:
     LayoutEngine(const LayoutEngine&) = delete;
     LayoutEngine& operator=(const LayoutEngine&) = delete;
 
+    /// A subtree comes in parent first; the active constraints that mention the item wake up once
+    /// both their ends are here. To move an item in the tree, remove its subtree and add it again.
     void addItem(LayoutItem& item);
-    /// Takes the item's constraints out of the solution; they come back with the item.
+    /// Takes the item's constraints out of the solution; they come back with the item. The items
+    /// below it have to leave as well, before the next solve().
     void removeItem(LayoutItem& item);
-    /// Its intrinsic size, priorities, hand frame or kind of layout changed.
+    /// Its intrinsic size, priorities, hand frame or kind of layout changed. The next solve() hands
+    /// it its frame again, changed or not.
     void itemChanged(LayoutItem& item);
+
+    /// Called by LayoutConstraint: an active constraint whose two ends are here.
     void addConstraint(const LayoutConstraint::Pointer& constraint);
     void removeConstraint(const LayoutConstraint& constraint);
     /// Its constant or its priority changed.
     void constraintChanged(const LayoutConstraint& constraint);
 
+    /// The size of every item without a parent. Conflicts are not logged while it is empty: a
+    /// window that has no area yet contradicts every margin.
     void setRootSize(Size size);
     void setRightToLeft(bool rightToLeft);
     void setPixelsPerPoint(double pixelsPerPoint);
 
+    /// `dirtied` is called when a change makes needsSolve() true: the time to schedule a pass.
+    void setOnNeedsSolve(std::function<void()> dirtied);
     bool needsSolve() const;
-    /// Solves what changed and hands every item whose frame changed its new one.
+    /// Solves what changed and hands every item whose frame changed its new one, parents first.
+    /// What items change while they are handed their frames waits for the next solve().
     void solve();
 
 private:
