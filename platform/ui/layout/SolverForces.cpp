@@ -1,0 +1,168 @@
+#include "platform/ui/layout/SolverState.h"
+
+#include <algorithm>
+#include <cmath>
+
+namespace platform::layout {
+
+namespace {
+
+/// Forces are sums and shares of weights near 1; below this they are rounding errors.
+constexpr double forceTolerance = 1e-9;
+constexpr double forceNoise = 1e-12;
+/// How far, in points, a row may be off before it counts as off.
+constexpr double residualTolerance = 1e-8;
+
+/// Falls so slowly that neighbours among the first million rows still differ.
+double tieWeight(std::uint64_t age) {
+    return 1 + 1 / (1 + std::log2(2 + static_cast<double>(age)));
+}
+
+} // namespace
+
+double Solver::State::weightAt(const Weight& weight, std::size_t level) const {
+    if (weight.level < 0)
+        return 0;
+    if (static_cast<std::size_t>(weight.level) == level)
+        return weight.amount;
+    return level == tieLevel() ? weight.tie : 0;
+}
+
+bool Solver::State::knowsPriority(float priority) const {
+    return priority <= 0 || priority >= layout::required ||
+           std::binary_search(priorities.begin(), priorities.end(), priority, std::greater<>());
+}
+
+Weight Solver::State::weightFor(float priority, const RowState& row) const {
+    if (row.isRemoved || priority <= 0)
+        return {};
+    if (priority >= layout::required && !row.givesWay)
+        return {0, 1, 0};
+    const auto found = std::lower_bound(priorities.begin(), priorities.end(),
+                                        std::min(priority, layout::required), std::greater<>());
+    return {static_cast<int>(found - priorities.begin()) + 1, 1, tieWeight(row.age)};
+}
+
+void Solver::State::assignWeights(Row row) {
+    RowState& state = at(row);
+    const auto cells = matrix.cells(row);
+    const bool isOwn =
+        cells.size() == 1 && variables[static_cast<std::size_t>(cells[0].variable)].own == row;
+    if (!isOwn) {
+        state.below = weightFor(state.strength.below, state);
+        state.above = weightFor(state.strength.above, state);
+        return;
+    }
+    // Irregular weights, so that no two answers are equally near to zero.
+    const auto variable = static_cast<std::size_t>(cells[0].variable);
+    const double irregular = std::fmod(static_cast<double>(variable) * 0.6180339887498949, 1.0);
+    const bool isSize = variables[variable].kind == Kind::size;
+    const double amount = (isSize ? 1.0 : 2.0) * (1 + 0.2 * irregular);
+    state.above = {static_cast<int>(tieLevel()) + 1, amount, 0};
+    state.below = isSize ? Weight{0, 1, 0} : state.above;
+}
+
+void Solver::State::changeWeights(Row row) {
+    queuePull(row, -1);
+    assignWeights(row);
+    queuePull(row, 1);
+    const RowState& state = at(row);
+    if (state.isTight()) {
+        changeForce(state.slot, 0, 0);
+    } else if (state.side != Side::on) {
+        const Weight& weight = state.side == Side::above ? state.above : state.below;
+        if (weight.level == 0)
+            suspects.push_back(row);
+    }
+}
+
+void Solver::State::queuePull(Row row, double sign) {
+    const RowState& state = at(row);
+    if (state.isTight() || state.side == Side::on)
+        return;
+    const bool isAbove = state.side == Side::above;
+    const Weight& weight = isAbove ? state.above : state.below;
+    if (weight.level < 0)
+        return;
+    const double direction = isAbove ? sign : -sign;
+    pulls.push_back({weight.level, row, direction * weight.amount});
+    if (weight.tie != 0)
+        pulls.push_back({static_cast<int>(tieLevel()), row, direction * weight.tie});
+}
+
+void Solver::State::setSide(Row row, Side side) {
+    RowState& state = at(row);
+    if (state.side == side)
+        return;
+    queuePull(row, -1);
+    state.side = side;
+    queuePull(row, 1);
+    if ((side == Side::above && state.above.level == 0) ||
+        (side == Side::below && state.below.level == 0))
+        suspects.push_back(row);
+}
+
+void Solver::State::chooseSide(Row row) {
+    // A row that is met exactly keeps its side: any pull up to its weight is right there.
+    const double residual = at(row).residual;
+    if (residual > residualTolerance)
+        setSide(row, Side::above);
+    else if (residual < -residualTolerance)
+        setSide(row, Side::below);
+}
+
+void Solver::State::applyPulls() {
+    std::stable_sort(pulls.begin(), pulls.end(),
+                     [](const Pull& a, const Pull& b) { return a.level < b.level; });
+    for (std::size_t i = 0; i < pulls.size();) {
+        const int level = pulls[i].level;
+        work.clear();
+        for (; i < pulls.size() && pulls[i].level == level; ++i)
+            for (const auto& cell : matrix.cells(pulls[i].row))
+                work.add(factor.slotOf(cell.variable), cell.coefficient * pulls[i].amount);
+        factor.combine(work);
+        work.ascending([&](std::size_t slot, double amount) {
+            changeForce(slot, static_cast<std::size_t>(level), -amount);
+        });
+    }
+    pulls.clear();
+}
+
+void Solver::State::changeForce(std::size_t slot, std::size_t level, double amount) {
+    double& force = forces[slot * levelCount() + level];
+    force += amount;
+    if (std::abs(force) < forceNoise)
+        force = 0;
+    if (!isTouchedSlot[slot]) {
+        isTouchedSlot[slot] = true;
+        touchedSlots.push_back(slot);
+    }
+}
+
+void Solver::State::checkTouchedSlots() {
+    for (const std::size_t slot : touchedSlots) {
+        isTouchedSlot[slot] = false;
+        if (const auto found = overload(slot))
+            overloaded[static_cast<std::size_t>(found->level)].push_back(slot);
+    }
+    touchedSlots.clear();
+}
+
+std::optional<Solver::State::Overload> Solver::State::overload(std::size_t slot) const {
+    const RowState& row = at(tight[slot]);
+    const std::size_t levels = levelCount();
+    const double* force = &forces[slot * levels];
+    for (const int direction : {1, -1}) {
+        const Weight& limit = direction > 0 ? row.above : row.below;
+        for (std::size_t level = 0; level < levels; ++level) {
+            const double excess = direction * force[level] - weightAt(limit, level);
+            if (excess > forceTolerance)
+                return Overload{static_cast<int>(level), direction};
+            if (excess < -forceTolerance)
+                break;
+        }
+    }
+    return std::nullopt;
+}
+
+} // namespace platform::layout

@@ -1,0 +1,195 @@
+#pragma once
+
+#include "platform/ui/layout/BasisFactor.h"
+#include "platform/ui/layout/Solver.h"
+
+#include <optional>
+
+namespace platform::layout {
+
+// How the solver works, for its source files only.
+//
+// Every row is either tight (one a slot; their values alone say where the variables are) or loose
+// (too small, too large, or just as it should be). A loose row pulls with the weight of the side
+// that it has missed; the tight rows carry what the loose ones pull. The answer is the best one
+// when no tight row has to carry more than its own weight. A row that does is let go: values slide
+// along until a row that they meet resists more than is gained, and that one becomes tight instead.
+//
+// Weights have a level for every priority, compared one after the other, so that no sum of low ones
+// outweighs a high one: level 0 is what is required, then the priorities downward, then the ties
+// between rows of one priority, then the wish of every variable to be zero.
+
+/// What a row loses by a unit of violation on one side. Nothing when `level` is negative.
+struct Weight {
+    int level = -1;
+    double amount = 0;
+    /// The row's part in the level of ties: the older, the more.
+    double tie = 0;
+};
+
+enum class Side { on, below, above };
+
+struct RowState {
+    Strength strength;
+    Weight below;
+    Weight above;
+    /// What counts in the present solution, and what is wanted from the next on.
+    double constant = 0;
+    double wantedConstant = 0;
+    /// Value minus constant. Kept for loose rows only.
+    double residual = 0;
+    std::uint64_t age = 0;
+    static constexpr std::size_t noSlot = static_cast<std::size_t>(-1);
+    std::size_t slot = noSlot;
+    Side side = Side::on;
+    bool inUse = false;
+    bool isRemoved = false;
+    bool isNew = false;
+    bool givesWay = false;
+    bool isTight() const { return slot != noSlot; }
+};
+
+struct VariableState {
+    Solver::Kind kind = Solver::Kind::position;
+    /// variable == 0: keeps sizes from being negative and everything near zero.
+    Row own = -1;
+    double value = 0;
+    double reported = 0;
+    bool isNew = true;
+    bool isTouched = false;
+    bool isRemoved = false;
+};
+
+struct Solver::State {
+    /// A tight row that carries too much: from which level on, and to which side it is to move.
+    struct Overload {
+        int level;
+        int direction;
+    };
+    struct Pull {
+        int level;
+        Row row;
+        double amount;
+    };
+    struct Meeting {
+        double distance;
+        /// By how much the row's value changes over a unit of distance.
+        double rate;
+        Row row;
+    };
+
+    State();
+
+    // Solver.cpp
+    Variable appendVariable();
+    Row insertRow(std::span<const Term> terms, double constant, Strength strength,
+                  std::uint64_t age);
+    void touch(Variable variable);
+    void prepare();
+    void update();
+    void moveConstants();
+    bool releaseRemoved();
+    void eraseRemoved();
+    void collect();
+
+    // SolverStart.cpp: a new set of tight rows, chosen and factored.
+    void start();
+    void collectLevels();
+    void chooseTight();
+    void refactor();
+    void refresh();
+    void findValues();
+    void findForces();
+
+    // SolverForces.cpp
+    std::size_t levelCount() const { return priorities.size() + 3; }
+    std::size_t tieLevel() const { return priorities.size() + 1; }
+    bool knowsPriority(float priority) const;
+    Weight weightFor(float priority, const RowState& row) const;
+    void assignWeights(Row row);
+    double weightAt(const Weight& weight, std::size_t level) const;
+    void changeWeights(Row row);
+    void queuePull(Row row, double sign);
+    void setSide(Row row, Side side);
+    void chooseSide(Row row);
+    void applyPulls();
+    void changeForce(std::size_t slot, std::size_t level, double amount);
+    void checkTouchedSlots();
+    std::optional<Overload> overload(std::size_t slot) const;
+
+    // SolverExchange.cpp
+    void optimise();
+    bool isCautious() const;
+    std::optional<std::size_t> nextOverloaded();
+    std::optional<std::size_t> firstOverloaded() const;
+    bool exchange(std::size_t slot, int direction);
+    void slide(std::size_t slot, int direction);
+    void findRates();
+    void forgetRates();
+    auto laterMeeting() const;
+    void findMeetings();
+    std::optional<Meeting> findEntering(std::size_t slot, int direction);
+    bool addResistance(const Meeting& meeting);
+    bool isDownhill() const;
+    void moveBy(double distance);
+    void handOver(std::size_t slot, int direction, const Meeting& entering);
+
+    // SolverConflicts.cpp
+    void settleConflicts();
+    void resolve();
+    bool isViolated(Row row) const;
+    std::vector<Row> contradiction() const;
+    void giveWay(Row row, std::vector<Row> against);
+    void takeBack(Row row);
+
+    RowState& at(Row row) { return rows[static_cast<std::size_t>(row)]; }
+    const RowState& at(Row row) const { return rows[static_cast<std::size_t>(row)]; }
+
+    SparseRows matrix;
+    std::vector<RowState> rows;
+    std::vector<VariableState> variables;
+    std::vector<Variable> freeVariables;
+
+    BasisFactor factor;
+    std::vector<Row> tight;
+    /// By slot and level.
+    std::vector<double> forces;
+    /// Levels 1 and on, the highest first. 1000 stands for the requirements that give way.
+    std::vector<float> priorities;
+
+    // What changed since the last solution.
+    bool isDirty = false;
+    bool needsStart = true;
+    std::size_t structuralChanges = 0;
+    std::vector<Row> newRows;
+    std::vector<Row> removedRows;
+    std::vector<Row> movedRows;
+    std::vector<Variable> removedVariables;
+    std::vector<Pull> pulls;
+
+    // Work of the moment.
+    SlotVector slideVector;
+    SlotVector combination;
+    SlotVector work;
+    std::vector<double> rates;
+    std::vector<bool> isRated;
+    std::vector<Row> ratedRows;
+    std::vector<Meeting> meetings;
+    std::vector<Row> passed;
+    std::vector<double> slope;
+    std::vector<std::size_t> touchedSlots;
+    std::vector<bool> isTouchedSlot;
+    std::vector<std::vector<std::size_t>> overloaded;
+    std::size_t idleExchanges = 0;
+
+    /// Rows that pull with a required weight.
+    std::vector<Row> suspects;
+    std::vector<Conflict> conflicts;
+
+    std::vector<Variable> touched;
+    std::vector<Variable> changed;
+    std::size_t exchanges = 0;
+    bool isCutShort = false;
+};
+
+} // namespace platform::layout
