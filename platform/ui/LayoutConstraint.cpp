@@ -72,6 +72,11 @@ LayoutEngine* LayoutConstraint::Impl::engine() const {
     return !second.link || second.link->engine == engine ? engine : nullptr;
 }
 
+layout::Strength LayoutConstraint::Impl::strength() const {
+    return {relation == LayoutRelation::lessOrEqual ? 0 : priority,
+            relation == LayoutRelation::greaterOrEqual ? 0 : priority};
+}
+
 void LayoutConstraint::Impl::setActive(LayoutConstraint& self, bool value) {
     if (active == value)
         return;

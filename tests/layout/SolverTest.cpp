@@ -107,4 +107,87 @@ TEST(Solver, FindsTheLeastViolationAtEveryPriority) {
     }
 }
 
+/// A system that changes all the time, and the same system told to a new solver.
+class Churn {
+public:
+    Churn(Dice& dice, std::size_t variables)
+        : dice_(dice), kinds_(dice.system(variables, 0).kinds), fed_(kinds_) {}
+
+    void change() {
+        const int what = lines_.empty() ? 0 : dice_.roll(0, 9);
+        const auto at = static_cast<std::size_t>(
+            lines_.empty() ? 0 : dice_.roll(0, static_cast<int>(lines_.size()) - 1));
+        if (what < 4) {
+            lines_.push_back(dice_.line(kinds_.size()));
+            ages_.push_back(++age_);
+            rows_.push_back(fed_.add(lines_.back(), age_));
+        } else if (what < 6) {
+            fed_.solver.removeRow(rows_[at]);
+            lines_.erase(lines_.begin() + static_cast<std::ptrdiff_t>(at));
+            ages_.erase(ages_.begin() + static_cast<std::ptrdiff_t>(at));
+            rows_.erase(rows_.begin() + static_cast<std::ptrdiff_t>(at));
+        } else if (what < 9) {
+            lines_[at].constant = dice_.roll(-6, 12);
+            fed_.solver.setConstant(rows_[at], lines_[at].constant);
+        } else {
+            lines_[at].strength = dice_.strength();
+            fed_.solver.setStrength(rows_[at], lines_[at].strength);
+        }
+    }
+    std::vector<double> solved() {
+        fed_.solver.solve();
+        return fed_.values();
+    }
+    std::vector<double> solvedAfresh() const {
+        Fed fresh(kinds_);
+        for (std::size_t i = 0; i < lines_.size(); ++i)
+            fresh.add(lines_[i], ages_[i]);
+        fresh.solver.solve();
+        return fresh.values();
+    }
+    std::size_t exchanges() const { return fed_.solver.exchanges(); }
+
+private:
+    Dice& dice_;
+    std::vector<Solver::Kind> kinds_;
+    Fed fed_;
+    std::vector<test::System::Line> lines_;
+    std::vector<std::uint64_t> ages_;
+    std::vector<Row> rows_;
+    std::uint64_t age_ = 0;
+};
+
+TEST(Solver, AnswersTheSameHoweverItCameThere) {
+    Dice dice(2);
+    for (int round = 0; round < 300; ++round) {
+        Churn churn(dice, static_cast<std::size_t>(dice.roll(2, 12)));
+        for (int step = 0; step < 40; ++step) {
+            for (int change = dice.roll(1, 4); change > 0; --change)
+                churn.change();
+            const auto values = churn.solved();
+            const auto fresh = churn.solvedAfresh();
+            for (std::size_t v = 0; v < values.size(); ++v)
+                ASSERT_NEAR(values[v], fresh[v], 1e-6) << "round " << round << ", step " << step;
+        }
+    }
+}
+
+TEST(Solver, EndsOnAnySoup) {
+    Dice dice(3);
+    for (int round = 0; round < 10000; ++round) {
+        auto system = dice.system(static_cast<std::size_t>(dice.roll(1, 12)),
+                                  static_cast<std::size_t>(dice.roll(0, 30)));
+        for (auto& line : system.lines) {
+            if (dice.roll(0, 1))
+                line.strength.below = static_cast<float>(dice.roll(0, 1000));
+            if (dice.roll(0, 9) == 0)
+                line.constant = dice.pick<double>({NAN, INFINITY, -INFINITY, 1e300, 1e-300});
+            if (dice.roll(0, 9) == 0)
+                line.coefficients[0] = dice.pick<double>({NAN, INFINITY, 1e300, 1e-9, 1000});
+        }
+        for (const double value : Fed(system).values())
+            ASSERT_TRUE(std::isfinite(value)) << "round " << round;
+    }
+}
+
 } // namespace

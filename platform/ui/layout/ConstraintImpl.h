@@ -1,6 +1,7 @@
 #pragma once
 
 #include "platform/ui/layout/LayoutLink.h"
+#include "platform/ui/layout/Solver.h"
 
 #include <cstdint>
 
@@ -25,6 +26,9 @@ struct LayoutConstraint::Impl {
     void setActive(LayoutConstraint& self, bool value);
     /// The engine in which both ends stand; none while the constraint sleeps.
     LayoutEngine* engine() const;
+    bool hasSecond() const { return second.link && second.attribute != LayoutAttribute::none; }
+    /// How strongly the relation resists on either side.
+    layout::Strength strength() const;
 
     End first;
     End second;
@@ -37,7 +41,7 @@ struct LayoutConstraint::Impl {
     std::uint64_t activation = 0;
 
     /// The engine's: the row of its solver, and whether it waits for the next solve.
-    std::int32_t row = -1;
+    layout::Row row = -1;
     bool pending = false;
 };
 
