@@ -38,7 +38,8 @@ public:
         }
     }
     test::System::Line line(std::size_t variables) {
-        test::System::Line line{std::vector<double>(variables, 0), double(roll(-6, 12)), strength()};
+        test::System::Line line{std::vector<double>(variables, 0), double(roll(-6, 12)),
+                                strength()};
         for (double& coefficient : line.coefficients)
             coefficient = pick<double>({0, 0, 1, 1, -1, -1, 0.5, 2});
         return line;
