@@ -7,8 +7,9 @@ namespace platform {
 enum class StackDistribution { fill, fillEqually };
 enum class StackAlignment { fill, leading, center, trailing };
 
-/// Lines its arranged views up along an axis by constraints that it makes and keeps. A hidden
-/// arranged view takes no room and no spacing.
+/// Lines its arranged views up along an axis by constraints that it makes and keeps: edge to edge
+/// with the spacing between them, the first and the last at its own edges. A hidden arranged view
+/// takes no room and no spacing. Its arranged views are laid out by constraints.
 class StackView : public View {
 public:
     explicit StackView(Rect frame = {});
@@ -16,6 +17,7 @@ public:
     ~StackView() override;
 
     const std::vector<std::shared_ptr<View>>& arrangedSubviews() const;
+    /// At the end of the row, also when it stands in it already.
     void addArrangedSubview(const std::shared_ptr<View>& view);
     /// Takes the view out of the row and out of the tree.
     void removeArrangedSubview(const std::shared_ptr<View>& view);
@@ -30,6 +32,10 @@ public:
     void setSpacing(double spacing);
 
 private:
+    friend void stackChildChangedHidden(View& child);
+    friend void stackChildLeft(View& formerParent, View& child);
+    void arrange();
+
     struct Arrangement;
     std::unique_ptr<Arrangement> arrangement_;
 };
