@@ -195,7 +195,8 @@ Variable Solver::addVariable(Kind kind) {
     added.kind = kind;
     added.isRemoved = false;
     added.isNew = true;
-    state_->changeWeights(added.own);
+    if (!state_->needsStart)
+        state_->changeWeights(added.own);
     state_->touch(variable);
     state_->isDirty = true;
     return variable;
@@ -214,17 +215,18 @@ Row Solver::addRow(std::span<const Term> terms, double constant, Strength streng
     state_->newRows.push_back(row);
     ++state_->structuralChanges;
     state_->isDirty = true;
-    if (state_->knowsPriority(strength.below) && state_->knowsPriority(strength.above))
-        state_->assignWeights(row);
-    else
+    if (!state_->knowsPriority(strength.below) || !state_->knowsPriority(strength.above))
         state_->needsStart = true;
+    else if (!state_->needsStart)
+        state_->assignWeights(row);
     return row;
 }
 
 void Solver::removeRow(Row row) {
     state_->at(row).isRemoved = true;
     state_->removedRows.push_back(row);
-    state_->changeWeights(row);
+    if (!state_->needsStart)
+        state_->changeWeights(row);
     ++state_->structuralChanges;
     state_->isDirty = true;
     std::erase_if(state_->conflicts, [row](const Conflict& c) { return c.row == row; });
@@ -256,10 +258,10 @@ void Solver::setStrength(Row row, Strength strength) {
         state.givesWay = false;
         std::erase_if(state_->conflicts, [row](const Conflict& c) { return c.row == row; });
     }
-    if (state_->knowsPriority(strength.below) && state_->knowsPriority(strength.above))
-        state_->changeWeights(row);
-    else
+    if (!state_->knowsPriority(strength.below) || !state_->knowsPriority(strength.above))
         state_->needsStart = true;
+    else if (!state_->needsStart)
+        state_->changeWeights(row);
 }
 
 bool Solver::needsSolve() const {

@@ -48,7 +48,7 @@ void Solver::State::resolve() {
         std::erase_if(suspects, [this](Row row) {
             const RowState& state = at(row);
             const Weight& weight = state.side == Side::above ? state.above : state.below;
-            return !state.inUse || state.side == Side::on || weight.level != 0;
+            return !state.inUse || state.side == Side::on || weight.level != requiredLevel;
         });
         if (isCutShort || std::none_of(suspects.begin(), suspects.end(),
                                        [this](Row row) { return isViolated(row); }))
@@ -69,7 +69,7 @@ void Solver::State::resolve() {
 std::vector<Row> Solver::State::contradiction() const {
     std::vector<Row> involved = suspects;
     for (std::size_t slot = 0; slot < tight.size(); ++slot)
-        if (std::abs(forces[slot * levelCount()]) > forceTolerance)
+        if (std::abs(forces[slot * levelCount() + requiredLevel]) > forceTolerance)
             involved.push_back(tight[slot]);
     return involved;
 }

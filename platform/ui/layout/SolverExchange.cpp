@@ -49,21 +49,20 @@ bool Solver::State::isCautious() const {
 }
 
 std::optional<std::size_t> Solver::State::nextOverloaded() {
-    for (std::size_t level = 0; level < overloaded.size();) {
-        if (overloaded[level].empty()) {
-            ++level;
+    for (std::size_t rank = 0; rank < overloaded.size();) {
+        if (overloaded[rank].empty()) {
+            ++rank;
             continue;
         }
-        const std::size_t slot = overloaded[level].back();
-        overloaded[level].pop_back();
+        const std::size_t slot = overloaded[rank].back();
+        overloaded[rank].pop_back();
         const auto found = overload(slot);
         if (!found)
             continue;
-        const auto actual = static_cast<std::size_t>(found->level);
-        if (actual == level)
+        if (found->rank == rank)
             return slot;
-        overloaded[actual].push_back(slot);
-        level = std::min(level, actual);
+        overloaded[found->rank].push_back(slot);
+        rank = std::min(rank, found->rank);
     }
     return std::nullopt;
 }
@@ -255,7 +254,7 @@ void Solver::State::handOver(std::size_t slot, int direction, const Meeting& ent
     leaver.slot = RowState::noSlot;
     leaver.residual = direction * entering.distance;
     leaver.side = direction > 0 ? Side::above : Side::below;
-    if (kept.level == 0)
+    if (kept.level == requiredLevel)
         suspects.push_back(tight[slot]);
     enterer.slot = slot;
     enterer.side = Side::on;

@@ -37,10 +37,11 @@ Weight Solver::State::weightFor(float priority, const RowState& row) const {
     if (row.isRemoved || priority <= 0)
         return {};
     if (priority >= layout::required && !row.givesWay)
-        return {0, 1, 0};
+        return {row.age == 0 ? givenLevel : requiredLevel, 1, 0};
     const auto found = std::lower_bound(priorities.begin(), priorities.end(),
                                         std::min(priority, layout::required), std::greater<>());
-    return {static_cast<int>(found - priorities.begin()) + 1, 1, tieWeight(row.age)};
+    return {static_cast<int>(found - priorities.begin()) + firstPriorityLevel, 1,
+            tieWeight(row.age)};
 }
 
 void Solver::State::assignWeights(Row row) {
@@ -55,11 +56,12 @@ void Solver::State::assignWeights(Row row) {
     }
     // Irregular weights, so that no two answers are equally near to zero.
     const auto variable = static_cast<std::size_t>(cells[0].variable);
-    const double irregular = std::fmod(static_cast<double>(variable) * 0.6180339887498949, 1.0);
+    constexpr std::uint32_t scatter = 2654435769U;
+    const double irregular = static_cast<std::uint32_t>(variable) * scatter / 4294967296.0;
     const bool isSize = variables[variable].kind == Kind::size;
     const double amount = (isSize ? 1.0 : 2.0) * (1 + 0.2 * irregular);
     state.above = {static_cast<int>(tieLevel()) + 1, amount, 0};
-    state.below = isSize ? Weight{0, 1, 0} : state.above;
+    state.below = isSize ? Weight{requiredLevel, 1, 0} : state.above;
 }
 
 void Solver::State::changeWeights(Row row) {
@@ -71,7 +73,7 @@ void Solver::State::changeWeights(Row row) {
         changeForce(state.slot, 0, 0);
     } else if (state.side != Side::on) {
         const Weight& weight = state.side == Side::above ? state.above : state.below;
-        if (weight.level == 0)
+        if (weight.level == requiredLevel)
             suspects.push_back(row);
     }
 }
@@ -97,8 +99,8 @@ void Solver::State::setSide(Row row, Side side) {
     queuePull(row, -1);
     state.side = side;
     queuePull(row, 1);
-    if ((side == Side::above && state.above.level == 0) ||
-        (side == Side::below && state.below.level == 0))
+    if ((side == Side::above && state.above.level == requiredLevel) ||
+        (side == Side::below && state.below.level == requiredLevel))
         suspects.push_back(row);
 }
 
@@ -143,7 +145,7 @@ void Solver::State::checkTouchedSlots() {
     for (const std::size_t slot : touchedSlots) {
         isTouchedSlot[slot] = false;
         if (const auto found = overload(slot))
-            overloaded[static_cast<std::size_t>(found->level)].push_back(slot);
+            overloaded[found->rank].push_back(slot);
     }
     touchedSlots.clear();
 }
@@ -157,7 +159,8 @@ std::optional<Solver::State::Overload> Solver::State::overload(std::size_t slot)
         for (std::size_t level = 0; level < levels; ++level) {
             const double excess = direction * force[level] - weightAt(limit, level);
             if (excess > forceTolerance)
-                return Overload{static_cast<int>(level), direction};
+                return Overload{direction,
+                                2 * level + (limit.level == static_cast<int>(level) ? 1 : 0)};
             if (excess < -forceTolerance)
                 break;
         }

@@ -19,11 +19,16 @@ private:
     void offer(Row row);
     Row nextOffered();
     Variable unknownOf(Row row) const;
+    auto isYounger() const {
+        return [this](Row a, Row b) { return state_.at(a).age > state_.at(b).age; };
+    }
 
     const Solver::State& state_;
     std::vector<bool> known_;
     std::vector<std::size_t> unknowns_;
-    /// By level: rows that leave one variable open.
+    /// Rows that leave one variable open: what has to hold, in any order, and by level the others,
+    /// a heap each with the oldest on top, because the oldest wins a tie.
+    std::vector<Row> offeredFirst_;
     std::vector<std::vector<Row>> offered_;
     std::size_t strongest_ = 0;
 };
@@ -33,18 +38,14 @@ Propagation::Propagation(const Solver::State& state)
       known_(state.variables.size(), false),
       unknowns_(state.rows.size(), 0),
       offered_(state.levelCount()) {
-    // What was tight goes first among equals: a new start then stays close to the old answer.
     for (std::size_t index = state.rows.size(); index-- > 0;) {
         const auto row = static_cast<Row>(index);
         if (!state.at(row).inUse)
             continue;
         unknowns_[index] = state.matrix.cells(row).size();
-        if (unknowns_[index] == 1 && !state.at(row).isTight())
+        if (unknowns_[index] == 1)
             offer(row);
     }
-    for (const Row row : state.tight)
-        if (state.at(row).inUse && state.matrix.cells(row).size() == 1)
-            offer(row);
 }
 
 void Propagation::offer(Row row) {
@@ -55,16 +56,27 @@ void Propagation::offer(Row row) {
     const auto level = static_cast<std::size_t>(std::max(state.below.level, state.above.level));
     if (level + 1 == state_.levelCount())
         return;
+    if (level <= Solver::State::requiredLevel) {
+        offeredFirst_.push_back(row);
+        return;
+    }
     offered_[level].push_back(row);
+    std::push_heap(offered_[level].begin(), offered_[level].end(), isYounger());
     strongest_ = std::min(strongest_, level);
 }
 
 Row Propagation::nextOffered() {
+    const auto last = [](std::vector<Row>& list) {
+        const Row row = list.back();
+        list.pop_back();
+        return row;
+    };
+    if (!offeredFirst_.empty())
+        return last(offeredFirst_);
     for (; strongest_ < offered_.size(); ++strongest_)
-        if (!offered_[strongest_].empty()) {
-            const Row row = offered_[strongest_].back();
-            offered_[strongest_].pop_back();
-            return row;
+        if (auto& list = offered_[strongest_]; !list.empty()) {
+            std::pop_heap(list.begin(), list.end(), isYounger());
+            return last(list);
         }
     return -1;
 }
@@ -151,7 +163,7 @@ void Solver::State::collectLevels() {
     for (std::size_t row = 0; row < rows.size(); ++row)
         if (rows[row].inUse)
             assignWeights(static_cast<Row>(row));
-    overloaded.assign(levelCount(), {});
+    overloaded.assign(2 * levelCount(), {});
     slope.assign(levelCount(), 0);
 }
 

@@ -16,8 +16,9 @@ namespace platform::layout {
 // along until a row that they meet resists more than is gained, and that one becomes tight instead.
 //
 // Weights have a level for every priority, compared one after the other, so that no sum of low ones
-// outweighs a high one: level 0 is what is required, then the priorities downward, then the ties
-// between rows of one priority, then the wish of every variable to be zero.
+// outweighs a high one: first what is given, then what is required (and that no size is negative),
+// then the priorities downward, then the ties between rows of one priority, then the wish of every
+// variable to be zero.
 
 /// What a row loses by a unit of violation on one side. Nothing when `level` is negative.
 struct Weight {
@@ -63,8 +64,11 @@ struct VariableState {
 struct Solver::State {
     /// A tight row that carries too much: from which level on, and to which side it is to move.
     struct Overload {
-        int level;
         int direction;
+        /// Which overloads to relieve first: of the higher level, and of one level those of rows
+        /// that weigh nothing there. What many weak rows pull at together rarely has to yield once
+        /// the weak ones did.
+        std::size_t rank;
     };
     struct Pull {
         int level;
@@ -102,8 +106,11 @@ struct Solver::State {
     void findForces();
 
     // SolverForces.cpp
-    std::size_t levelCount() const { return priorities.size() + 3; }
-    std::size_t tieLevel() const { return priorities.size() + 1; }
+    static constexpr int givenLevel = 0;
+    static constexpr int requiredLevel = 1;
+    static constexpr int firstPriorityLevel = 2;
+    std::size_t tieLevel() const { return firstPriorityLevel + priorities.size(); }
+    std::size_t levelCount() const { return tieLevel() + 2; }
     bool knowsPriority(float priority) const;
     Weight weightFor(float priority, const RowState& row) const;
     void assignWeights(Row row);
@@ -154,7 +161,8 @@ struct Solver::State {
     std::vector<Row> tight;
     /// By slot and level.
     std::vector<double> forces;
-    /// Levels 1 and on, the highest first. 1000 stands for the requirements that give way.
+    /// From firstPriorityLevel on, the highest first. 1000 stands for the requirements that give
+    /// way.
     std::vector<float> priorities;
 
     // What changed since the last solution.
@@ -179,6 +187,7 @@ struct Solver::State {
     std::vector<double> slope;
     std::vector<std::size_t> touchedSlots;
     std::vector<bool> isTouchedSlot;
+    /// Slots by rank; entries go stale and are checked when met.
     std::vector<std::vector<std::size_t>> overloaded;
     std::size_t idleExchanges = 0;
 
