@@ -127,9 +127,13 @@ int main(int argc, char** argv) {
         return 1;
     }
     const std::vector<std::pair<std::string, MakeScreen>> screens = {
-        {"rows", bench::listOfRows},         {"longNames", bench::listOfLongNames},
-        {"texts", bench::listOfTexts},       {"oneStack", bench::oneStack},
-        {"equalShares", bench::equalShares}, {"stacksInStacks", bench::stacksInStacks}};
+        {"rows", bench::listOfRows},
+        {"longNames", bench::listOfLongNames},
+        {"texts", bench::listOfTexts},
+        {"oneStack", bench::oneStack},
+        {"overfullStack", bench::overfullStack},
+        {"equalShares", bench::equalShares},
+        {"stacksInStacks", bench::stacksInStacks}};
     const std::vector<std::pair<std::string, void (*)(benchmark::State&, MakeScreen)>> works = {
         {"whole", wholePass},
         {"resize", resize},

@@ -149,6 +149,12 @@ std::unique_ptr<Screen> oneStack(std::size_t views) {
     return screen;
 }
 
+std::unique_ptr<Screen> overfullStack(std::size_t views) {
+    auto screen = oneStack(views);
+    screen->size.height = static_cast<double>(views) * 12;
+    return screen;
+}
+
 std::unique_ptr<Screen> equalShares(std::size_t views) {
     auto screen = std::make_unique<Screen>(Size{20000, 100});
     Box& row = screen->add(*screen->root);

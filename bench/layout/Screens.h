@@ -65,6 +65,8 @@ std::unique_ptr<Screen> listOfLongNames(std::size_t views);
 std::unique_ptr<Screen> listOfTexts(std::size_t views);
 /// One stack of all views.
 std::unique_ptr<Screen> oneStack(std::size_t views);
+/// The same with room for half of them.
+std::unique_ptr<Screen> overfullStack(std::size_t views);
 /// One stack that gives all views the same size.
 std::unique_ptr<Screen> equalShares(std::size_t views);
 /// Stacks of two in stacks of two.
