@@ -67,6 +67,20 @@ void changeContent(benchmark::State& state, MakeScreen make) {
     }
 }
 
+/// A view leaves the window and comes back.
+void leaveAndReturn(benchmark::State& state, MakeScreen make) {
+    const auto screen = make(static_cast<std::size_t>(state.range(0)));
+    LayoutEngine engine;
+    screen->addTo(engine);
+    engine.solve();
+    for (auto _ : state) {
+        engine.removeItem(*screen->changingContent);
+        engine.solve();
+        engine.addItem(*screen->changingContent);
+        engine.solve();
+    }
+}
+
 void byHand(benchmark::State& state) {
     for (auto _ : state)
         benchmark::DoNotOptimize(
@@ -138,7 +152,8 @@ int main(int argc, char** argv) {
         {"whole", wholePass},
         {"resize", resize},
         {"constant", changeConstant},
-        {"content", changeContent}};
+        {"content", changeContent},
+        {"return", leaveAndReturn}};
     const auto configure = [](benchmark::internal::Benchmark* made) {
         made->Arg(few)->Arg(many)->Unit(benchmark::kMicrosecond);
     };

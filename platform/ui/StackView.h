@@ -8,8 +8,9 @@ enum class StackDistribution { fill, fillEqually };
 enum class StackAlignment { fill, leading, center, trailing };
 
 /// Lines its arranged views up along an axis by constraints that it makes and keeps: edge to edge
-/// with the spacing between them, the first and the last at its own edges. A hidden arranged view
-/// takes no room and no spacing. Its arranged views are laid out by constraints.
+/// with the spacing between them, the first and the last at its own edges. Across the axis, an
+/// alignment other than fill yields to what is required of a view. A hidden arranged view takes no
+/// room and no spacing. Arranged views are laid out by constraints.
 class StackView : public View {
 public:
     explicit StackView(Rect frame = {});

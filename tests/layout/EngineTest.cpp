@@ -178,6 +178,24 @@ TEST(Engine, RoundsToPixelsSoThatNeighboursMeet) {
     }
 }
 
+TEST(Engine, RoundsWhatIsComputedOnTwoWaysToOnePixel) {
+    Scene scene({21, 300});
+    Item& part = scene.add("part");
+    relate(part, width, equal, scene.root, width, 0, 1.0 / 9);
+    Item& first = scene.add("first");
+    relate(first, width, equal, part, width, 0, 9 * 0.5);
+    Item& second = scene.add("second");
+    tie(second, trailing, scene.root, trailing);
+    relate(second, width, equal, scene.root, width, 0, 0.5);
+    EXPECT_EQ(scene.frame("first").maxX(), scene.frame("second").x);
+    Item& text = scene.text("text", 300);
+    relate(text, width, equal, part, width, 0, 9);
+    for (const double width : {300, 600}) {
+        scene.engine.setRootSize({width, 100});
+        EXPECT_EQ(scene.frame("text").height, 10) << width;
+    }
+}
+
 TEST(Engine, LogsAConflictOnceAndTakesTheLoserBack) {
     Scene scene({0, 0});
     Item& box = scene.add("box");

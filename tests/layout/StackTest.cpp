@@ -73,6 +73,19 @@ TEST_F(Stack, ClosesTheGapOfWhatIsHidden) {
     EXPECT_EQ(a.frame, (Rect{0, 90, 30, 10}));
 }
 
+TEST_F(Stack, AlignsWithinWhatIsRequired) {
+    rules.axis = Axis::vertical;
+    show({&a, &b, &c});
+    relate(a, leading, LayoutRelation::greaterOrEqual, stack, leading, 8);
+    tie(b, leading, scene.root, leading, -3);
+    fix(b, width, 210);
+    rules.alignment = StackAlignment::leading;
+    show({&a, &b, &c});
+    EXPECT_EQ(a.frame, (Rect{8, 0, 30, 10}));
+    EXPECT_EQ(b.frame, (Rect{-3, 15, 210, 20}));
+    EXPECT_EQ(c.frame, (Rect{0, 40, 50, 60}));
+}
+
 TEST_F(Stack, IsAsLargeAsItsContentWhereNothingElseSays) {
     Item& inner = scene.add("inner", stack);
     Item& x = scene.label("x", {60, 10}, inner);

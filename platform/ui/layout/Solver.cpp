@@ -159,9 +159,14 @@ void Solver::State::eraseRemoved() {
         at(row) = {};
     }
     removedRows.clear();
-    for (const Variable variable : removedVariables)
-        freeVariables.push_back(variable);
-    removedVariables.clear();
+    // One that still stands in a row waits until that row goes as well.
+    std::erase_if(removedVariables, [this](Variable variable) {
+        std::size_t count = 0;
+        matrix.forColumn(variable, [&](Row, double) { ++count; });
+        if (count == 1)
+            freeVariables.push_back(variable);
+        return count == 1;
+    });
 }
 
 void Solver::State::collect() {

@@ -29,13 +29,13 @@ void Solver::State::optimise() {
     // Far above what any layout needs; an answer that is not the best beats none.
     const std::size_t limit = exchanges + 1000 + 20 * tight.size();
     int failures = 0;
-    while (const auto slot = isCautious() ? firstOverloaded() : nextOverloaded()) {
+    while (const auto over = isCautious() ? firstOverload() : nextOverload()) {
         if (++exchanges > limit || failures > mostFailures) {
             isCutShort = true;
             needsStart = true;
             return;
         }
-        const bool isDone = exchange(*slot, overload(*slot)->direction);
+        const bool isDone = exchange(over->slot, over->direction);
         failures += isDone ? 0 : 1;
         if (!isDone || factor.isWorn())
             refresh();
@@ -46,33 +46,6 @@ void Solver::State::optimise() {
 /// smallest number, and the nearest meeting, cannot.
 bool Solver::State::isCautious() const {
     return idleExchanges > 50 + tight.size() / 4;
-}
-
-std::optional<std::size_t> Solver::State::nextOverloaded() {
-    for (std::size_t rank = 0; rank < overloaded.size();) {
-        if (overloaded[rank].empty()) {
-            ++rank;
-            continue;
-        }
-        const std::size_t slot = overloaded[rank].back();
-        overloaded[rank].pop_back();
-        const auto found = overload(slot);
-        if (!found)
-            continue;
-        if (found->rank == rank)
-            return slot;
-        overloaded[found->rank].push_back(slot);
-        rank = std::min(rank, found->rank);
-    }
-    return std::nullopt;
-}
-
-std::optional<std::size_t> Solver::State::firstOverloaded() const {
-    std::optional<std::size_t> first;
-    for (std::size_t slot = 0; slot < tight.size(); ++slot)
-        if ((!first || tight[slot] < tight[*first]) && overload(slot))
-            first = slot;
-    return first;
 }
 
 /// Lets the row of the slot go to one side until another row stops the slide and takes the slot.

@@ -18,6 +18,18 @@ double tieWeight(std::uint64_t age) {
     return 1 + 1 / (1 + std::log2(2 + static_cast<double>(age)));
 }
 
+bool isLighter(const Solver::State::Overload& a, const Solver::State::Overload& b) {
+    return a.excess != b.excess ? a.excess < b.excess : a.tieExcess < b.tieExcess;
+}
+
+/// From 0 to 1, without any pattern: with such weights no two answers are equally near to zero.
+double irregular(std::size_t variable) {
+    auto bits = static_cast<std::uint32_t>(variable) * 2654435769U;
+    bits = (bits ^ (bits >> 15)) * 2246822519U;
+    bits = (bits ^ (bits >> 13)) * 3266489917U;
+    return (bits ^ (bits >> 16)) / 4294967296.0;
+}
+
 } // namespace
 
 double Solver::State::weightAt(const Weight& weight, std::size_t level) const {
@@ -54,12 +66,9 @@ void Solver::State::assignWeights(Row row) {
         state.above = weightFor(state.strength.above, state);
         return;
     }
-    // Irregular weights, so that no two answers are equally near to zero.
     const auto variable = static_cast<std::size_t>(cells[0].variable);
-    constexpr std::uint32_t scatter = 2654435769U;
-    const double irregular = static_cast<std::uint32_t>(variable) * scatter / 4294967296.0;
     const bool isSize = variables[variable].kind == Kind::size;
-    const double amount = (isSize ? 1.0 : 2.0) * (1 + 0.2 * irregular);
+    const double amount = (isSize ? 1.0 : 2.0) * (1 + 0.2 * irregular(variable));
     state.above = {static_cast<int>(tieLevel()) + 1, amount, 0};
     state.below = isSize ? Weight{requiredLevel, 1, 0} : state.above;
 }
@@ -144,8 +153,11 @@ void Solver::State::changeForce(std::size_t slot, std::size_t level, double amou
 void Solver::State::checkTouchedSlots() {
     for (const std::size_t slot : touchedSlots) {
         isTouchedSlot[slot] = false;
-        if (const auto found = overload(slot))
-            overloaded[found->rank].push_back(slot);
+        if (const auto found = overload(slot)) {
+            auto& heap = overloads[found->rank];
+            heap.push_back(*found);
+            std::push_heap(heap.begin(), heap.end(), isLighter);
+        }
     }
     touchedSlots.clear();
 }
@@ -158,14 +170,39 @@ std::optional<Solver::State::Overload> Solver::State::overload(std::size_t slot)
         const Weight& limit = direction > 0 ? row.above : row.below;
         for (std::size_t level = 0; level < levels; ++level) {
             const double excess = direction * force[level] - weightAt(limit, level);
-            if (excess > forceTolerance)
-                return Overload{direction,
-                                2 * level + (limit.level == static_cast<int>(level) ? 1 : 0)};
+            if (excess > forceTolerance) {
+                const bool isOwnLevel = limit.level == static_cast<int>(level);
+                return Overload{slot, direction, 2 * level + (isOwnLevel ? 1 : 0), excess,
+                                direction * force[tieLevel()] - weightAt(limit, tieLevel())};
+            }
             if (excess < -forceTolerance)
                 break;
         }
     }
     return std::nullopt;
+}
+
+std::optional<Solver::State::Overload> Solver::State::nextOverload() {
+    for (std::size_t rank = 0; rank < overloads.size(); ++rank)
+        while (!overloads[rank].empty()) {
+            auto& heap = overloads[rank];
+            std::pop_heap(heap.begin(), heap.end(), isLighter);
+            const Overload next = heap.back();
+            heap.pop_back();
+            if (const auto now = overload(next.slot);
+                now && now->rank == rank && now->excess == next.excess)
+                return now;
+        }
+    return std::nullopt;
+}
+
+std::optional<Solver::State::Overload> Solver::State::firstOverload() const {
+    std::optional<Overload> first;
+    for (std::size_t slot = 0; slot < tight.size(); ++slot)
+        if (!first || tight[slot] < tight[first->slot])
+            if (const auto found = overload(slot))
+                first = found;
+    return first;
 }
 
 } // namespace platform::layout

@@ -163,7 +163,7 @@ void Solver::State::collectLevels() {
     for (std::size_t row = 0; row < rows.size(); ++row)
         if (rows[row].inUse)
             assignWeights(static_cast<Row>(row));
-    overloaded.assign(2 * levelCount(), {});
+    overloads.assign(2 * levelCount(), {});
     slope.assign(levelCount(), 0);
 }
 
@@ -229,8 +229,8 @@ void Solver::State::findForces() {
     forces.assign(tight.size() * levelCount(), 0);
     touchedSlots.clear();
     isTouchedSlot.assign(tight.size(), false);
-    for (auto& queue : overloaded)
-        queue.clear();
+    for (auto& heap : overloads)
+        heap.clear();
     pulls.clear();
     for (std::size_t row = 0; row < rows.size(); ++row)
         if (rows[row].inUse)

@@ -62,13 +62,18 @@ struct VariableState {
 };
 
 struct Solver::State {
-    /// A tight row that carries too much: from which level on, and to which side it is to move.
+    /// A tight row that carries too much.
     struct Overload {
-        int direction;
+        std::size_t slot = 0;
+        /// To which side the row is to move.
+        int direction = 0;
         /// Which overloads to relieve first: of the higher level, and of one level those of rows
         /// that weigh nothing there. What many weak rows pull at together rarely has to yield once
         /// the weak ones did.
-        std::size_t rank;
+        std::size_t rank = 0;
+        /// By how much at its level, and then among equals: what is relieved first within a rank.
+        double excess = 0;
+        double tieExcess = 0;
     };
     struct Pull {
         int level;
@@ -127,8 +132,8 @@ struct Solver::State {
     // SolverExchange.cpp
     void optimise();
     bool isCautious() const;
-    std::optional<std::size_t> nextOverloaded();
-    std::optional<std::size_t> firstOverloaded() const;
+    std::optional<Overload> nextOverload();
+    std::optional<Overload> firstOverload() const;
     bool exchange(std::size_t slot, int direction);
     void slide(std::size_t slot, int direction);
     void findRates();
@@ -187,8 +192,9 @@ struct Solver::State {
     std::vector<double> slope;
     std::vector<std::size_t> touchedSlots;
     std::vector<bool> isTouchedSlot;
-    /// Slots by rank; entries go stale and are checked when met.
-    std::vector<std::vector<std::size_t>> overloaded;
+    /// A heap for every rank. What no longer holds is dropped when it comes up: a newer entry says
+    /// what does.
+    std::vector<std::vector<Overload>> overloads;
     std::size_t idleExchanges = 0;
 
     /// Rows that pull with a required weight.

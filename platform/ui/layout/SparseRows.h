@@ -39,7 +39,6 @@ public:
         const Extent& extent = extents_[static_cast<std::size_t>(row)];
         return {cells_.data() + extent.begin, extent.count};
     }
-    bool isColumnEmpty(Variable variable) const { return head(variable) == none; }
     template<class Visit>
     void forColumn(Variable variable, Visit visit) const {
         for (std::int32_t at = head(variable); at != none;) {

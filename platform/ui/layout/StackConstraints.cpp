@@ -53,29 +53,29 @@ std::vector<StackConstraints::Wanted> StackConstraints::across(LayoutItem& stack
     const Attributes& on =
         rules.axis == Axis::horizontal ? verticalAttributes : horizontalAttributes;
     constexpr auto equal = LayoutRelation::equal;
-    constexpr auto atLeast = LayoutRelation::greaterOrEqual;
-    constexpr auto atMost = LayoutRelation::lessOrEqual;
     std::vector<Wanted> wanted;
     for (LayoutItem* const item : shown) {
-        const auto same = [&](LayoutAttribute attribute, LayoutRelation relation) {
-            wanted.push_back({{item, attribute, relation, &stack, attribute}, 0});
+        const auto keep = [&](LayoutAttribute attribute,
+                              LayoutRelation relation = LayoutRelation::equal,
+                              LayoutPriority priority = stackAlignment) {
+            wanted.push_back({{item, attribute, relation, &stack, attribute}, 0, priority});
         };
         switch (rules.alignment) {
         case StackAlignment::fill:
-            same(on.start, equal);
-            same(on.end, equal);
+            keep(on.start, equal, layoutRequired);
+            keep(on.end, equal, layoutRequired);
             break;
         case StackAlignment::leading:
-            same(on.start, equal);
-            same(on.end, atMost);
+            keep(on.start);
+            keep(on.end, LayoutRelation::lessOrEqual);
             break;
         case StackAlignment::center:
-            same(on.center, equal);
-            same(on.start, atLeast);
+            keep(on.center);
+            keep(on.start, LayoutRelation::greaterOrEqual);
             break;
         case StackAlignment::trailing:
-            same(on.end, equal);
-            same(on.start, atLeast);
+            keep(on.end);
+            keep(on.start, LayoutRelation::greaterOrEqual);
             break;
         }
     }
@@ -89,17 +89,19 @@ void StackConstraints::arrange(LayoutItem& stack, std::span<LayoutItem* const> s
     wanted.insert(wanted.end(), rest.begin(), rest.end());
     Lines kept;
     std::vector<LayoutConstraint::Pointer> fresh;
-    for (const auto& [line, constant] : wanted) {
+    for (const auto& [line, constant, priority] : wanted) {
         auto found = lines_.extract(line);
         // One that is no longer active lost an item that stood at the same address.
         if (found && found.mapped()->isActive()) {
             found.mapped()->setConstant(constant);
+            found.mapped()->setPriority(priority);
             kept.insert(std::move(found));
             continue;
         }
         const auto made =
             LayoutConstraint::Impl::make(*line.first, line.attribute, line.relation, line.second,
                                          line.secondAttribute, 1, constant);
+        made->setPriority(priority);
         kept.emplace(line, made);
         fresh.push_back(made);
     }

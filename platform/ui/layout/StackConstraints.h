@@ -16,6 +16,10 @@ struct StackRules {
     double spacing = 0;
 };
 
+/// How firmly a stack aligns its items across the axis, and keeps them inside its edges there: what
+/// is required of an item wins, such as an inset, or a line that crosses the whole screen.
+inline constexpr LayoutPriority stackAlignment = 999.5F;
+
 /// The constraints that line items up, made and kept in step with what is shown and how. A
 /// constraint that still holds after a change stays as it is.
 class StackConstraints {
@@ -41,6 +45,7 @@ private:
     struct Wanted {
         Line line;
         double constant;
+        LayoutPriority priority = layoutRequired;
     };
     using Lines = std::map<Line, LayoutConstraint::Pointer>;
 
