@@ -32,8 +32,15 @@ inline constexpr LayoutPriority layoutRequired = 1000;
 inline constexpr LayoutPriority layoutHigh = 750;
 inline constexpr LayoutPriority layoutLow = 250;
 
-/// first.attribute (relation) second.attribute * multiplier + constant. Works while it is active
-/// and both views live in one window's tree; the views are not owned. Main thread.
+/// first.attribute (relation) second.attribute * multiplier + constant, in the coordinates of the
+/// nearest view that holds both. Works while it is active and both views live in one window's tree;
+/// sleeps otherwise. Main thread.
+///
+/// The views are not owned: one that dies deactivates its constraints. An active constraint is kept
+/// alive by its views.
+///
+/// With leading or trailing on either side the constant counts in reading direction, otherwise from
+/// left to right.
 ///
 /// Requirements that contradict each other never fail: the weakest, and among equals the one
 /// activated last, gives way, and one log line names it.
@@ -62,7 +69,7 @@ public:
     double constant() const;
     void setConstant(double constant);
     LayoutPriority priority() const;
-    /// Set before activation, or any time between two values below 1000.
+    /// From 1 to 1000; values outside become the nearest. May change at any time.
     void setPriority(LayoutPriority priority);
 
     View* firstView() const;

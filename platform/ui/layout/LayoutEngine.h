@@ -8,8 +8,10 @@
 namespace platform {
 
 /// One window's layout: takes the items of a tree and the active constraints between them, and
-/// solves them for the root's size. Knows no widgets. Changes are cheap and only mark; solve() does
-/// the work, incrementally where it can. Main thread.
+/// solves them for the root's size. A natural size is a wish, however high its priority: it gives
+/// way to requirements without a word. What nothing determines is as small and as near to the
+/// parent's leading top corner as it may be; of equal wishes the oldest wins. Knows no widgets.
+/// Changes are cheap and only mark; solve() does the work, incrementally where it can. Main thread.
 class LayoutEngine {
 public:
     /// `pixelsPerPoint` is what solved frames are rounded to.
