@@ -1,0 +1,138 @@
+#include "platform/cloud/Sidecar.h"
+
+#include "platform/cloud/ContentHash.h"
+#include "platform/cloud/Tokens.h"
+
+#include <array>
+#include <cerrno>
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <sys/xattr.h>
+#include <unistd.h>
+
+namespace platform {
+namespace {
+
+constexpr std::string_view suffix = ".promise";
+constexpr std::size_t longestName = 255;
+/// Bytes of the document's name that the cut form keeps: room for the dot, "~", sixteen digits of
+/// the hash and the suffix.
+constexpr std::size_t keptBytes = 200;
+/// A mark with a whole name in it is the longest.
+constexpr std::size_t longestMark = 512;
+constexpr std::string_view version = "1";
+
+std::string_view cutAtCharacter(std::string_view name, std::size_t limit) {
+    if (name.size() <= limit)
+        return name;
+    std::size_t end = limit;
+    while (end > 0 && (static_cast<unsigned char>(name[end]) & 0xC0) == 0x80)
+        --end;
+    return name.substr(0, end == 0 ? limit : end);
+}
+
+/// The word at the head of `text`, which loses it and the blank behind.
+std::string_view takeWord(std::string_view& text) {
+    const std::size_t blank = text.find(' ');
+    const std::string_view word = text.substr(0, blank);
+    text.remove_prefix(blank == std::string_view::npos ? text.size() : blank + 1);
+    return word;
+}
+
+std::optional<std::string> markFromContent(const std::string& path) {
+    const int file = open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK);
+    if (file < 0)
+        return std::nullopt;
+    struct stat status {};
+    std::array<char, longestMark + 1> text{};
+    ssize_t length = -1;
+    if (fstat(file, &status) == 0 && S_ISREG(status.st_mode))
+        length = read(file, text.data(), text.size());
+    close(file);
+    if (length <= 0 || length > static_cast<ssize_t>(longestMark))
+        return std::nullopt;
+    return std::string(text.data(), static_cast<std::size_t>(length));
+}
+
+} // namespace
+
+std::string encodedMark(const SidecarMark& mark) {
+    std::string text(version);
+    text += ' ' + mark.store + ' ' + hexText(static_cast<std::uint64_t>(mark.item));
+    if (!mark.name.empty())
+        text += ' ' + mark.name;
+    return text;
+}
+
+std::optional<SidecarMark> decodedMark(std::string_view text) {
+    if (takeWord(text) != version)
+        return std::nullopt;
+    SidecarMark mark;
+    mark.store = takeWord(text);
+    const std::optional<std::uint64_t> item = numberOfHex(takeWord(text));
+    if (mark.store.empty() || !item || *item == 0 || *item > INT64_MAX)
+        return std::nullopt;
+    mark.item = static_cast<ItemId>(*item);
+    mark.name = text;
+    if (mark.name.find('/') != std::string::npos || mark.name.find('\0') != std::string::npos)
+        return std::nullopt;
+    return mark;
+}
+
+SidecarName sidecarNameFor(std::string_view name) {
+    if (name.size() + 1 + suffix.size() > longestName)
+        return shortenedSidecarNameFor(name);
+    std::string text = ".";
+    text += name;
+    text += suffix;
+    return {std::move(text), false};
+}
+
+SidecarName shortenedSidecarNameFor(std::string_view name) {
+    Bytes hash = ContentHash::of(name);
+    hash.resize(8);
+    std::string text = ".";
+    text += cutAtCharacter(name, keptBytes);
+    text += '~' + hexText(hash);
+    text += suffix;
+    return {std::move(text), true};
+}
+
+bool hasSidecarForm(std::string_view name) {
+    return name.size() > 1 + suffix.size() && name.starts_with('.') && name.ends_with(suffix);
+}
+
+std::string promisedName(std::string_view sidecarName, const SidecarMark& mark) {
+    if (!mark.name.empty())
+        return mark.name;
+    return std::string(sidecarName.substr(1, sidecarName.size() - 1 - suffix.size()));
+}
+
+std::optional<SidecarMark> readMark(const std::string& path, std::string_view store) {
+    std::array<char, longestMark> text{};
+    const ssize_t length = lgetxattr(path.c_str(), sidecarAttribute, text.data(), text.size());
+    std::optional<SidecarMark> mark;
+    if (length >= 0) {
+        mark = decodedMark(std::string_view(text.data(), static_cast<std::size_t>(length)));
+    } else if (errno == ENODATA || errno == EOPNOTSUPP) {
+        if (const std::optional<std::string> content = markFromContent(path))
+            mark = decodedMark(*content);
+    }
+    return mark && mark->store == store ? mark : std::nullopt;
+}
+
+std::optional<FoundSidecar> findSidecar(const std::string& folder, std::string_view name,
+                                        std::string_view store) {
+    const auto look = [&](const SidecarName& candidate) -> std::optional<FoundSidecar> {
+        std::string path = folder + '/' + candidate.text;
+        const std::optional<SidecarMark> mark = readMark(path, store);
+        if (!mark || promisedName(candidate.text, *mark) != name)
+            return std::nullopt;
+        return FoundSidecar{std::move(path), *mark};
+    };
+    const SidecarName usual = sidecarNameFor(name);
+    std::optional<FoundSidecar> found = look(usual);
+    return found || usual.needsName ? found : look(shortenedSidecarNameFor(name));
+}
+
+} // namespace platform

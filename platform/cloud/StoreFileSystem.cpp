@@ -1,0 +1,157 @@
+#include "platform/cloud/StoreFileSystem.h"
+
+#include "platform/cloud/Sidecar.h"
+#include "platform/files/FileDescriptor.h"
+
+#include <cerrno>
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <sys/xattr.h>
+#include <unistd.h>
+
+namespace platform {
+namespace {
+
+Error failed(const std::string& path, bool writing = true) {
+    return posixError(errno, Url::file(path), writing);
+}
+
+class RealStagedFile final : public StagedFile {
+public:
+    RealStagedFile(FileDescriptor file, std::string path)
+        : file_(std::move(file)), path_(std::move(path)) {}
+
+    Failure write(std::span<const std::byte> piece) override {
+        while (!piece.empty()) {
+            const ssize_t done = ::write(file_.get(), piece.data(), piece.size());
+            if (done < 0 && errno == EINTR)
+                continue;
+            if (done < 0)
+                return failed(path_);
+            piece = piece.subspan(static_cast<std::size_t>(done));
+            written_ += done;
+        }
+        return std::nullopt;
+    }
+
+    Failure finish(Date modified, const std::string& tags) override {
+        // Room that was kept for more than came goes back.
+        if (ftruncate(file_.get(), written_) != 0)
+            return failed(path_);
+        if (!tags.empty() &&
+            fsetxattr(file_.get(), "user.xdg.tags", tags.data(), tags.size(), 0) != 0 &&
+            errno != EOPNOTSUPP)
+            return failed(path_);
+        timespec times[2];
+        times[0].tv_sec = 0;
+        times[0].tv_nsec = UTIME_OMIT;
+        times[1].tv_sec = modified.wholeSeconds();
+        times[1].tv_nsec = modified.nanoseconds - modified.wholeSeconds() * 1'000'000'000;
+        if (futimens(file_.get(), times) != 0 || fsync(file_.get()) != 0)
+            return failed(path_);
+        return std::nullopt;
+    }
+
+private:
+    FileDescriptor file_;
+    std::string path_;
+    off_t written_ = 0;
+};
+
+/// Puts the mark on the open file: as an attribute, or as content where the disk has none.
+Failure writeMark(int file, const std::string& path, const std::string& mark) {
+    if (fsetxattr(file, sidecarAttribute, mark.data(), mark.size(), 0) == 0)
+        return std::nullopt;
+    if (errno != EOPNOTSUPP)
+        return failed(path);
+    if (ftruncate(file, 0) != 0 ||
+        pwrite(file, mark.data(), mark.size(), 0) != static_cast<ssize_t>(mark.size()))
+        return failed(path);
+    return std::nullopt;
+}
+
+class RealStoreFileSystem final : public StoreFileSystem {
+public:
+    Result<FileAttributes> attributes(const std::string& path) override {
+        return FileManager::attributes(path, FollowLinks::no);
+    }
+
+    Result<std::vector<DirectoryEntry>> entries(const std::string& path) override {
+        return FileManager::entries(path);
+    }
+
+    Result<std::uint64_t> freeBytes(const std::string& path) override {
+        return FileManager::freeBytes(path);
+    }
+
+    Failure makeFolder(const std::string& path) override {
+        // Not by FileManager: a hundred thousand of them are made in one go.
+        return mkdir(path.c_str(), 0777) == 0 ? Failure{} : failed(path);
+    }
+
+    Result<FileAttributes> makeSidecar(const std::string& path, const std::string& mark) override {
+        const FileDescriptor file(
+            open(path.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC, 0644));
+        if (!file)
+            return failed(path);
+        if (Failure failure = writeMark(file.get(), path, mark)) {
+            unlink(path.c_str()); // made here a moment ago and empty
+            return *failure;
+        }
+        return FileManager::attributes(path, FollowLinks::no);
+    }
+
+    Failure setMark(const std::string& path, const std::string& mark) override {
+        const FileDescriptor file(open(path.c_str(), O_WRONLY | O_NOFOLLOW | O_CLOEXEC));
+        return file ? writeMark(file.get(), path, mark) : failed(path);
+    }
+
+    Failure rename(const std::string& from, const std::string& to) override {
+        return FileManager::moveItem(Url::file(from), Url::file(to));
+    }
+
+    Failure removeFile(const std::string& path) override {
+        return unlink(path.c_str()) == 0 || errno == ENOENT ? Failure{} : failed(path);
+    }
+
+    Result<std::unique_ptr<StagedFile>> stage(const std::string& path,
+                                              std::uint64_t size) override {
+        FileDescriptor file(
+            open(path.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC, 0644));
+        if (!file)
+            return failed(path);
+        // A full disk is known before the first byte is fetched. File systems that cannot keep
+        // room (EOPNOTSUPP) tell it when it comes to that.
+        if (size > 0 && fallocate(file.get(), 0, 0, static_cast<off_t>(size)) != 0 &&
+            (errno == ENOSPC || errno == EDQUOT || errno == EFBIG)) {
+            const Error error = failed(path);
+            unlink(path.c_str());
+            return error;
+        }
+        return std::unique_ptr<StagedFile>(std::make_unique<RealStagedFile>(std::move(file), path));
+    }
+
+    Failure writeSmallFile(const std::string& path, std::string_view content) override {
+        return FileManager::writeAtomically(Url::file(path), content);
+    }
+
+    Failure syncFolder(const std::string& path) override { return syncWith(path, &fsync); }
+
+    Failure syncAll(const std::string& path) override { return syncWith(path, &syncfs); }
+
+private:
+    static Failure syncWith(const std::string& path, int (*sync)(int)) {
+        const FileDescriptor folder(open(path.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
+        if (!folder || sync(folder.get()) != 0)
+            return failed(path);
+        return std::nullopt;
+    }
+};
+
+} // namespace
+
+std::unique_ptr<StoreFileSystem> makeRealStoreFileSystem() {
+    return std::make_unique<RealStoreFileSystem>();
+}
+
+} // namespace platform
