@@ -1,0 +1,269 @@
+#include "platform/cloud/StateDatabase.h"
+
+#include "platform/base/Log.h"
+#include "platform/cloud/NameFolding.h"
+#include "platform/cloud/StateHandles.h"
+#include "platform/cloud/Tokens.h"
+
+#include <charconv>
+
+namespace platform {
+namespace {
+
+using sqlite::Name;
+using sqlite::Statement;
+
+std::int64_t numberOf(std::string_view text) {
+    std::int64_t number = 0;
+    std::from_chars(text.data(), text.data() + text.size(), number);
+    return number;
+}
+
+const char* roleText(SharedRole role) {
+    return role == SharedRole::owner         ? "owner"
+           : role == SharedRole::participant ? "participant"
+                                             : "";
+}
+
+/// Identifiers of a database start at a random place, so that promises that outlive a lost database
+/// are never taken for items of the one that follows it.
+std::string newEpoch() {
+    const Bytes random = randomBytes(4);
+    std::uint64_t epoch = 0;
+    for (const std::byte byte : random)
+        epoch = epoch << 8 | std::to_integer<std::uint64_t>(byte);
+    return std::to_string((epoch & 0x3fffffff) + 1);
+}
+
+} // namespace
+
+StateDatabase::StateDatabase(std::unique_ptr<Handles> handles) : StateQueries(std::move(handles)) {
+}
+
+Result<std::unique_ptr<StateDatabase>> StateDatabase::open(const std::string& path, bool thorough) {
+    auto handles = std::make_unique<Handles>();
+    if (!handles->connection.open(path, false))
+        return *handles->connection.takeFault();
+    std::unique_ptr<StateDatabase> database(new StateDatabase(std::move(handles)));
+    if (Failure failure = database->prepareSchema(thorough))
+        return *failure;
+    return database;
+}
+
+Failure StateDatabase::prepareSchema(bool thorough) {
+    sqlite::Connection& connection = handles_->connection;
+    bool fresh = true;
+    {
+        Statement tables(connection, "SELECT 1 FROM sqlite_master LIMIT 1");
+        fresh = !tables.step();
+    }
+    if (Failure fault = takeFault())
+        return fault;
+    const std::int64_t version = fresh ? stateSchemaVersion : numberOf(meta("schema"));
+    if (version > stateSchemaVersion)
+        return makeError(ErrorCode::databaseFromLaterVersion);
+    connection.execute("PRAGMA journal_mode = WAL; PRAGMA synchronous = FULL;"
+                       "PRAGMA foreign_keys = ON; PRAGMA temp_store = MEMORY;"
+                       "PRAGMA cache_size = -32000; PRAGMA wal_autocheckpoint = 4000");
+    if (fresh) {
+        if (Failure failure = transaction([&]() -> Failure {
+                connection.execute(stateSchema);
+                setMeta("schema", std::to_string(stateSchemaVersion));
+                setMeta("epoch", newEpoch());
+                return std::nullopt;
+            }))
+            return failure;
+    } else if (thorough) {
+        Statement check(connection, "PRAGMA quick_check(1)");
+        if (check.step() && check.text(0) != "ok")
+            return makeError(ErrorCode::readCorrupt, "state.db");
+    }
+    if (Failure fault = takeFault())
+        return fault;
+    const std::int64_t first = numberOf(meta("epoch")) << 32;
+    if (first <= 0) // tables without what every database has since it was made
+        return takeFault().value_or(makeError(ErrorCode::readCorrupt, "state.db"));
+    Statement last(connection, "SELECT max(id) FROM item WHERE id >= ?1 AND id < ?2");
+    next_ = first + 1;
+    if (last.with(first, first + (1LL << 32)).step() && !last.isNull(0))
+        next_ = last.integer(0) + 1;
+    return takeFault();
+}
+
+Failure StateDatabase::transaction(const std::function<Failure()>& work) {
+    sqlite::Connection& connection = handles_->connection;
+    connection.takeFault(); // of an earlier question that nobody asked about
+    if (!connection.execute("BEGIN IMMEDIATE"))
+        return takeFault();
+    Failure failure = work();
+    if (!failure && !connection.hasFault() && connection.execute("COMMIT"))
+        return std::nullopt;
+    if (!failure)
+        failure = takeFault();
+    // Some faults (a full disk) have rolled back already; a second time is harmless.
+    connection.execute("ROLLBACK");
+    connection.takeFault();
+    return failure;
+}
+
+void StateDatabase::insertItem(const ItemRow& item) {
+    std::optional<ItemId> parent;
+    std::optional<Name> name;
+    std::optional<std::string> folded;
+    if (item.place) {
+        parent = item.place->parent;
+        name = Name{item.place->name};
+        folded = foldedName(item.place->name);
+    }
+    handles_
+        ->prepared("INSERT INTO item(id, parent, name, folded, kind) VALUES(?1, ?2, ?3, ?4, ?5)")
+        .with(item.id, parent, name, folded, item.kind)
+        .run();
+}
+
+void StateDatabase::setItemPlace(ItemId item, const std::optional<Place>& place) {
+    Statement& update =
+        handles_->prepared("UPDATE item SET parent = ?2, name = ?3, folded = ?4 WHERE id = ?1");
+    if (place)
+        update.with(item, place->parent, Name{place->name}, foldedName(place->name)).run();
+    else
+        update.with(item, std::nullopt, std::nullopt, std::nullopt).run();
+}
+
+void StateDatabase::removeItem(ItemId item) {
+    handles_->prepared("DELETE FROM item WHERE id = ?1").with(item).run();
+}
+
+void StateDatabase::putRemote(ItemId item, const RemoteRow& row) {
+    std::optional<std::int64_t> created;
+    if (row.created)
+        created = row.created->nanoseconds;
+    std::optional<std::string_view> remoteId;
+    if (!row.remoteId.empty())
+        remoteId = row.remoteId;
+    handles_
+        ->prepared("INSERT INTO remote(item, parent, name, etag, size, mtime, created, "
+                   "remote_id, shared, role, tags, gen) VALUES(?1, ?2, ?3, ?4, ?5, ?6, ?7, ?8, "
+                   "?9, ?10, ?11, ?12) ON CONFLICT(item) DO UPDATE SET parent = "
+                   "excluded.parent, name = excluded.name, etag = excluded.etag, size = "
+                   "excluded.size, mtime = excluded.mtime, created = excluded.created, "
+                   "remote_id = excluded.remote_id, shared = excluded.shared, role = "
+                   "excluded.role, tags = excluded.tags, gen = excluded.gen")
+        .with(item, row.place.parent, Name{row.place.name}, row.etag, row.size,
+              row.modified.nanoseconds, created, remoteId, row.role != SharedRole::none,
+              roleText(row.role), row.tags, row.generation)
+        .run();
+}
+
+void StateDatabase::removeRemote(ItemId item) {
+    handles_->prepared("DELETE FROM remote WHERE item = ?1").with(item).run();
+}
+
+void StateDatabase::setRemoteGeneration(ItemId item, std::int64_t generation) {
+    handles_->prepared("UPDATE remote SET gen = ?2 WHERE item = ?1").with(item, generation).run();
+}
+
+void StateDatabase::putLocal(ItemId item, const LocalRow& row) {
+    handles_
+        ->prepared("INSERT INTO local(item, parent, name, dev, ino, btime, size, mtime_ns, "
+                   "ctime_ns, promise, gen) VALUES(?1, ?2, ?3, ?4, ?5, ?6, ?7, ?8, ?9, ?10, "
+                   "?11) ON CONFLICT(item) DO UPDATE SET parent = excluded.parent, name = "
+                   "excluded.name, dev = excluded.dev, ino = excluded.ino, btime = "
+                   "excluded.btime, size = excluded.size, mtime_ns = excluded.mtime_ns, "
+                   "ctime_ns = excluded.ctime_ns, promise = excluded.promise, gen = "
+                   "excluded.gen")
+        .with(item, row.place.parent, Name{row.place.name}, row.identity.device, row.identity.inode,
+              row.identity.birthNanoseconds, row.size, row.modified.nanoseconds,
+              row.changed.nanoseconds, row.promise, row.generation)
+        .run();
+}
+
+void StateDatabase::removeLocal(ItemId item) {
+    handles_->prepared("DELETE FROM local WHERE item = ?1").with(item).run();
+}
+
+void StateDatabase::putBase(ItemId item, const BaseRow& row) {
+    std::optional<Bytes> hash;
+    if (!row.hash.empty())
+        hash = row.hash;
+    handles_
+        ->prepared("INSERT INTO base(item, parent, name, etag, size, hash, dev, ino, btime) "
+                   "VALUES(?1, ?2, ?3, ?4, ?5, ?6, ?7, ?8, ?9) ON CONFLICT(item) DO UPDATE SET "
+                   "parent = excluded.parent, name = excluded.name, etag = excluded.etag, size "
+                   "= excluded.size, hash = excluded.hash, dev = excluded.dev, ino = "
+                   "excluded.ino, btime = excluded.btime")
+        .with(item, row.place.parent, Name{row.place.name}, row.etag, row.size, hash,
+              row.identity.device, row.identity.inode, row.identity.birthNanoseconds)
+        .run();
+}
+
+void StateDatabase::removeBase(ItemId item) {
+    handles_->prepared("DELETE FROM base WHERE item = ?1").with(item).run();
+}
+
+void StateDatabase::putScan(ItemId folder, Side side, const ScanRow& scan) {
+    handles_
+        ->prepared("INSERT OR REPLACE INTO folder_scan(item, side, gen, complete)"
+                   " VALUES(?1, ?2, ?3, ?4)")
+        .with(folder, side, scan.generation, scan.complete)
+        .run();
+}
+
+void StateDatabase::setRefused(ItemId folder, Side side, const std::vector<RefusedRow>& rows) {
+    handles_->prepared("DELETE FROM refused WHERE folder = ?1 AND side = ?2")
+        .with(folder, side)
+        .run();
+    for (const RefusedRow& row : rows)
+        handles_
+            ->prepared("INSERT OR REPLACE INTO refused(folder, side, name, reason)"
+                       " VALUES(?1, ?2, ?3, ?4)")
+            .with(folder, side, Name{row.name}, row.reason)
+            .run();
+}
+
+std::int64_t StateDatabase::putOperation(const OpRow& row) {
+    std::optional<std::int64_t> id;
+    if (row.id != 0)
+        id = row.id;
+    std::optional<std::int64_t> nextAt;
+    if (row.nextAt)
+        nextAt = row.nextAt->nanoseconds;
+    handles_
+        ->prepared("INSERT OR REPLACE INTO op(id, item, kind, phase, staged, expect_etag, hash,"
+                   " offset, tries, next_at, error)"
+                   " VALUES(?1, ?2, ?3, ?4, ?5, ?6, ?7, ?8, ?9, ?10, ?11)")
+        .with(id, row.item, row.kind, row.phase, row.staged, row.expectEtag, row.hash, row.offset,
+              row.tries, nextAt, row.error)
+        .run();
+    return sqlite3_last_insert_rowid(handles_->connection.handle());
+}
+
+void StateDatabase::removeOperation(std::int64_t id) {
+    handles_->prepared("DELETE FROM op WHERE id = ?1").with(id).run();
+}
+
+void StateDatabase::setMeta(std::string_view name, std::string_view value) {
+    handles_->prepared("INSERT OR REPLACE INTO meta(name, value) VALUES(?1, ?2)")
+        .with(name, value)
+        .run();
+}
+
+void StateDatabase::replaceDevice(const std::string& before, const std::string& now) {
+    if (!before.empty()) {
+        handles_->prepared("UPDATE local SET dev = ?2 WHERE dev = ?1")
+            .with(numberOf(before), numberOf(now))
+            .run();
+        handles_->prepared("UPDATE base SET dev = ?2 WHERE dev = ?1")
+            .with(numberOf(before), numberOf(now))
+            .run();
+    }
+    setMeta("device", now);
+}
+
+void StateDatabase::setCapability(std::string_view name, std::string_view value) {
+    handles_->prepared("INSERT OR REPLACE INTO capability(name, value) VALUES(?1, ?2)")
+        .with(name, value)
+        .run();
+}
+
+} // namespace platform

@@ -1,0 +1,120 @@
+#pragma once
+
+#include "platform/base/Result.h"
+#include "platform/cloud/StateRecords.h"
+
+#include <atomic>
+#include <functional>
+#include <memory>
+#include <mutex>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace platform {
+
+/// Questions to the state database. A fault of the database ends in an empty answer and in
+/// takeFault().
+class StateQueries {
+public:
+    virtual ~StateQueries();
+    StateQueries(const StateQueries&) = delete;
+    StateQueries& operator=(const StateQueries&) = delete;
+
+    std::optional<ItemState> state(ItemId item);
+    /// Everything that either side, or the user, has in the folder.
+    std::vector<ItemState> childrenOf(ItemId folder);
+    std::optional<ItemId> itemAt(const Place& place);
+    /// The item at a path relative to the root ("" is the root).
+    std::optional<ItemId> itemAtPath(std::string_view path);
+    /// The path relative to the root at which the user sees the item.
+    std::optional<std::string> pathOf(ItemId item);
+    /// Its path on the remote as last observed.
+    std::optional<std::string> remotePathOf(ItemId item);
+    /// Items whose folded name contains the folded text, at most `limit`.
+    std::vector<ItemId> itemsNamed(std::string_view text, std::size_t limit);
+
+    ScanRow scan(ItemId folder, Side side);
+    std::vector<ItemId> unfinishedScans(Side side);
+    std::vector<OpRow> operations();
+    std::vector<RefusedRow> refused(ItemId folder, Side side);
+    /// Items with a role and an observation of the disk.
+    std::vector<ItemState> sharedItems();
+    StoreCounts counts();
+    /// "" when there is none.
+    std::string meta(std::string_view name);
+
+    Failure takeFault();
+
+protected:
+    struct Handles;
+    explicit StateQueries(std::unique_ptr<Handles> handles);
+    std::unique_ptr<Handles> handles_;
+};
+
+/// The state database with the right to write. Belongs to one queue; only newItemId() is safe from
+/// any thread.
+class StateDatabase final : public StateQueries {
+public:
+    /// Opens, or makes, the database. databaseFromLaterVersion: untouched. readCorrupt: damaged.
+    /// `thorough` reads all of it to find damage (after a crash).
+    static Result<std::unique_ptr<StateDatabase>> open(const std::string& path, bool thorough);
+
+    /// Runs the work in one transaction and brings it to the disk; when the work, or any step of
+    /// it, fails, nothing of it is kept.
+    [[nodiscard]] Failure transaction(const std::function<Failure()>& work);
+    ItemId newItemId() { return next_.fetch_add(1, std::memory_order_relaxed); }
+
+    // Within a transaction:
+    void insertItem(const ItemRow& item);
+    /// None hides the item until it has a name again.
+    void setItemPlace(ItemId item, const std::optional<Place>& place);
+    void removeItem(ItemId item);
+    void putRemote(ItemId item, const RemoteRow& row);
+    void removeRemote(ItemId item);
+    void setRemoteGeneration(ItemId item, std::int64_t generation);
+    void putLocal(ItemId item, const LocalRow& row);
+    void removeLocal(ItemId item);
+    void putBase(ItemId item, const BaseRow& row);
+    void removeBase(ItemId item);
+    /// A folder's listing number. A row of the remote whose generation equals it is there; one less
+    /// is missing since one whole listing, two less since two. The number moves on only when
+    /// something is missing, so that a listing without news writes nothing.
+    void putScan(ItemId folder, Side side, const ScanRow& scan);
+    void setRefused(ItemId folder, Side side, const std::vector<RefusedRow>& rows);
+    /// Inserts (id 0) or replaces; answers the id.
+    std::int64_t putOperation(const OpRow& row);
+    void removeOperation(std::int64_t id);
+    void setMeta(std::string_view name, std::string_view value);
+    /// Records the device of the tree, and changes it wherever an identity names the earlier one.
+    void replaceDevice(const std::string& before, const std::string& now);
+    void setCapability(std::string_view name, std::string_view value);
+
+private:
+    explicit StateDatabase(std::unique_ptr<Handles> handles);
+    Failure prepareSchema(bool thorough);
+    std::atomic<ItemId> next_{0};
+};
+
+/// Reads the database while another, of this or of another process, writes. Safe from any thread,
+/// one caller at a time.
+class StateReader {
+public:
+    static Result<std::shared_ptr<StateReader>> open(const std::string& path);
+    ~StateReader();
+
+    template<class Ask>
+    auto ask(const Ask& question) {
+        const std::lock_guard lock(mutex_);
+        return question(*queries_);
+    }
+
+private:
+    class Queries;
+    StateReader();
+    std::mutex mutex_;
+    std::unique_ptr<StateQueries> queries_;
+};
+
+} // namespace platform

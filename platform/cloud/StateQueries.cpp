@@ -1,0 +1,284 @@
+#include "platform/cloud/NameFolding.h"
+#include "platform/cloud/StateHandles.h"
+
+#include <algorithm>
+
+namespace platform {
+namespace {
+
+using sqlite::Name;
+using sqlite::Statement;
+
+/// The columns of a whole state, in the order in which readState takes them.
+#define STATE_COLUMNS                                                                              \
+    "SELECT i.id, i.kind, i.parent, i.name,"                                                       \
+    " r.parent, r.name, r.etag, r.size, r.mtime, r.created, r.remote_id, r.role, r.tags, r.gen,"   \
+    " l.parent, l.name, l.dev, l.ino, l.btime, l.size, l.mtime_ns, l.ctime_ns, l.promise, l.gen,"  \
+    " b.parent, b.name, b.etag, b.size, b.hash, b.dev, b.ino, b.btime"                             \
+    " FROM item i LEFT JOIN remote r ON r.item = i.id LEFT JOIN local l ON l.item = i.id"          \
+    " LEFT JOIN base b ON b.item = i.id "
+
+SharedRole roleOf(std::string_view text) {
+    if (text == "owner")
+        return SharedRole::owner;
+    return text == "participant" ? SharedRole::participant : SharedRole::none;
+}
+
+RemoteRow readRemote(const Statement& row, int at) {
+    RemoteRow remote;
+    remote.place = {row.integer(at), row.text(at + 1)};
+    remote.etag = row.text(at + 2);
+    remote.size = static_cast<std::uint64_t>(row.integer(at + 3));
+    remote.modified = {row.integer(at + 4)};
+    if (!row.isNull(at + 5))
+        remote.created = Date{row.integer(at + 5)};
+    remote.remoteId = row.text(at + 6);
+    remote.role = roleOf(row.text(at + 7));
+    remote.tags = row.text(at + 8);
+    remote.generation = row.integer(at + 9);
+    return remote;
+}
+
+LocalRow readLocal(const Statement& row, int at) {
+    LocalRow local;
+    local.place = {row.integer(at), row.text(at + 1)};
+    local.identity = {static_cast<std::uint64_t>(row.integer(at + 2)),
+                      static_cast<std::uint64_t>(row.integer(at + 3)), row.integer(at + 4)};
+    local.size = static_cast<std::uint64_t>(row.integer(at + 5));
+    local.modified = {row.integer(at + 6)};
+    local.changed = {row.integer(at + 7)};
+    local.promise = row.integer(at + 8) != 0;
+    local.generation = row.integer(at + 9);
+    return local;
+}
+
+BaseRow readBase(const Statement& row, int at) {
+    BaseRow base;
+    base.place = {row.integer(at), row.text(at + 1)};
+    base.etag = row.text(at + 2);
+    base.size = static_cast<std::uint64_t>(row.integer(at + 3));
+    base.hash = row.bytes(at + 4);
+    base.identity = {static_cast<std::uint64_t>(row.integer(at + 5)),
+                     static_cast<std::uint64_t>(row.integer(at + 6)), row.integer(at + 7)};
+    return base;
+}
+
+ItemState readState(const Statement& row) {
+    ItemState state;
+    state.item.id = row.integer(0);
+    state.item.kind = static_cast<ItemKind>(row.integer(1));
+    if (!row.isNull(2) && !row.isNull(3))
+        state.item.place = Place{row.integer(2), row.text(3)};
+    if (!row.isNull(4))
+        state.remote = readRemote(row, 4);
+    if (!row.isNull(14))
+        state.local = readLocal(row, 14);
+    if (!row.isNull(24))
+        state.base = readBase(row, 24);
+    return state;
+}
+
+std::vector<ItemState> readStates(Statement& rows) {
+    std::vector<ItemState> states;
+    while (rows.step())
+        states.push_back(readState(rows));
+    return states;
+}
+
+/// Deeper than any path that the system takes; a circle of damaged rows ends here.
+constexpr int deepest = 4096;
+
+/// Follows `parents` (columns parent, name of one item) up to the root.
+std::optional<std::string> pathUpwards(Statement& parents, ItemId item) {
+    std::string path;
+    for (int depth = 0; item != rootItem; ++depth) {
+        if (depth == deepest || !parents.with(item).step() || parents.isNull(0) ||
+            parents.isNull(1))
+            return std::nullopt;
+        path.insert(0, path.empty() ? parents.text(1) : parents.text(1) + '/');
+        item = parents.integer(0);
+        parents.reset();
+    }
+    return path;
+}
+
+} // namespace
+
+StateQueries::StateQueries(std::unique_ptr<Handles> handles) : handles_(std::move(handles)) {
+}
+StateQueries::~StateQueries() = default;
+
+Failure StateQueries::takeFault() {
+    return handles_->connection.takeFault();
+}
+
+std::optional<ItemState> StateQueries::state(ItemId item) {
+    Statement& row = handles_->prepared(STATE_COLUMNS "WHERE i.id = ?1");
+    if (!row.with(item).step())
+        return std::nullopt;
+    ItemState state = readState(row);
+    row.reset();
+    return state;
+}
+
+std::vector<ItemState> StateQueries::childrenOf(ItemId folder) {
+    return readStates(handles_
+                          ->prepared(STATE_COLUMNS
+                                     "WHERE i.id IN (SELECT id FROM item WHERE parent = ?1"
+                                     " UNION SELECT item FROM remote WHERE parent = ?1"
+                                     " UNION SELECT item FROM local WHERE parent = ?1)")
+                          .with(folder));
+}
+
+std::optional<ItemId> StateQueries::itemAt(const Place& place) {
+    Statement& row = handles_->prepared("SELECT id FROM item WHERE parent = ?1 AND name = ?2");
+    if (!row.with(place.parent, Name{place.name}).step())
+        return std::nullopt;
+    const ItemId item = row.integer(0);
+    row.reset();
+    return item;
+}
+
+std::optional<ItemId> StateQueries::itemAtPath(std::string_view path) {
+    ItemId item = rootItem;
+    while (!path.empty()) {
+        const std::size_t slash = path.find('/');
+        const std::optional<ItemId> next = itemAt({item, std::string(path.substr(0, slash))});
+        if (!next)
+            return std::nullopt;
+        item = *next;
+        path.remove_prefix(slash == std::string_view::npos ? path.size() : slash + 1);
+    }
+    return item;
+}
+
+std::optional<std::string> StateQueries::pathOf(ItemId item) {
+    return pathUpwards(handles_->prepared("SELECT parent, name FROM item WHERE id = ?1"), item);
+}
+
+std::optional<std::string> StateQueries::remotePathOf(ItemId item) {
+    return pathUpwards(handles_->prepared("SELECT parent, name FROM remote WHERE item = ?1"), item);
+}
+
+std::vector<ItemId> StateQueries::itemsNamed(std::string_view text, std::size_t limit) {
+    Statement& rows = handles_->prepared(
+        "SELECT id FROM item WHERE name IS NOT NULL AND id <> 1 AND instr(folded, ?1) LIMIT ?2");
+    const std::string folded = foldedName(text);
+    rows.with(folded, limit);
+    std::vector<ItemId> items;
+    while (rows.step())
+        items.push_back(rows.integer(0));
+    return items;
+}
+
+ScanRow StateQueries::scan(ItemId folder, Side side) {
+    Statement& row =
+        handles_->prepared("SELECT gen, complete FROM folder_scan WHERE item = ?1 AND side = ?2");
+    if (!row.with(folder, side).step())
+        return {};
+    const ScanRow scan{row.integer(0), row.integer(1) != 0};
+    row.reset();
+    return scan;
+}
+
+std::vector<ItemId> StateQueries::unfinishedScans(Side side) {
+    Statement& rows = handles_->prepared(
+        "SELECT item FROM folder_scan WHERE side = ?1 AND complete = 0 ORDER BY item");
+    rows.with(side);
+    std::vector<ItemId> items;
+    while (rows.step())
+        items.push_back(rows.integer(0));
+    return items;
+}
+
+std::vector<OpRow> StateQueries::operations() {
+    Statement& rows =
+        handles_->prepared("SELECT id, item, kind, phase, staged, expect_etag, hash, offset, tries,"
+                           " next_at, error FROM op ORDER BY id");
+    rows.with();
+    std::vector<OpRow> operations;
+    while (rows.step()) {
+        OpRow op{rows.integer(0),
+                 rows.integer(1),
+                 rows.text(2),
+                 rows.text(3),
+                 rows.text(4),
+                 rows.text(5),
+                 rows.bytes(6),
+                 static_cast<std::uint64_t>(rows.integer(7)),
+                 static_cast<int>(rows.integer(8)),
+                 std::nullopt,
+                 rows.text(10)};
+        if (!rows.isNull(9))
+            op.nextAt = Date{rows.integer(9)};
+        operations.push_back(std::move(op));
+    }
+    return operations;
+}
+
+std::vector<RefusedRow> StateQueries::refused(ItemId folder, Side side) {
+    Statement& rows = handles_->prepared(
+        "SELECT name, reason FROM refused WHERE folder = ?1 AND side = ?2 ORDER BY name");
+    rows.with(folder, side);
+    std::vector<RefusedRow> refused;
+    while (rows.step())
+        refused.push_back({rows.text(0), rows.text(1)});
+    return refused;
+}
+
+std::vector<ItemState> StateQueries::sharedItems() {
+    return readStates(
+        handles_->prepared(STATE_COLUMNS "WHERE r.shared = 1 AND l.item IS NOT NULL").with());
+}
+
+StoreCounts StateQueries::counts() {
+    StoreCounts counts;
+    Statement& row = handles_->prepared(
+        "SELECT (SELECT count(*) FROM item WHERE kind = 1 AND id <> 1),"
+        " (SELECT count(*) FROM item WHERE kind = 0),"
+        " (SELECT count(*) FROM local WHERE promise = 1),"
+        " (SELECT coalesce(sum(r.size), 0) FROM remote r JOIN item i ON i.id = r.item"
+        "  WHERE i.kind = 0),"
+        " (SELECT count(*) FROM refused)");
+    if (row.with().step()) {
+        counts = {row.integer(0), row.integer(1), row.integer(2), row.integer(3), row.integer(4)};
+        row.reset();
+    }
+    return counts;
+}
+
+std::string StateQueries::meta(std::string_view name) {
+    Statement& row = handles_->prepared("SELECT value FROM meta WHERE name = ?1");
+    if (!row.with(name).step())
+        return {};
+    std::string value = row.text(0);
+    row.reset();
+    return value;
+}
+
+class StateReader::Queries final : public StateQueries {
+public:
+    explicit Queries(std::unique_ptr<Handles> handles) : StateQueries(std::move(handles)) {}
+    static Result<std::unique_ptr<StateQueries>> open(const std::string& path) {
+        auto handles = std::make_unique<Handles>();
+        if (!handles->connection.open(path, true))
+            return *handles->connection.takeFault();
+        return std::unique_ptr<StateQueries>(std::make_unique<Queries>(std::move(handles)));
+    }
+};
+
+StateReader::StateReader() = default;
+StateReader::~StateReader() = default;
+
+Result<std::shared_ptr<StateReader>> StateReader::open(const std::string& path) {
+    Result<std::unique_ptr<StateQueries>> queries = Queries::open(path);
+    if (!queries)
+        return queries.error();
+    std::shared_ptr<StateReader> reader(new StateReader());
+    reader->queries_ = std::move(*queries);
+    if ((*reader->queries_).meta("schema").empty())
+        return reader->queries_->takeFault().value_or(makeError(ErrorCode::databaseUnusable));
+    return reader;
+}
+
+} // namespace platform
