@@ -1,0 +1,74 @@
+#pragma once
+
+#include "platform/base/Result.h"
+#include "platform/cloud/StateRecords.h"
+#include "platform/files/ContentProvider.h"
+
+#include <cstddef>
+#include <functional>
+#include <memory>
+#include <optional>
+#include <span>
+#include <string>
+#include <vector>
+
+namespace platform {
+
+/// One item as a remote shows it.
+struct RemoteEntry {
+    std::string name;
+    ItemKind kind = ItemKind::file;
+    std::uint64_t size = 0;
+    Date modified;
+    std::optional<Date> created;
+    /// Changes with every change of the item; equal means the same version.
+    std::string etag;
+    /// The same for the item's whole life, wherever it moves; "" when the remote has none.
+    std::string remoteId;
+    SharedRole role = SharedRole::none;
+    /// As in the attribute user.xdg.tags.
+    std::string tags;
+};
+
+/// A folder as it was at one moment. There is none of a part of a folder.
+struct RemoteListing {
+    std::vector<RemoteEntry> entries;
+    /// What lies there and cannot be an item of a store, with the reason.
+    std::vector<RefusedRow> refused;
+};
+
+/// The far side of an account: a tree of folders and files that others change as well. Paths are
+/// relative to its root, without a leading slash ("" is the root). Calls block and may come from
+/// several threads at once; each can be cancelled (userCancelled).
+///
+/// serverNotAvailable means that nothing is known: the remote is away, or is not the one that it
+/// was. noSuchItem means that the remote is there, and the item is not.
+class Remote {
+public:
+    virtual ~Remote() = default;
+
+    /// Takes the piece of a content that follows; an error ends the transfer with that error.
+    using Sink = std::function<Failure(std::span<const std::byte> piece)>;
+
+    /// Proves that it is there. Answers what tells it from every other remote.
+    virtual Result<std::string> connect(CancelFlag& cancel) = 0;
+    virtual Result<RemoteListing> list(const std::string& path, CancelFlag& cancel) = 0;
+    virtual Result<RemoteEntry> entry(const std::string& path, CancelFlag& cancel) = 0;
+    /// Hands the content over and answers the version that it was, as a whole; changedWhileRead
+    /// when it did not stay the same, and then the pieces are worth nothing.
+    virtual Result<RemoteEntry> read(const std::string& path, const Sink& sink,
+                                     CancelFlag& cancel) = 0;
+    /// Bytes that may still be stored; none where the remote does not tell.
+    virtual Result<std::optional<std::uint64_t>> freeBytes(CancelFlag& cancel) = 0;
+};
+
+struct AccountRecord;
+/// Makes the remote of an account; empty for a kind that this version does not know. Does not
+/// touch the remote: that is for connect().
+using RemoteFactory = std::function<std::unique_ptr<Remote>(const AccountRecord& account)>;
+RemoteFactory standardRemotes();
+
+/// Files and folders of a remote that serve the store and are no items of it.
+inline constexpr std::string_view remoteServiceFolder = ".pelmora";
+
+} // namespace platform
