@@ -103,7 +103,9 @@ bool hasSidecarForm(std::string_view name) {
 }
 
 std::string promisedName(std::string_view sidecarName, const SidecarMark& mark) {
-    if (!mark.name.empty())
+    // A move changes file name and mark one after the other, so a mark's name counts only where the
+    // file's name was made from it.
+    if (!mark.name.empty() && shortenedSidecarNameFor(mark.name).text == sidecarName)
         return mark.name;
     return std::string(sidecarName.substr(1, sidecarName.size() - 1 - suffix.size()));
 }

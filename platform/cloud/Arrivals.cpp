@@ -1,0 +1,201 @@
+#include "platform/cloud/Arrivals.h"
+
+#include "platform/base/Text.h"
+#include "platform/cloud/ContainerFile.h"
+#include "platform/cloud/ContainerSet.h"
+#include "platform/cloud/ContentHash.h"
+#include "platform/cloud/StoreFileSystem.h"
+
+namespace platform {
+namespace {
+
+constexpr std::size_t longestName = 255;
+
+/// Why a disk cannot have an item of that name; none when it can.
+std::optional<std::string> nameProblem(const std::string& name, const Arrivals::Spot& spot) {
+    if (name.empty() || name == "." || name == ".." || name.find('/') != std::string::npos ||
+        name.find('\0') != std::string::npos)
+        return localized("The disk cannot have an item of that name.");
+    if (name.size() > longestName)
+        return localized("The name is too long for the disk.");
+    if (hasSidecarForm(name) || (spot.relative.empty() && name == ".pelmora-root"))
+        return localized("The name is one that the store uses itself.");
+    return std::nullopt;
+}
+
+BaseRow baseOf(const Place& place, const RemoteEntry& entry, const FileIdentity& identity,
+               Bytes hash = {}) {
+    return {place, entry.etag, entry.size, std::move(hash), identity};
+}
+
+} // namespace
+
+bool Arrivals::isFetchedAtOnce(const Spot& spot, const RemoteEntry& entry) {
+    return entry.name == containerFileName && entry.kind == ItemKind::file &&
+           !spot.relative.empty() && spot.relative.find('/') == std::string::npos &&
+           entry.size <= largestContainerFile;
+}
+
+Result<Arrivals::Outcome> Arrivals::arrive(const Spot& spot, const RemoteEntry& entry,
+                                           std::optional<ItemId> item) {
+    Outcome outcome;
+    outcome.refused = nameProblem(entry.name, spot);
+    if (outcome.refused)
+        return outcome;
+    outcome.item = item ? *item : context_.database.newItemId();
+    if (spot.names.contains(entry.name))
+        return takeExisting(spot, entry, std::move(outcome));
+    if (entry.kind == ItemKind::folder)
+        return takeFolder(spot, entry, std::move(outcome));
+    if (isFetchedAtOnce(spot, entry))
+        return fetch(spot, entry, std::move(outcome));
+    return promise(spot, entry, std::move(outcome));
+}
+
+Result<Arrivals::Outcome> Arrivals::takeFolder(const Spot& spot, const RemoteEntry& entry,
+                                               Outcome outcome) {
+    const std::string path = spot.path + '/' + entry.name;
+    if (Failure failure = context_.disk.makeFolder(path)) {
+        if (failure->is(ErrorCode::fileExists)) // made by somebody a moment ago
+            return takeExisting(spot, entry, std::move(outcome));
+        return *failure;
+    }
+    const Result<FileAttributes> attributes = context_.disk.attributes(path);
+    if (!attributes)
+        return attributes.error();
+    const Place place{spot.folder, entry.name};
+    outcome.madeFolder = true;
+    outcome.local = localRowOf(place, *attributes, false);
+    outcome.base = baseOf(place, entry, attributes->identity);
+    return outcome;
+}
+
+Result<Arrivals::Outcome> Arrivals::takeExisting(const Spot& spot, const RemoteEntry& entry,
+                                                 Outcome outcome) {
+    const Result<FileAttributes> attributes =
+        context_.disk.attributes(spot.path + '/' + entry.name);
+    if (!attributes)
+        return attributes.error();
+    const bool folder = attributes->kind == FileKind::directory;
+    if (attributes->kind != FileKind::file && !folder)
+        outcome.refused = localized("Something else has that name on the device.");
+    else if (folder && entry.kind == ItemKind::file)
+        outcome.refused = localized("A folder on the device has that name.");
+    else if (!folder && entry.kind == ItemKind::folder)
+        outcome.refused = localized("A file on the device has that name.");
+    if (outcome.refused)
+        return outcome;
+    const Place place{spot.folder, entry.name};
+    outcome.local = localRowOf(place, *attributes, false);
+    // Two folders of one name are one folder. Two files have nothing in common until their
+    // contents were compared: no base.
+    if (folder)
+        outcome.base = baseOf(place, entry, attributes->identity);
+    return outcome;
+}
+
+Result<Arrivals::Outcome> Arrivals::promise(const Spot& spot, const RemoteEntry& entry,
+                                            Outcome outcome) {
+    const SidecarName usual = sidecarNameFor(entry.name);
+    const SidecarName cut = usual.needsName ? usual : shortenedSidecarNameFor(entry.name);
+    if (!usual.needsName && spot.names.contains(cut.text)) {
+        // An earlier run found the usual name taken.
+        const Result<std::optional<Outcome>> taken =
+            takeOver(spot, spot.path + '/' + cut.text, entry, outcome);
+        if (!taken)
+            return taken.error();
+        if (*taken)
+            return **taken;
+    }
+    for (const SidecarName* name : {&usual, &cut}) {
+        const std::string path = spot.path + '/' + name->text;
+        const SidecarMark mark{context_.mark, outcome.item,
+                               name->needsName ? entry.name : std::string()};
+        const Result<FileAttributes> made = context_.disk.makeSidecar(path, encodedMark(mark));
+        if (made) {
+            const Place place{spot.folder, entry.name};
+            outcome.local = localRowOf(place, *made, true);
+            outcome.base = baseOf(place, entry, made->identity);
+            return outcome;
+        }
+        if (!made.error().is(ErrorCode::fileExists))
+            return made.error();
+        const Result<std::optional<Outcome>> taken = takeOver(spot, path, entry, outcome);
+        if (!taken)
+            return taken.error();
+        if (*taken)
+            return **taken;
+    }
+    outcome.refused = localized("Files on the device have the names that its promise would need.");
+    return outcome;
+}
+
+Result<std::optional<Arrivals::Outcome>> Arrivals::takeOver(const Spot& spot,
+                                                            const std::string& path,
+                                                            const RemoteEntry& entry,
+                                                            const Outcome& outcome) {
+    std::optional<SidecarMark> mark = readMark(path, context_.mark);
+    if (!mark || promisedName(Url::file(path).lastPathComponent(), *mark) != entry.name)
+        return std::optional<Outcome>();
+    Outcome taken = outcome;
+    if (mark->item != outcome.item && !isKnown(mark->item)) {
+        taken.item = mark->item; // made by a run that did not come to write it down
+    } else if (mark->item != outcome.item) {
+        mark->item = outcome.item; // a copy of another item's promise
+        if (Failure failure = context_.disk.setMark(path, encodedMark(*mark)))
+            return *failure;
+    }
+    const Result<FileAttributes> attributes = context_.disk.attributes(path);
+    if (!attributes)
+        return attributes.error();
+    const Place place{spot.folder, entry.name};
+    taken.local = localRowOf(place, *attributes, true);
+    taken.base = baseOf(place, entry, attributes->identity);
+    return std::optional(std::move(taken));
+}
+
+bool Arrivals::isKnown(ItemId item) {
+    bool known = false;
+    context_.queue.sync([&] { known = context_.database.state(item).has_value(); });
+    return known;
+}
+
+Result<Arrivals::Outcome> Arrivals::fetch(const Spot& spot, const RemoteEntry& entry,
+                                          Outcome outcome) {
+    std::string content;
+    const std::string remotePath = spot.remotePath + '/' + entry.name;
+    const Result<RemoteEntry> version = context_.remote.read(
+        remotePath,
+        [&](std::span<const std::byte> piece) -> Failure {
+            content.append(reinterpret_cast<const char*>(piece.data()), piece.size());
+            return std::nullopt;
+        },
+        cancel_);
+    if (!version)
+        return version.error();
+    const std::string path = spot.path + '/' + entry.name;
+    if (Failure failure = context_.disk.writeSmallFile(path, content))
+        return *failure;
+    const Result<FileAttributes> attributes = context_.disk.attributes(path);
+    if (!attributes)
+        return attributes.error();
+    const Place place{spot.folder, entry.name};
+    outcome.local = localRowOf(place, *attributes, false);
+    outcome.base = baseOf(place, *version, attributes->identity, ContentHash::of(content));
+    return outcome;
+}
+
+Result<Arrivals::Outcome> Arrivals::renew(const Spot& spot, const RemoteEntry& entry,
+                                          const ItemState& state) {
+    Outcome outcome;
+    outcome.item = state.item.id;
+    const Result<Bytes> content =
+        FileManager::contents(Url::file(spot.path + '/' + entry.name), largestContainerFile + 1);
+    if (!content || !state.base)
+        return outcome;
+    const Bytes hash =
+        ContentHash::of({reinterpret_cast<const char*>(content->data()), content->size()});
+    return hash == state.base->hash ? fetch(spot, entry, std::move(outcome)) : outcome;
+}
+
+} // namespace platform

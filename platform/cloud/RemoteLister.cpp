@@ -1,0 +1,263 @@
+#include "platform/cloud/RemoteLister.h"
+
+#include "platform/base/Log.h"
+#include "platform/base/Text.h"
+#include "platform/cloud/StoreFileSystem.h"
+
+#include <algorithm>
+
+namespace platform {
+namespace {
+
+/// Entries that one transaction and one sync carry: enough that both cost little an entry, few
+/// enough that an interrupted listing repeats little and that the queue is free again soon.
+constexpr std::size_t batchSize = 4096;
+
+/// Failures that are not of one folder: going on would only repeat them.
+bool stopsEverything(const Error& error) {
+    constexpr std::array codes{ErrorCode::serverNotAvailable, ErrorCode::authenticationFailed,
+                               ErrorCode::userCancelled,      ErrorCode::outOfSpace,
+                               ErrorCode::readOnlyVolume,     ErrorCode::databaseUnusable,
+                               ErrorCode::readCorrupt,        ErrorCode::itemBusy};
+    return std::any_of(codes.begin(), codes.end(), [&](ErrorCode code) { return error.is(code); });
+}
+
+bool sameObservation(const RemoteRow& row, const RemoteEntry& entry) {
+    return row.etag == entry.etag && row.size == entry.size && row.remoteId == entry.remoteId &&
+           row.role == entry.role && row.tags == entry.tags;
+}
+
+std::string joined(const std::string& folder, const std::string& name) {
+    return folder.empty() ? name : folder + '/' + name;
+}
+
+} // namespace
+
+RemoteLister::RemoteLister(StoreContext& context, CancelFlag& cancel, Written written)
+    : context_(context), cancel_(cancel), written_(std::move(written)), arrivals_(context, cancel) {
+}
+
+RemoteLister::~RemoteLister() {
+    if (writing_.valid())
+        writing_.wait(); // its job refers to this object
+}
+
+Failure RemoteLister::run(const std::vector<ItemId>& folders, Depth depth) {
+    depth_ = depth;
+    context_.queue.sync([&] {
+        for (const ItemId item : folders) {
+            const std::optional<std::string> remotePath = context_.database.remotePathOf(item);
+            const std::optional<std::string> localPath = context_.database.pathOf(item);
+            if (remotePath && localPath)
+                waiting_.push_back({item, *remotePath, *localPath, false, false});
+        }
+    });
+    while (!waiting_.empty()) {
+        const Folder folder = std::move(waiting_.front());
+        waiting_.pop_front();
+        const Failure failure = cancel_.isCancelled() ? Failure(makeError(ErrorCode::userCancelled))
+                                                      : listFolder(folder);
+        if (!failure)
+            continue;
+        noteFailure(folder, *failure);
+        if (stopsEverything(*failure))
+            break;
+    }
+    Failure writing = writeDown();
+    if (!writing)
+        writing = writtenSoFar();
+    return firstFailure_ ? firstFailure_ : writing;
+}
+
+void RemoteLister::noteFailure(const Folder& folder, const Error& error) {
+    if (!error.is(ErrorCode::userCancelled))
+        platformLog(LogLevel::warning, "cloud: cannot list “%@”: %@", folder.remotePath, error);
+    if (!firstFailure_)
+        firstFailure_ = error;
+}
+
+RemoteLister::Known RemoteLister::knownOf(const Folder& folder) {
+    Known known;
+    if (folder.unknown)
+        return known;
+    context_.queue.sync([&] {
+        known.scan = context_.database.scan(folder.item, Side::remote);
+        known.states = context_.database.childrenOf(folder.item);
+    });
+    for (const ItemState& state : known.states) {
+        if (state.remote && state.remote->place.parent == folder.item)
+            known.remote.emplace(state.remote->place.name, &state);
+        if (state.item.place && state.item.place->parent == folder.item)
+            known.shown.emplace(state.item.place->name, &state);
+    }
+    return known;
+}
+
+Result<Arrivals::Spot> RemoteLister::spotOf(const Folder& folder) {
+    Arrivals::Spot spot{
+        folder.item, folder.localPath, context_.pathOf(folder.localPath), folder.remotePath, {}};
+    if (folder.empty)
+        return spot;
+    const Result<std::vector<DirectoryEntry>> entries = context_.disk.entries(spot.path);
+    if (!entries)
+        return entries.error();
+    for (const DirectoryEntry& entry : *entries)
+        spot.names.insert(entry.name);
+    return spot;
+}
+
+Failure RemoteLister::listFolder(const Folder& folder) {
+    const Result<RemoteListing> listing = context_.remote.list(folder.remotePath, cancel_);
+    if (!listing)
+        return listing.error();
+    Result<Arrivals::Spot> spot = spotOf(folder);
+    if (!spot)
+        return spot.error();
+    Visit visit{folder, knownOf(folder), std::move(*spot), 1, listing->refused};
+    std::unordered_map<std::string_view, const ItemState*> missing = visit.known.remote;
+    for (const RemoteEntry& entry : listing->entries)
+        missing.erase(entry.name);
+    visit.generation =
+        std::max<std::int64_t>(1, visit.known.scan.generation + (missing.empty() ? 0 : 1));
+    for (const RemoteEntry& entry : listing->entries) {
+        if (Failure failure = take(visit, entry))
+            return failure;
+        if (batch_.size() >= batchSize)
+            if (Failure failure = writeDown())
+                return failure;
+    }
+    batch_.scans.push_back({folder.item, {visit.generation, true}, std::move(visit.refused)});
+    return std::nullopt;
+}
+
+Failure RemoteLister::take(Visit& visit, const RemoteEntry& entry) {
+    if (const auto known = visit.known.remote.find(entry.name); known != visit.known.remote.end())
+        return takeKnown(visit, entry, *known->second);
+    const auto shown = visit.known.shown.find(entry.name);
+    if (shown == visit.known.shown.end())
+        return takeNew(visit, entry, nullptr);
+    const ItemState& state = *shown->second;
+    if (state.remote || state.item.kind != entry.kind) {
+        // The user sees another item under that name. This one waits until it can have a name.
+        addRemoteOnly(visit, entry);
+        return std::nullopt;
+    }
+    return takeNew(visit, entry, &state);
+}
+
+Failure RemoteLister::takeKnown(Visit& visit, const RemoteEntry& entry, const ItemState& state) {
+    if (state.item.kind != entry.kind) {
+        visit.refused.push_back(
+            {entry.name, localized("It took the place of something else on the account.")});
+        return std::nullopt;
+    }
+    if (!state.local && !state.base && state.item.place)
+        return takeNew(visit, entry, &state);
+    if (entry.kind == ItemKind::folder && depth_ == Depth::everything && state.local)
+        descendKnown(visit, entry, state);
+    if (sameObservation(*state.remote, entry)) {
+        if (state.remote->generation != visit.generation)
+            batch_.seen.emplace_back(state.item.id, visit.generation);
+        return std::nullopt;
+    }
+    ListingBatch::Change change{state.item, false, rowOf(visit, entry), {}, {}};
+    if (state.base && state.local && state.local->promise) {
+        // A promise has no content of its own: the record follows the remote.
+        change.base = state.base;
+        change.base->etag = entry.etag;
+        change.base->size = entry.size;
+    } else if (Arrivals::isFetchedAtOnce(visit.spot, entry)) {
+        Result<Arrivals::Outcome> renewed = arrivals_.renew(visit.spot, entry, state);
+        if (!renewed)
+            return renewed.error();
+        change.local = std::move(renewed->local);
+        change.base = std::move(renewed->base);
+    }
+    batch_.changes.push_back(std::move(change));
+    return std::nullopt;
+}
+
+Failure RemoteLister::takeNew(Visit& visit, const RemoteEntry& entry, const ItemState* state) {
+    Result<Arrivals::Outcome> outcome =
+        arrivals_.arrive(visit.spot, entry, state ? std::optional(state->item.id) : std::nullopt);
+    if (!outcome)
+        return outcome.error();
+    if (outcome->refused) {
+        visit.refused.push_back({entry.name, *outcome->refused});
+        return std::nullopt;
+    }
+    batch_.effectsOnDisk = true;
+    const ItemId item = outcome->item;
+    batch_.changes.push_back({{item, entry.kind, Place{visit.folder.item, entry.name}},
+                              state == nullptr,
+                              rowOf(visit, entry),
+                              std::move(outcome->local),
+                              std::move(outcome->base)});
+    if (entry.kind == ItemKind::folder) {
+        batch_.scans.push_back({item, {0, false}, std::nullopt});
+        waiting_.push_back({item, joined(visit.folder.remotePath, entry.name),
+                            joined(visit.folder.localPath, entry.name), state == nullptr,
+                            outcome->madeFolder});
+    }
+    return std::nullopt;
+}
+
+void RemoteLister::addRemoteOnly(Visit& visit, const RemoteEntry& entry) {
+    batch_.changes.push_back({{context_.database.newItemId(), entry.kind, std::nullopt},
+                              true,
+                              rowOf(visit, entry),
+                              std::nullopt,
+                              std::nullopt});
+}
+
+void RemoteLister::descendKnown(const Visit& visit, const RemoteEntry& entry,
+                                const ItemState& state) {
+    std::optional<std::string> localPath = joined(visit.folder.localPath, entry.name);
+    if (state.item.place != Place{visit.folder.item, entry.name}) // moved on this device
+        context_.queue.sync([&] { localPath = context_.database.pathOf(state.item.id); });
+    if (localPath)
+        waiting_.push_back(
+            {state.item.id, joined(visit.folder.remotePath, entry.name), *localPath, false, false});
+}
+
+RemoteRow RemoteLister::rowOf(const Visit& visit, const RemoteEntry& entry) const {
+    return {Place{visit.folder.item, entry.name},
+            entry.etag,
+            entry.size,
+            entry.modified,
+            entry.created,
+            entry.remoteId,
+            entry.role,
+            entry.tags,
+            visit.generation};
+}
+
+Failure RemoteLister::writtenSoFar() {
+    return writing_.valid() ? writing_.get() : std::nullopt;
+}
+
+Failure RemoteLister::writeDown() {
+    if (Failure failure = writtenSoFar())
+        return failure;
+    if (batch_.size() == 0)
+        return std::nullopt;
+    auto done = std::make_shared<std::promise<Failure>>();
+    writing_ = done->get_future();
+    auto batch = std::make_shared<ListingBatch>(std::exchange(batch_, ListingBatch()));
+    context_.queue.async([this, done = std::move(done), batch = std::move(batch)] {
+        Failure failure;
+        if (batch->effectsOnDisk)
+            failure = context_.disk.syncAll(context_.layout.root());
+        if (!failure)
+            failure = context_.database.transaction([&]() -> Failure {
+                batch->writeTo(context_.database);
+                return std::nullopt;
+            });
+        if (!failure && written_)
+            written_(*batch);
+        done->set_value(std::move(failure));
+    });
+    return std::nullopt;
+}
+
+} // namespace platform

@@ -1,0 +1,44 @@
+#pragma once
+
+#include "platform/cloud/CloudDocumentService.h"
+#include "platform/cloud/StoreView.h"
+
+namespace platform {
+
+/// Answers from the disk, from memory and, for promises alone, from the state database.
+class StoreDocuments final : public CloudDocumentService {
+public:
+    explicit StoreDocuments(const StoreViewSlot& slot) : slot_(slot) {}
+
+    std::optional<Url> shelfroot() const override;
+    bool isInShelfroot(const Url& url) const override;
+    bool isDocumentsContainer(const Url& url) const override;
+    std::optional<std::string> pathRelativeToShelfroot(const Url& url) const override;
+
+    Result<std::shared_ptr<const CloudContainer>>
+    containerForItemAtURL(const Url& url) const override;
+    std::vector<std::shared_ptr<const CloudContainer>> containers() const override;
+    std::string localizedNameForDefaultContainer() const override;
+    std::optional<Url> defaultContainerURL() const override;
+
+    Result<ResourceValues> promisedItemAttributes(const Url& url, ResourceKeys keys) const override;
+    Result<ResourceValues> plainAttributes(const Url& url, ResourceKeys keys) const override;
+
+    std::optional<Url> physicalURL(const Url& url) const override;
+    bool isPromiseAtURL(const Url& url) const override;
+    std::optional<Url> logicalURLOfPromise(const Url& promise) const override;
+    bool isPromised(const Url& url) const override;
+
+    bool isExternalDocumentReference(const Url& url) const override;
+    Result<Url> resolveExternalDocumentReference(const Url& url) const override;
+
+    std::vector<std::string> tags(const Url& url) const override;
+
+private:
+    /// The mark of the promise for the document at `path`, when nothing stands there.
+    std::optional<FoundSidecar> promiseFor(const StoreView& view, std::string_view path) const;
+
+    const StoreViewSlot& slot_;
+};
+
+} // namespace platform
