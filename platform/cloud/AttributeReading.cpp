@@ -1,5 +1,6 @@
 #include "platform/cloud/AttributeReading.h"
 
+#include "platform/cloud/Sidecar.h"
 #include "platform/files/PathText.h"
 #include "platform/launch/TypeRegistry.h"
 
@@ -155,21 +156,6 @@ ResourceValues readPromisedAttributes(const Url& url, const RemoteRow& remote, R
 
 bool isPackageFolder(const Url& url) {
     return TypeRegistry::isPackageName(url.lastPathComponent());
-}
-
-bool containsPromise(const std::string& folder, std::string_view mark) {
-    bool found = false;
-    std::vector<std::string> inner;
-    const Failure ignored = FileManager::enumerate(folder, [&](const DirectoryEntry& entry) {
-        if (entry.kind == FileKind::directory)
-            inner.push_back(folder + '/' + entry.name);
-        else if (hasSidecarForm(entry.name))
-            found = readMark(folder + '/' + entry.name, mark).has_value();
-        return !found;
-    });
-    for (const std::string& each : inner)
-        found = found || containsPromise(each, mark);
-    return found;
 }
 
 } // namespace platform

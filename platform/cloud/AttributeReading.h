@@ -20,7 +20,4 @@ ResourceValues readPromisedAttributes(const Url& url, const RemoteRow& remote, R
 /// Whether a folder of that name is shown as one document.
 bool isPackageFolder(const Url& url);
 
-/// Whether any document below the folder is only promised.
-bool containsPromise(const std::string& folder, std::string_view mark);
-
 } // namespace platform

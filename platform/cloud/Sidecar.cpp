@@ -2,6 +2,7 @@
 
 #include "platform/cloud/ContentHash.h"
 #include "platform/cloud/Tokens.h"
+#include "platform/files/FileManager.h"
 
 #include <array>
 #include <cerrno>
@@ -135,6 +136,21 @@ std::optional<FoundSidecar> findSidecar(const std::string& folder, std::string_v
     const SidecarName usual = sidecarNameFor(name);
     std::optional<FoundSidecar> found = look(usual);
     return found || usual.needsName ? found : look(shortenedSidecarNameFor(name));
+}
+
+bool containsPromise(const std::string& folder, std::string_view store) {
+    bool found = false;
+    std::vector<std::string> inner;
+    const Failure ignored = FileManager::enumerate(folder, [&](const DirectoryEntry& entry) {
+        if (entry.kind == FileKind::directory)
+            inner.push_back(folder + '/' + entry.name);
+        else if (hasSidecarForm(entry.name))
+            found = readMark(folder + '/' + entry.name, store).has_value();
+        return !found;
+    });
+    for (const std::string& each : inner)
+        found = found || containsPromise(each, store);
+    return found;
 }
 
 } // namespace platform

@@ -53,4 +53,7 @@ struct FoundSidecar {
 std::optional<FoundSidecar> findSidecar(const std::string& folder, std::string_view name,
                                         std::string_view store);
 
+/// Whether any document below the folder is only promised.
+bool containsPromise(const std::string& folder, std::string_view store);
+
 } // namespace platform

@@ -121,7 +121,7 @@ Result<StoreLock> StoreLock::acquire(const StoreLayout& layout) {
 }
 
 StoreLock::~StoreLock() {
-    if (file_ && ftruncate(file_.get(), 0) != 0)
+    if (file_ && !keepMark_ && ftruncate(file_.get(), 0) != 0)
         platformLog(LogLevel::warning, "cloud: the lock file looks like that of a crash");
 }
 

@@ -39,11 +39,14 @@ public:
     StoreLock& operator=(StoreLock&&) noexcept = default;
     /// The last one that had it ended without giving it back.
     bool afterCrash() const { return afterCrash_; }
+    /// The next one that gets it is to look for damage.
+    void keepCrashMark() { keepMark_ = true; }
 
 private:
     explicit StoreLock(FileDescriptor file) : file_(std::move(file)) {}
     FileDescriptor file_;
     bool afterCrash_ = false;
+    bool keepMark_ = false;
 };
 
 /// A store that may be changed.

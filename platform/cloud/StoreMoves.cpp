@@ -1,7 +1,6 @@
 #include "platform/cloud/StoreMoves.h"
 
 #include "platform/base/Text.h"
-#include "platform/cloud/AttributeReading.h"
 #include "platform/cloud/StoreFileSystem.h"
 #include "platform/files/PathText.h"
 

@@ -41,6 +41,10 @@ Transfers::Transfers(StoreContext& context, FileProgressSubscription& progress,
 }
 
 Transfers::~Transfers() {
+    stop();
+}
+
+void Transfers::stop() {
     std::vector<std::shared_ptr<Transfer>> running;
     {
         const std::lock_guard lock(mutex_);

@@ -25,7 +25,6 @@ public:
     using Placed = std::function<void(ItemId item)>;
     Transfers(StoreContext& context, FileProgressSubscription& progress,
               std::uint64_t bytesPerSecond, Placed placed);
-    /// Cancels what runs and waits for it.
     ~Transfers();
     Transfers(const Transfers&) = delete;
     Transfers& operator=(const Transfers&) = delete;
@@ -33,6 +32,10 @@ public:
     /// Blocks until the document at `url` is local. Callers for one item share its transfer; it
     /// ends when the last of them is cancelled. Not on the store's queue.
     [[nodiscard]] Failure fetch(const Url& url, CancelFlag& cancel);
+
+    /// Cancels what runs and waits for it; what comes later is cancelled at once. Not on the
+    /// store's queue.
+    void stop();
 
     /// Finishes or undoes what a stopped program left. On the store's queue.
     static void recover(StoreContext& context);

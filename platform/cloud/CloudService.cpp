@@ -1,0 +1,169 @@
+#include "platform/cloud/CloudService.h"
+
+#include "platform/base/Log.h"
+#include "platform/base/NotificationCenter.h"
+#include "platform/base/Text.h"
+#include "platform/cloud/AccountMonitor.h"
+#include "platform/cloud/StoreDocuments.h"
+#include "platform/cloud/StoreEngine.h"
+#include "platform/cloud/StoreFileSystem.h"
+
+#include <mutex>
+
+namespace platform {
+
+std::optional<IdentityToken> IdentityToken::deserialized(const Bytes& bytes) {
+    return bytes.empty() ? std::nullopt : std::optional(IdentityToken(bytes));
+}
+
+/// The engine changes with the account; whoever works with it holds it as long as that takes.
+struct CloudService::State final : CloudAccountService, ContentProvider, CloudDatabase {
+    explicit State(Parts given) : parts(std::move(given)), documents(slot) {
+        if (!parts.disk)
+            parts.disk = makeRealStoreFileSystem();
+        if (!parts.remotes)
+            parts.remotes = standardRemotes();
+    }
+
+    // CloudAccountService
+    std::optional<IdentityToken> identityToken() const override {
+        const std::lock_guard lock(mutex);
+        if (!reading.account || !engine || !engine->usable())
+            return std::nullopt;
+        return IdentityToken(reading.account->identity);
+    }
+    std::optional<AccountSummary> account() const override {
+        const std::lock_guard lock(mutex);
+        if (!reading.account)
+            return std::nullopt;
+        return AccountSummary{reading.account->name, reading.account->kind,
+                              reading.account->address};
+    }
+    std::optional<std::string> problem() const override {
+        const std::lock_guard lock(mutex);
+        if (reading.problem || unsupported)
+            return reading.problem ? reading.problem : unsupported;
+        return engine ? engine->problem() : std::nullopt;
+    }
+
+    // ContentProvider
+    bool isPromised(const Url& item) const override { return documents.isPromised(item); }
+    Failure makeLocal(const Url& item, CancelFlag& cancel) override {
+        const std::shared_ptr<StoreEngine> held = current();
+        return held ? held->makeLocal(item, cancel) : Failure(makeError(ErrorCode::noAccount));
+    }
+    Failure moveItem(const Url& from, const Url& to) override {
+        const std::shared_ptr<StoreEngine> held = current();
+        return held ? held->moveItem(from, to) : FileManager::moveItem(from, to);
+    }
+
+    // CloudDatabase
+    void addOperation(std::shared_ptr<QuotaOperation> operation) override {
+        const auto answer = [operation](const Result<std::uint64_t>& bytes) {
+            if (operation->completion)
+                operation->completion(bytes);
+        };
+        if (const std::shared_ptr<StoreEngine> held = current())
+            held->freeBytes(answer);
+        else
+            answer(makeError(ErrorCode::noAccount));
+    }
+
+    std::shared_ptr<StoreEngine> current() const {
+        const std::lock_guard lock(mutex);
+        return engine;
+    }
+
+    /// Puts the store of the account that the file names in place of the one before.
+    void follow(const AccountReading& now) {
+        std::shared_ptr<StoreEngine> former;
+        {
+            const std::lock_guard lock(mutex);
+            former = std::move(engine);
+            engine.reset();
+            reading = now;
+            unsupported.reset();
+        }
+        if (former)
+            former->stop(); // gives its lock back before the next one asks for its own
+        slot.store(nullptr);
+        if (!now.account)
+            return;
+        std::unique_ptr<Remote> remote = parts.remotes(*now.account);
+        if (!remote) {
+            const std::lock_guard lock(mutex);
+            unsupported = localizedFormat("This version cannot use accounts of the kind “%1$@” "
+                                          "yet. Update the program or sign in to a folder.",
+                                          now.account->kind);
+            platformLog(LogLevel::warning, "cloud: no account: %@", *unsupported);
+            return;
+        }
+        const StoreEngine::Services services{parts.clock,   parts.watcher, parts.progress,
+                                             parts.folders, *parts.disk,   slot};
+        auto next = std::make_shared<StoreEngine>(services, *now.account, std::move(remote));
+        next->open(parts.readOnly);
+        const std::lock_guard lock(mutex);
+        engine = std::move(next);
+    }
+
+    Parts parts;
+    StoreViewSlot slot;
+    StoreDocuments documents;
+    mutable std::mutex mutex;
+    AccountReading reading;                 // guarded by mutex, as are the two below
+    std::optional<std::string> unsupported; // the kind of the account, and what to do
+    std::shared_ptr<StoreEngine> engine;
+    std::unique_ptr<AccountMonitor> monitor;
+};
+
+CloudService::CloudService(Parts parts) : state_(std::make_unique<State>(std::move(parts))) {
+    State& state = *state_;
+    state.monitor = std::make_unique<AccountMonitor>(
+        state.parts.folders, state.parts.main, state.parts.watcher, [&state] {
+            state.follow(state.monitor->reading());
+            state.parts.notifications.post(cloudIdentityDidChangeNotification);
+        });
+    state.follow(state.monitor->reading());
+}
+
+CloudService::~CloudService() {
+    state_->monitor.reset();
+    state_->follow({});
+}
+
+CloudAccountService& CloudService::accounts() {
+    return *state_;
+}
+
+CloudDocumentService& CloudService::documents() {
+    return state_->documents;
+}
+
+ContentProvider& CloudService::contents() {
+    return *state_;
+}
+
+CloudDatabase& CloudService::database() {
+    return *state_;
+}
+
+void CloudService::refresh(const std::optional<Url>& folder,
+                           std::function<void(const Failure& failure)> done) {
+    if (const std::shared_ptr<StoreEngine> engine = state_->current())
+        engine->refresh(folder, std::move(done));
+    else if (done)
+        done(makeError(ErrorCode::noAccount));
+}
+
+std::optional<CloudStatus> CloudService::status() const {
+    const std::shared_ptr<StoreEngine> engine = state_->current();
+    const std::shared_ptr<const StoreView> view = state_->slot.load();
+    if (!engine || !view || !view->reader)
+        return std::nullopt;
+    const StoreCounts counts =
+        view->reader->ask([](StateQueries& queries) { return queries.counts(); });
+    return CloudStatus{engine->layout().folder, engine->isListed(), counts.folders, counts.files,
+                       counts.promises,         counts.bytes,       counts.refused};
+}
+
+} // namespace platform

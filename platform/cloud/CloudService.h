@@ -1,0 +1,86 @@
+#pragma once
+
+#include "platform/base/Folders.h"
+#include "platform/base/Result.h"
+#include "platform/cloud/CloudAccountService.h"
+#include "platform/cloud/CloudDocumentService.h"
+#include "platform/cloud/QuotaOperation.h"
+
+#include <cstdint>
+#include <functional>
+#include <memory>
+#include <optional>
+#include <string>
+
+namespace platform {
+
+class Clock;
+class ContentProvider;
+class DirectoryWatcher;
+class FileProgressSubscription;
+class MainQueue;
+class NotificationCenter;
+class Remote;
+class StoreFileSystem;
+struct AccountRecord;
+
+/// What people may want to know of the store of the account.
+struct CloudStatus {
+    /// The account's folder, with Shelfroot in it.
+    std::string folder;
+    /// The first listing has come to its end.
+    bool listed = false;
+    std::int64_t folders = 0;
+    std::int64_t files = 0;
+    /// Of the files, those that are only promised.
+    std::int64_t promises = 0;
+    /// Bytes of all files.
+    std::int64_t bytes = 0;
+    /// Items of the remote that cannot be on this device.
+    std::int64_t refused = 0;
+};
+
+/// The owner of accounts, store and transfers: everybody else speaks to it by values in and events
+/// out. Made, destroyed and called on the main thread, except where told.
+class CloudService {
+public:
+    struct Parts {
+        Clock& clock;
+        MainQueue& main;
+        NotificationCenter& notifications;
+        DirectoryWatcher& watcher;
+        FileProgressSubscription& progress;
+        Folders folders;
+        /// Look at the store, and change nothing.
+        bool readOnly = false;
+        /// Empty: the real disk.
+        std::unique_ptr<StoreFileSystem> disk;
+        /// Empty: the kinds that this version knows.
+        std::function<std::unique_ptr<Remote>(const AccountRecord& account)> remotes;
+    };
+    explicit CloudService(Parts parts);
+    ~CloudService();
+    CloudService(const CloudService&) = delete;
+    CloudService& operator=(const CloudService&) = delete;
+
+    CloudAccountService& accounts();
+    /// Safe from any thread.
+    CloudDocumentService& documents();
+    /// For the file coordinator. Safe from any thread.
+    ContentProvider& contents();
+    /// For questions of quota.
+    CloudDatabase& database();
+
+    /// Brings in what is new on the remote: in that folder, or everywhere. `done` runs on a thread
+    /// of the service's when it has come to its end.
+    void refresh(const std::optional<Url>& folder,
+                 std::function<void(const Failure& failure)> done);
+    /// None without an account whose store can be read.
+    std::optional<CloudStatus> status() const;
+
+private:
+    struct State;
+    std::unique_ptr<State> state_;
+};
+
+} // namespace platform

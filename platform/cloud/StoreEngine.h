@@ -1,0 +1,116 @@
+#pragma once
+
+#include "platform/cloud/AccountFile.h"
+#include "platform/cloud/Backoff.h"
+#include "platform/cloud/Remote.h"
+#include "platform/cloud/StoreContext.h"
+#include "platform/cloud/StoreView.h"
+#include "platform/cloud/Transfers.h"
+#include "platform/files/DirectoryWatcher.h"
+
+#include <functional>
+#include <map>
+#include <memory>
+#include <mutex>
+#include <optional>
+#include <string>
+
+namespace platform {
+
+class RemoteLister;
+
+/// The store of one account: opens it, keeps the view that reads answer from, brings in what the
+/// remote has and fetches contents. Where another process has the store, reads go on and changes
+/// are refused, until that process is done.
+class StoreEngine : public std::enable_shared_from_this<StoreEngine> {
+public:
+    struct Services {
+        Clock& clock;
+        DirectoryWatcher& watcher;
+        FileProgressSubscription& progress;
+        const Folders& folders;
+        StoreFileSystem& disk;
+        StoreViewSlot& slot;
+    };
+    using Done = std::function<void(const Failure& failure)>;
+
+    StoreEngine(const Services& services, const AccountRecord& account,
+                std::unique_ptr<Remote> remote);
+    ~StoreEngine();
+    StoreEngine(const StoreEngine&) = delete;
+    StoreEngine& operator=(const StoreEngine&) = delete;
+
+    /// Opens for changing and starts to follow the remote; or, `readOnly`, for reading alone.
+    void open(bool readOnly);
+
+    /// Cancels what runs, waits for it and gives the store back to others. Not on a queue of the
+    /// engine's own.
+    void stop();
+
+    /// There is a tree to show.
+    bool usable() const;
+    /// In the user's language; none when all is well. Safe from any thread.
+    std::optional<std::string> problem() const;
+    const StoreLayout& layout() const { return layout_; }
+    /// The first listing has come to its end. Safe from any thread.
+    bool isListed() const;
+
+    [[nodiscard]] Failure makeLocal(const Url& item, CancelFlag& cancel);
+    [[nodiscard]] Failure moveItem(const Url& from, const Url& to);
+    /// Brings in what is new in the folder, or everywhere. `done` is called on a thread of the
+    /// engine's.
+    void refresh(const std::optional<Url>& folder, Done done);
+    void freeBytes(std::function<void(const Result<std::uint64_t>&)> done);
+
+private:
+    // On the store's queue.
+    void openForChanges();
+    void openForReading();
+    void begin(OpenedStore store);
+    void readContainers();
+    void watchContainers();
+    void readRoles();
+    void publish();
+
+    // On the listing queue.
+    Failure connect();
+    Failure followRemote();
+    Failure list(const std::vector<ItemId>& folders, bool everything);
+    Failure refreshNow(const std::optional<Url>& folder);
+
+    Failure checkRemoteMark(const std::string& mark);
+    void retryLater(std::function<void(StoreEngine&)> job);
+    void setProblem(const Failure& failure);
+    std::shared_ptr<Transfers> transfers() const;
+    Error notOpen() const;
+
+    Services services_;
+    AccountRecord account_;
+    StoreLayout layout_;
+    std::unique_ptr<Remote> remote_;
+    CancelFlag cancel_;
+
+    mutable std::mutex mutex_;
+    std::optional<std::string> problem_; // guarded by mutex_, as are the next five
+    std::optional<std::string> notice_;  // what had to be done at the start
+    std::shared_ptr<Transfers> transfers_;
+    Clock::AlarmId retry_ = 0;
+    bool usable_ = false;
+    bool listed_ = false;
+
+    // Of the store's queue alone.
+    std::optional<OpenedStore> store_;
+    std::optional<StoreContext> context_;
+    StoreView view_;
+    DirectoryWatcher::Token rootWatch_;
+    std::map<std::string, DirectoryWatcher::Token> containerWatches_;
+
+    // Of the listing queue alone.
+    bool connected_ = false;
+    Backoff backoff_;
+
+    std::unique_ptr<WorkQueue> queue_;
+    std::unique_ptr<WorkQueue> listing_;
+};
+
+} // namespace platform

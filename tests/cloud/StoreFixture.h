@@ -1,0 +1,81 @@
+#pragma once
+
+#include "platform/base/ManualClock.h"
+#include "platform/base/WorkQueue.h"
+#include "platform/cloud/FolderRemote.h"
+#include "platform/cloud/RemoteLister.h"
+#include "platform/cloud/StoreFileSystem.h"
+#include "platform/cloud/StoreMoves.h"
+#include "platform/cloud/Transfers.h"
+#include "platform/files/Progress.h"
+#include "tests/support/TemporaryFolder.h"
+
+#include <gtest/gtest.h>
+
+#include <memory>
+#include <optional>
+#include <string>
+#include <vector>
+
+namespace test {
+
+/// A real remote folder and a real store, and words for what is done to both.
+struct StoreFixture : ::testing::Test {
+    TemporaryFolder home;
+    platform::ManualClock clock;
+    platform::FileProgressSubscription progress;
+    platform::CancelFlag cancel;
+    platform::StoreLayout layout{home / "store"};
+    /// Bytes a second; 0 for no limit.
+    std::uint64_t rateLimit = 0;
+
+    std::unique_ptr<platform::StoreFileSystem> disk = platform::makeRealStoreFileSystem();
+    std::unique_ptr<platform::Remote> remote =
+        std::make_unique<platform::FolderRemote>(home / "remote");
+    std::unique_ptr<platform::WorkQueue> queue;
+    std::optional<platform::OpenedStore> store;
+    std::optional<platform::StoreContext> context;
+    std::unique_ptr<platform::Transfers> transfers;
+
+    StoreFixture() { home.makeFolder("remote"); }
+    ~StoreFixture() override { close(); }
+
+    std::string givenRemote(const std::string& path, const std::string& content = "") const {
+        return home.write("remote/" + path, content);
+    }
+    void givenRemoteFolder(const std::string& path) const { home.makeFolder("remote/" + path); }
+    std::string givenLocal(const std::string& path, const std::string& content) const {
+        return home.write("store/Shelfroot/" + path, content);
+    }
+
+    /// Opens the store and finishes what an earlier program left.
+    platform::Failure open();
+    void close();
+    platform::Failure list();
+    /// A later look at everything.
+    platform::Failure refresh();
+    platform::Failure fetch(const std::string& path);
+    platform::Failure move(const std::string& from, const std::string& to);
+
+    platform::Url url(const std::string& path) const;
+    /// The promise of the document, also where its content is there as well.
+    std::optional<platform::FoundSidecar> sidecar(const std::string& path) const;
+    bool isPromised(const std::string& path) const;
+    /// The content on the device; none when there is none.
+    std::optional<std::string> local(const std::string& path) const;
+    std::optional<platform::ItemState> state(const std::string& path);
+    std::vector<std::string> refused(const std::string& folder);
+    std::size_t stagedFiles() const;
+};
+
+/// Runs `work` in a process of its own and answers its exit code.
+int inAnotherProcess(const std::function<int()>& work);
+
+/// A disk that ends its process before or after its n-th change, as a crash would.
+std::unique_ptr<platform::StoreFileSystem> dyingFileSystem(int step, bool after);
+inline constexpr int diedOnTheWay = 77;
+
+/// A disk on which making promises and staging fail as on a full one.
+std::unique_ptr<platform::StoreFileSystem> fullFileSystem();
+
+} // namespace test
