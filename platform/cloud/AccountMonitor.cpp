@@ -60,8 +60,16 @@ void AccountMonitor::watchNearest() {
     for (std::string nearest = nearestFolder(accountFolder(folders_));
          nearest != watched_ || !watch_; nearest = nearestFolder(accountFolder(folders_))) {
         watched_ = nearest;
-        watch_ = watcher_.watch(Url::file(nearest, true), main_,
-                                [lookAgain](const auto&) { lookAgain(); });
+        watch_ =
+            watcher_.watch(Url::file(nearest, true), main_,
+                           [this, lookAgain, alive = std::weak_ptr(alive_)](const auto& changes) {
+                               if (alive.expired())
+                                   return;
+                               for (const DirectoryChange& change : changes)
+                                   if (change.kind == DirectoryChange::Kind::folderGone)
+                                       watched_.clear(); // one of the same name is another folder
+                               lookAgain();
+                           });
         if (!watch_) {
             poll_ = main_.timer(pollInterval, lookAgain);
             return;

@@ -84,9 +84,10 @@ struct CloudService::State final : CloudAccountService, ContentProvider, CloudDa
             reading = now;
             unsupported.reset();
         }
+        slot.store(nullptr);
         if (former)
             former->stop(); // gives its lock back before the next one asks for its own
-        slot.store(nullptr);
+        slot.store(nullptr); // the last steps of what ran may have shown themselves
         if (!now.account)
             return;
         std::unique_ptr<Remote> remote = parts.remotes(*now.account);

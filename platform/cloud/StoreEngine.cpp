@@ -62,6 +62,7 @@ void StoreEngine::stop() {
         rootWatch_.reset();
         containerWatches_.clear();
         context_.reset();
+        view_.reader.reset(); // the last connection to close puts the database in order
         store_.reset();
     });
 }
@@ -157,33 +158,41 @@ void StoreEngine::readContainers() {
 }
 
 void StoreEngine::watchContainers() {
-    const auto again = [this](const std::vector<DirectoryChange>&) {
+    const auto again = [this] {
         readContainers();
         watchContainers();
     };
     if (!rootWatch_) {
-        rootWatch_ = services_.watcher.watch(Url::file(view_.root, true), *queue_, again);
+        rootWatch_ = services_.watcher.watch(Url::file(view_.root, true), *queue_,
+                                             [again](const auto&) { again(); });
         readContainers(); // what came before the watch
     }
     std::map<std::string, DirectoryWatcher::Token> watches;
+    bool fresh = false;
     for (const ContainerSet::Entry& entry : view_.containers->entries()) {
         DirectoryWatcher::Token& token = watches[entry.folder];
         if (const auto found = containerWatches_.find(entry.folder);
             found != containerWatches_.end())
             token = std::move(found->second);
-        if (!token)
-            token = services_.watcher.watch(
-                Url::file(view_.root + '/' + entry.folder, true), *queue_,
-                [this, again](const std::vector<DirectoryChange>& changes) {
-                    for (const DirectoryChange& change : changes)
-                        if (change.name == containerFileName ||
-                            change.kind == DirectoryChange::Kind::overflow) {
-                            again(changes);
-                            return;
-                        }
-                });
+        if (token)
+            continue;
+        token = services_.watcher.watch(
+            Url::file(view_.root + '/' + entry.folder, true), *queue_,
+            [this, again, folder = entry.folder](const std::vector<DirectoryChange>& changes) {
+                for (const DirectoryChange& change : changes) {
+                    if (change.kind == DirectoryChange::Kind::folderGone)
+                        containerWatches_.erase(folder); // another one may have its name
+                    if (change.name == containerFileName || change.name.empty()) {
+                        again();
+                        return;
+                    }
+                }
+            });
+        fresh = true;
     }
     containerWatches_ = std::move(watches);
+    if (fresh) // a description may have come between the reading and the watch
+        readContainers();
 }
 
 void StoreEngine::readRoles() {

@@ -106,6 +106,7 @@ Failure StoreEngine::followRemote() {
 
 void StoreEngine::refresh(const std::optional<Url>& folder, Done done) {
     listing_->async([this, folder, done = std::move(done)] {
+        queue_->sync([] {}); // an opening that is under way comes first
         Failure failure = transfers() ? refreshNow(folder) : Failure(notOpen());
         if (transfers() && (!failure || concernsWholeStore(*failure)))
             setProblem(failure);

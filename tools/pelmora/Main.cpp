@@ -1,0 +1,103 @@
+#include "platform/base/Log.h"
+#include "platform/base/Text.h"
+#include "tools/pelmora/Command.h"
+
+#include <array>
+#include <cstdio>
+#include <cstdlib>
+
+namespace pelmora {
+namespace {
+
+constexpr std::array<Command, 7> table{{
+    {"sign-in", "sign-in folder PATH [--name NAME] [--rate-limit BYTES] [--quota BYTES]",
+     "Signs in to the account whose remote is the folder PATH. An account that was signed in\n"
+     "before finds its store again.\n"
+     "  --name NAME         what the account is called; the folder's name if not given\n"
+     "  --rate-limit BYTES  bytes a second that transfers may take (suffixes K, M, G)\n"
+     "  --quota BYTES       size of the account (suffixes K, M, G)\n",
+     &signIn},
+    {"sign-out", "sign-out",
+     "Signs out. The store and everything in it stay on the disk, and are found again when the\n"
+     "same account signs in.\n",
+     &signOut},
+    {"status", "status", "Tells who is signed in, where the store is, and what is in it.\n",
+     &showStatus},
+    {"ls", "ls [PATH]",
+     "Lists a folder of the store (the whole store's top without PATH). PATH is absolute or\n"
+     "relative to the store. A \"-\" before the size marks what is only promised.\n",
+     &listItems},
+    {"refresh", "refresh [PATH]",
+     "Brings in what is new on the account: in the folder PATH, or everywhere.\n", &refresh},
+    {"download", "download PATH...",
+     "Fetches the contents of documents; of a folder, of everything below it. PATH is absolute or\n"
+     "relative to the store. Ctrl-C stops; what is not whole leaves nothing behind.\n",
+     &download},
+    {"sample", "sample PATH",
+     "Makes a folder PATH with documents of many kinds, to sign in to and try things with. PATH\n"
+     "must not exist yet, or be empty.\n",
+     &makeSample},
+}};
+
+void printOverview(std::FILE* out) {
+    std::fputs("usage: pelmora COMMAND ...\n\n", out);
+    for (const Command& command : table)
+        std::fprintf(out, "  pelmora %s\n", std::string(command.usage).c_str());
+    std::fputs("\n\"pelmora COMMAND --help\" tells more about a command.\n"
+               "Exit codes: 0 done, 1 failed, 2 wrong usage, 3 no usable account, 4 the store is\n"
+               "in use by another program, 130 interrupted.\n",
+               out);
+}
+
+int runCommand(const Command& command, const std::vector<std::string>& arguments) {
+    for (const std::string& argument : arguments)
+        if (argument == "--help") {
+            std::printf("usage: pelmora %s\n\n%s", std::string(command.usage).c_str(),
+                        std::string(command.help).c_str());
+            return done;
+        }
+    return command.run(arguments);
+}
+
+} // namespace
+
+std::span<const Command> commands() {
+    return table;
+}
+
+void complain(std::string_view message) {
+    std::fprintf(stderr, "pelmora: %s\n", std::string(message).c_str());
+}
+
+int usageFault(std::string_view command, std::string_view message) {
+    complain(message);
+    for (const Command& each : table)
+        if (each.name == command)
+            std::fprintf(stderr, "usage: pelmora %s\n", std::string(each.usage).c_str());
+    return badUsage;
+}
+
+} // namespace pelmora
+
+int main(int argc, char** argv) {
+    using namespace pelmora;
+    platform::loadLocalizedTexts(platform::systemLanguage());
+    // What a command has to say it says itself; the log is for those who look for a fault.
+    const bool verbose = std::getenv("PELMORA_VERBOSE") != nullptr;
+    platform::setLogSink({[verbose](int) { return verbose; },
+                          [](int, const std::string& message, const std::source_location&) {
+                              std::fprintf(stderr, "%s\n", message.c_str());
+                          }});
+    std::vector<std::string> arguments(argv + 1, argv + argc);
+    if (arguments.empty() || arguments.front() == "--help") {
+        printOverview(arguments.empty() ? stderr : stdout);
+        return arguments.empty() ? badUsage : done;
+    }
+    const std::string name = arguments.front();
+    arguments.erase(arguments.begin());
+    for (const Command& command : commands())
+        if (command.name == name)
+            return runCommand(command, arguments);
+    complain("there is no command “" + name + "”; see \"pelmora --help\"");
+    return badUsage;
+}
