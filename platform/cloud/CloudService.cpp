@@ -86,7 +86,7 @@ struct CloudService::State final : CloudAccountService, ContentProvider, CloudDa
         }
         slot.store(nullptr);
         if (former)
-            former->stop(); // gives its lock back before the next one asks for its own
+            former->stop();  // gives its lock back before the next one asks for its own
         slot.store(nullptr); // the last steps of what ran may have shown themselves
         if (!now.account)
             return;

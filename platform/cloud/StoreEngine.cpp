@@ -256,8 +256,10 @@ Failure StoreEngine::makeLocal(const Url& item, CancelFlag& cancel) {
     if (!transfers)
         return notOpen();
     bool directory = false;
-    if (!FileManager::exists(item.path(), &directory) || !directory)
-        return transfers->fetch(item, cancel);
+    if (!FileManager::exists(item.path(), &directory))
+        return fetch(*transfers, item, cancel);
+    if (!directory)
+        return std::nullopt;
     // A package: a folder that people see as one document.
     const auto view = services_.slot.load();
     const Result<std::vector<DirectoryEntry>> entries = FileManager::entries(item.path());
@@ -270,11 +272,24 @@ Failure StoreEngine::makeLocal(const Url& item, CancelFlag& cancel) {
             failure = makeLocal(Url::file(path, true), cancel);
         else if (const auto mark =
                      hasSidecarForm(entry.name) && view ? readMark(path, view->mark) : std::nullopt)
-            failure = transfers->fetch(item.appending(promisedName(entry.name, *mark)), cancel);
+            failure = fetch(*transfers, item.appending(promisedName(entry.name, *mark)), cancel);
         if (failure)
             return failure;
     }
     return std::nullopt;
+}
+
+Failure StoreEngine::fetch(Transfers& transfers, const Url& item, CancelFlag& cancel) {
+    if (Failure failure = connect())
+        return failure;
+    Failure failure = transfers.fetch(item, cancel);
+    if (!failure || !failure->is(ErrorCode::serverNotAvailable))
+        return failure;
+    // A disk that was away and came back is the same by its mark alone.
+    connected_ = false;
+    if (Failure away = connect())
+        return away;
+    return transfers.fetch(item, cancel);
 }
 
 Failure StoreEngine::moveItem(const Url& from, const Url& to) {

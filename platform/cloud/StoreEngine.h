@@ -8,6 +8,7 @@
 #include "platform/cloud/Transfers.h"
 #include "platform/files/DirectoryWatcher.h"
 
+#include <atomic>
 #include <functional>
 #include <map>
 #include <memory>
@@ -72,8 +73,11 @@ private:
     void readRoles();
     void publish();
 
-    // On the listing queue.
+    /// Proves, once, that the remote is there and the right one. From any thread but the store's
+    /// queue.
     Failure connect();
+
+    // On the listing queue.
     Failure followRemote();
     Failure list(const std::vector<ItemId>& folders, bool everything);
     Failure refreshNow(const std::optional<Url>& folder);
@@ -81,6 +85,7 @@ private:
     Failure checkRemoteMark(const std::string& mark);
     void retryLater(std::function<void(StoreEngine&)> job);
     void setProblem(const Failure& failure);
+    Failure fetch(Transfers& transfers, const Url& item, CancelFlag& cancel);
     std::shared_ptr<Transfers> transfers() const;
     Error notOpen() const;
 
@@ -91,12 +96,13 @@ private:
     CancelFlag cancel_;
 
     mutable std::mutex mutex_;
-    std::optional<std::string> problem_; // guarded by mutex_, as are the next five
+    std::optional<std::string> problem_; // guarded by mutex_, as are the next six
     std::optional<std::string> notice_;  // what had to be done at the start
     std::shared_ptr<Transfers> transfers_;
     Clock::AlarmId retry_ = 0;
     bool usable_ = false;
     bool listed_ = false;
+    Backoff backoff_;
 
     // Of the store's queue alone.
     std::optional<OpenedStore> store_;
@@ -105,9 +111,8 @@ private:
     DirectoryWatcher::Token rootWatch_;
     std::map<std::string, DirectoryWatcher::Token> containerWatches_;
 
-    // Of the listing queue alone.
-    bool connected_ = false;
-    Backoff backoff_;
+    std::mutex connecting_;
+    std::atomic<bool> connected_{false};
 
     std::unique_ptr<WorkQueue> queue_;
     std::unique_ptr<WorkQueue> listing_;

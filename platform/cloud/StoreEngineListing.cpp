@@ -31,6 +31,10 @@ bool concernsWholeStore(const Error& error) {
 Failure StoreEngine::checkRemoteMark(const std::string& mark) {
     Failure failure;
     queue_->sync([&] {
+        if (!context_) { // stopped meanwhile
+            failure = makeError(ErrorCode::userCancelled);
+            return;
+        }
         StateDatabase& database = context_->database;
         const std::string linked = database.meta("remote");
         if (linked == mark)
@@ -53,6 +57,7 @@ Failure StoreEngine::checkRemoteMark(const std::string& mark) {
 }
 
 Failure StoreEngine::connect() {
+    const std::lock_guard lock(connecting_);
     if (connected_)
         return std::nullopt;
     const Result<std::string> mark = remote_->connect(cancel_);
@@ -92,6 +97,7 @@ Failure StoreEngine::followRemote() {
         listed_ = true;
     }
     if (!failure) {
+        const std::lock_guard lock(mutex_);
         backoff_.reset();
         return std::nullopt;
     }

@@ -49,10 +49,12 @@ std::optional<std::string> folderProblem(const std::string& folder, const Folder
     std::error_code ignored;
     const std::string stores =
         std::filesystem::weakly_canonical(folders.data + "/pelmora", ignored).string();
-    const Url inner = Url::file(folder);
-    const Url outer = Url::file(stores);
-    if (inner.isInside(outer) || outer.isInside(inner))
-        return "“" + folder + "” and the stores at “" + stores + "” must lie apart";
+    if (Url::file(stores).isInside(Url::file(folder)))
+        return "“" + folder + "” holds the stores themselves; choose another folder";
+    for (Url up = Url::file(folder); up.path().size() > stores.size();
+         up = *up.deletingLastPathComponent())
+        if (FileManager::exists(up.path() + "/state.db"))
+            return "“" + folder + "” lies in the store of an account; choose another folder";
     return std::nullopt;
 }
 
