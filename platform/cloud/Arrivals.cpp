@@ -97,45 +97,53 @@ Result<Arrivals::Outcome> Arrivals::takeExisting(const Spot& spot, const RemoteE
 Result<Arrivals::Outcome> Arrivals::promise(const Spot& spot, const RemoteEntry& entry,
                                             Outcome outcome) {
     const SidecarName usual = sidecarNameFor(entry.name);
-    const SidecarName cut = usual.needsName ? usual : shortenedSidecarNameFor(entry.name);
-    if (!usual.needsName && spot.names.contains(cut.text)) {
-        // An earlier run found the usual name taken.
-        const Result<std::optional<Outcome>> taken =
-            takeOver(spot, spot.path + '/' + cut.text, entry, outcome);
-        if (!taken)
-            return taken.error();
-        if (*taken)
-            return **taken;
-    }
-    for (const SidecarName* name : {&usual, &cut}) {
-        const std::string path = spot.path + '/' + name->text;
-        const SidecarMark mark{context_.mark, outcome.item,
-                               name->needsName ? entry.name : std::string()};
-        const Result<FileAttributes> made = context_.disk.makeSidecar(path, encodedMark(mark));
-        if (made) {
-            const Place place{spot.folder, entry.name};
-            outcome.local = localRowOf(place, *made, true);
-            outcome.base = baseOf(place, entry, made->identity);
-            return outcome;
+    if (!usual.needsName && !spot.names.empty()) {
+        const SidecarName cut = shortenedSidecarNameFor(entry.name);
+        if (spot.names.contains(cut.text)) { // an earlier run found the usual name taken
+            const Result<std::optional<Outcome>> taken = takeOver(spot, cut, entry, outcome);
+            if (!taken)
+                return taken.error();
+            if (*taken)
+                return **taken;
         }
-        if (!made.error().is(ErrorCode::fileExists))
-            return made.error();
-        const Result<std::optional<Outcome>> taken = takeOver(spot, path, entry, outcome);
-        if (!taken)
-            return taken.error();
-        if (*taken)
-            return **taken;
     }
+    Result<std::optional<Outcome>> made = promiseAs(usual, spot, entry, outcome);
+    if (made && !*made && !usual.needsName)
+        made = promiseAs(shortenedSidecarNameFor(entry.name), spot, entry, outcome);
+    if (!made)
+        return made.error();
+    if (*made)
+        return std::move(**made);
     outcome.refused = localized("Files on the device have the names that its promise would need.");
     return outcome;
 }
 
+Result<std::optional<Arrivals::Outcome>> Arrivals::promiseAs(const SidecarName& name,
+                                                             const Spot& spot,
+                                                             const RemoteEntry& entry,
+                                                             const Outcome& outcome) {
+    const SidecarMark mark{context_.mark, outcome.item,
+                           name.needsName ? entry.name : std::string()};
+    const Result<FileAttributes> made =
+        context_.disk.makeSidecar(spot.path + '/' + name.text, encodedMark(mark));
+    if (!made && made.error().is(ErrorCode::fileExists))
+        return takeOver(spot, name, entry, outcome);
+    if (!made)
+        return made.error();
+    const Place place{spot.folder, entry.name};
+    Outcome promised = outcome;
+    promised.local = localRowOf(place, *made, true);
+    promised.base = baseOf(place, entry, made->identity);
+    return std::optional(std::move(promised));
+}
+
 Result<std::optional<Arrivals::Outcome>> Arrivals::takeOver(const Spot& spot,
-                                                            const std::string& path,
+                                                            const SidecarName& name,
                                                             const RemoteEntry& entry,
                                                             const Outcome& outcome) {
+    const std::string path = spot.path + '/' + name.text;
     std::optional<SidecarMark> mark = readMark(path, context_.mark);
-    if (!mark || promisedName(Url::file(path).lastPathComponent(), *mark) != entry.name)
+    if (!mark || promisedName(name.text, *mark) != entry.name)
         return std::optional<Outcome>();
     Outcome taken = outcome;
     if (mark->item != outcome.item && !isKnown(mark->item)) {

@@ -49,8 +49,11 @@ private:
     Result<Outcome> takeExisting(const Spot& spot, const RemoteEntry& entry, Outcome outcome);
     Result<Outcome> promise(const Spot& spot, const RemoteEntry& entry, Outcome outcome);
     Result<Outcome> fetch(const Spot& spot, const RemoteEntry& entry, Outcome outcome);
-    /// The promise that lies at `path` already, as this entry's; none when it is no promise of it.
-    Result<std::optional<Outcome>> takeOver(const Spot& spot, const std::string& path,
+    /// A new promise under that name, or the one that lies there already; none when the name is
+    /// taken by something else.
+    Result<std::optional<Outcome>> promiseAs(const SidecarName& name, const Spot& spot,
+                                             const RemoteEntry& entry, const Outcome& outcome);
+    Result<std::optional<Outcome>> takeOver(const Spot& spot, const SidecarName& name,
                                             const RemoteEntry& entry, const Outcome& outcome);
     bool isKnown(ItemId item);
 

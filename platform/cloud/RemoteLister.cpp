@@ -12,6 +12,8 @@ namespace {
 /// Entries that one transaction and one sync carry: enough that both cost little an entry, few
 /// enough that an interrupted listing repeats little and that the queue is free again soon.
 constexpr std::size_t batchSize = 4096;
+/// Folders that are read from the remote ahead of the one that is worked on.
+constexpr unsigned foldersAhead = 2;
 
 /// Failures that are not of one folder: going on would only repeat them.
 bool stopsEverything(const Error& error) {
@@ -34,10 +36,15 @@ std::string joined(const std::string& folder, const std::string& name) {
 } // namespace
 
 RemoteLister::RemoteLister(StoreContext& context, CancelFlag& cancel, Written written)
-    : context_(context), cancel_(cancel), written_(std::move(written)), arrivals_(context, cancel) {
+    : context_(context),
+      cancel_(cancel),
+      written_(std::move(written)),
+      arrivals_(context, cancel),
+      readers_("listing", foldersAhead) {
 }
 
 RemoteLister::~RemoteLister() {
+    readers_.waitUntilIdle();
     if (writing_.valid())
         writing_.wait(); // its job refers to this object
 }
@@ -52,14 +59,15 @@ Failure RemoteLister::run(const std::vector<ItemId>& folders, Depth depth) {
                 waiting_.push_back({item, *remotePath, *localPath, false, false});
         }
     });
-    while (!waiting_.empty()) {
-        const Folder folder = std::move(waiting_.front());
-        waiting_.pop_front();
+    for (readAhead(); !reading_.empty(); readAhead()) {
+        Reading next = std::move(reading_.front());
+        reading_.pop_front();
+        const Result<RemoteListing> listing = next.listing.get();
         const Failure failure = cancel_.isCancelled() ? Failure(makeError(ErrorCode::userCancelled))
-                                                      : listFolder(folder);
+                                                      : bringIn(next.folder, listing);
         if (!failure)
             continue;
-        noteFailure(folder, *failure);
+        noteFailure(next.folder, *failure);
         if (stopsEverything(*failure))
             break;
     }
@@ -106,8 +114,18 @@ Result<Arrivals::Spot> RemoteLister::spotOf(const Folder& folder) {
     return spot;
 }
 
-Failure RemoteLister::listFolder(const Folder& folder) {
-    const Result<RemoteListing> listing = context_.remote.list(folder.remotePath, cancel_);
+void RemoteLister::readAhead() {
+    while (!waiting_.empty() && reading_.size() < foldersAhead) {
+        auto listing = std::make_shared<std::promise<Result<RemoteListing>>>();
+        reading_.push_back({std::move(waiting_.front()), listing->get_future()});
+        waiting_.pop_front();
+        readers_.async([this, listing, path = reading_.back().folder.remotePath] {
+            listing->set_value(context_.remote.list(path, cancel_));
+        });
+    }
+}
+
+Failure RemoteLister::bringIn(const Folder& folder, const Result<RemoteListing>& listing) {
     if (!listing)
         return listing.error();
     Result<Arrivals::Spot> spot = spotOf(folder);

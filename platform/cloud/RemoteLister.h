@@ -1,5 +1,6 @@
 #pragma once
 
+#include "platform/base/OperationQueue.h"
 #include "platform/cloud/Arrivals.h"
 #include "platform/cloud/ListingBatch.h"
 
@@ -14,9 +15,9 @@ namespace platform {
 /// stands on the disk already is left as it is; what only both sides together can decide (moves,
 /// deletions, new content on both) is recorded and left as well.
 ///
-/// Reads the remote and changes the disk on the calling thread while the store's queue writes the
-/// batch before down; a batch reaches the disk before its rows. Stopped anywhere, a later run goes
-/// on where the last written batch ends.
+/// Changes the disk on the calling thread while the next folders are read from the remote and the
+/// store's queue writes the batch before down; a batch reaches the disk before its rows. Stopped
+/// anywhere, a later run goes on where the last written batch ends.
 class RemoteLister {
 public:
     enum class Depth {
@@ -64,7 +65,14 @@ private:
         std::vector<RefusedRow> refused;
     };
 
-    Failure listFolder(const Folder& folder);
+    /// A folder whose listing is being read while others are worked on.
+    struct Reading {
+        Folder folder;
+        std::future<Result<RemoteListing>> listing;
+    };
+
+    void readAhead();
+    Failure bringIn(const Folder& folder, const Result<RemoteListing>& listing);
     Known knownOf(const Folder& folder);
     Result<Arrivals::Spot> spotOf(const Folder& folder);
     Failure take(Visit& visit, const RemoteEntry& entry);
@@ -84,6 +92,8 @@ private:
     Arrivals arrivals_;
     Depth depth_ = Depth::newFolders;
     std::deque<Folder> waiting_;
+    std::deque<Reading> reading_;
+    OperationQueue readers_;
     ListingBatch batch_;
     std::future<Failure> writing_;
     Failure firstFailure_;

@@ -4,8 +4,8 @@
 #include "platform/cloud/ContainerSet.h"
 #include "platform/cloud/StateDatabase.h"
 
-#include <atomic>
 #include <memory>
+#include <mutex>
 #include <optional>
 #include <string>
 #include <string_view>
@@ -40,16 +40,22 @@ struct StoreView {
     std::optional<std::string_view> relative(std::string_view path) const;
 };
 
-/// Where the current view hangs; empty without a store.
+/// Where the current view hangs; empty without a store. The mutex is held for the copy of one
+/// pointer, which is what the library's atomic pointer does as well.
 class StoreViewSlot {
 public:
-    std::shared_ptr<const StoreView> load() const { return view_.load(std::memory_order_acquire); }
+    std::shared_ptr<const StoreView> load() const {
+        const std::lock_guard lock(mutex_);
+        return view_;
+    }
     void store(std::shared_ptr<const StoreView> view) {
-        view_.store(std::move(view), std::memory_order_release);
+        const std::lock_guard lock(mutex_);
+        view_.swap(view); // the former one is let go after the lock
     }
 
 private:
-    std::atomic<std::shared_ptr<const StoreView>> view_;
+    mutable std::mutex mutex_;
+    std::shared_ptr<const StoreView> view_; // guarded by mutex_
 };
 
 } // namespace platform
