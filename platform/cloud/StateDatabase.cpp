@@ -130,10 +130,6 @@ void StateDatabase::setItemPlace(ItemId item, const std::optional<Place>& place)
         update.with(item, std::nullopt, std::nullopt, std::nullopt).run();
 }
 
-void StateDatabase::removeItem(ItemId item) {
-    handles_->prepared("DELETE FROM item WHERE id = ?1").with(item).run();
-}
-
 void StateDatabase::putRemote(ItemId item, const RemoteRow& row) {
     std::optional<std::int64_t> created;
     if (row.created)
@@ -153,10 +149,6 @@ void StateDatabase::putRemote(ItemId item, const RemoteRow& row) {
               row.modified.nanoseconds, created, remoteId, row.role != SharedRole::none,
               roleText(row.role), row.tags, row.generation)
         .run();
-}
-
-void StateDatabase::removeRemote(ItemId item) {
-    handles_->prepared("DELETE FROM remote WHERE item = ?1").with(item).run();
 }
 
 void StateDatabase::setRemoteGeneration(ItemId item, std::int64_t generation) {
@@ -195,10 +187,6 @@ void StateDatabase::putBase(ItemId item, const BaseRow& row) {
         .with(item, row.place.parent, Name{row.place.name}, row.etag, row.size, hash,
               row.identity.device, row.identity.inode, row.identity.birthNanoseconds)
         .run();
-}
-
-void StateDatabase::removeBase(ItemId item) {
-    handles_->prepared("DELETE FROM base WHERE item = ?1").with(item).run();
 }
 
 void StateDatabase::putScan(ItemId folder, Side side, const ScanRow& scan) {
@@ -258,12 +246,6 @@ void StateDatabase::replaceDevice(const std::string& before, const std::string& 
             .run();
     }
     setMeta("device", now);
-}
-
-void StateDatabase::setCapability(std::string_view name, std::string_view value) {
-    handles_->prepared("INSERT OR REPLACE INTO capability(name, value) VALUES(?1, ?2)")
-        .with(name, value)
-        .run();
 }
 
 } // namespace platform

@@ -70,14 +70,11 @@ public:
     void insertItem(const ItemRow& item);
     /// None hides the item until it has a name again.
     void setItemPlace(ItemId item, const std::optional<Place>& place);
-    void removeItem(ItemId item);
     void putRemote(ItemId item, const RemoteRow& row);
-    void removeRemote(ItemId item);
     void setRemoteGeneration(ItemId item, std::int64_t generation);
     void putLocal(ItemId item, const LocalRow& row);
     void removeLocal(ItemId item);
     void putBase(ItemId item, const BaseRow& row);
-    void removeBase(ItemId item);
     /// A folder's listing number. A row of the remote whose generation equals it is there; one less
     /// is missing since one whole listing, two less since two. The number moves on only when
     /// something is missing, so that a listing without news writes nothing.
@@ -89,7 +86,6 @@ public:
     void setMeta(std::string_view name, std::string_view value);
     /// Records the device of the tree, and changes it wherever an identity names the earlier one.
     void replaceDevice(const std::string& before, const std::string& now);
-    void setCapability(std::string_view name, std::string_view value);
 
 private:
     explicit StateDatabase(std::unique_ptr<Handles> handles);

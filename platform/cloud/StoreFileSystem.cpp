@@ -80,10 +80,6 @@ public:
         return FileManager::entries(path);
     }
 
-    Result<std::uint64_t> freeBytes(const std::string& path) override {
-        return FileManager::freeBytes(path);
-    }
-
     Failure makeFolder(const std::string& path) override {
         // Not by FileManager: a hundred thousand of them are made in one go.
         return mkdir(path.c_str(), 0777) == 0 ? Failure{} : failed(path);

@@ -30,7 +30,6 @@ public:
 
     virtual Result<FileAttributes> attributes(const std::string& path) = 0;
     virtual Result<std::vector<DirectoryEntry>> entries(const std::string& path) = 0;
-    virtual Result<std::uint64_t> freeBytes(const std::string& path) = 0;
 
     /// fileExists when something is there.
     [[nodiscard]] virtual Failure makeFolder(const std::string& path) = 0;

@@ -2,9 +2,11 @@
 
 #include "platform/cloud/CloudDocumentService.h"
 #include "platform/cloud/Sidecar.h"
+#include "platform/files/FileCoordinator.h"
 #include "platform/files/FileManager.h"
 
 #include <array>
+#include <future>
 #include <unistd.h>
 
 using namespace platform;
@@ -176,6 +178,24 @@ TEST_F(Documents, APackageIsThereWhenAllOfItIs) {
     ASSERT_EQ(cloud->contents().makeLocal(url("Letters/Plan.rtfd"), cancel), std::nullopt);
     EXPECT_EQ(status(), downloadingStatusCurrent);
     EXPECT_TRUE(FileManager::exists(url("Letters/Plan.rtfd/deep/plan.png").path()));
+}
+
+TEST_F(Documents, ACoordinatedReadFindsTheContent) {
+    givenRemote("Letters/a.txt", "content");
+    givenStore();
+    FileCoordinator::setContentProvider(&cloud->contents());
+    const Url item = url("Letters/a.txt");
+    std::string read;
+    const Failure failure = std::async(std::launch::async, [&] {
+                                return FileCoordinator().coordinateReading(
+                                    item, ReadingOptions::none, [&](const Url& there) {
+                                        const auto content = FileManager::contents(there, 100);
+                                        read = std::to_string(content->size());
+                                    });
+                            }).get();
+    FileCoordinator::setContentProvider(nullptr);
+    EXPECT_EQ(failure, std::nullopt);
+    EXPECT_EQ(read, "7");
 }
 
 TEST_F(Documents, WithoutAnAccountThereIsNothing) {

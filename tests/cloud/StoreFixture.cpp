@@ -22,9 +22,6 @@ public:
     Result<std::vector<DirectoryEntry>> entries(const std::string& path) override {
         return real_->entries(path);
     }
-    Result<std::uint64_t> freeBytes(const std::string& path) override {
-        return real_->freeBytes(path);
-    }
     Failure makeFolder(const std::string& path) override {
         return run("folder", [&] { return real_->makeFolder(path); });
     }

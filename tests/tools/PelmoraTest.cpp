@@ -1,3 +1,4 @@
+#include "platform/cloud/StoreFolder.h"
 #include "platform/files/FileManager.h"
 #include "tests/support/TemporaryFolder.h"
 
@@ -105,6 +106,18 @@ TEST_F(Pelmora, ARemoteThatIsAwayIsSaidAndLosesNothing) {
     EXPECT_NE(out.find("a.txt"), std::string::npos);
     fs::rename(home / "unplugged", home / "remote");
     EXPECT_EQ(run("download Letters/a.txt"), 0) << err;
+}
+
+TEST_F(Pelmora, AStoreInUseIsReadAndNotChanged) {
+    givenSignedIn();
+    ASSERT_EQ(run("ls"), 0);
+    const Result<StoreLock> lock =
+        StoreLock::acquire({Url::file(store()).deletingLastPathComponent()->path()});
+    ASSERT_TRUE(lock);
+    EXPECT_EQ(run("download Letters/a.txt"), 4);
+    EXPECT_NE(err.find(std::to_string(getpid())), std::string::npos) << err;
+    EXPECT_EQ(run("ls Letters"), 0);
+    EXPECT_EQ(run("status"), 0);
 }
 
 TEST_F(Pelmora, TheSampleIsAStoreToTryThingsWith) {
