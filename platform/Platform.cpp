@@ -29,6 +29,11 @@ std::string noticeFolder(const Folders& folders) {
 
 } // namespace
 
+PlatformParts::PlatformParts() = default;
+PlatformParts::~PlatformParts() = default;
+PlatformParts::PlatformParts(PlatformParts&& other) noexcept = default;
+PlatformParts& PlatformParts::operator=(PlatformParts&& other) noexcept = default;
+
 /// Members in the order in which they need each other.
 struct Platform::State {
     explicit State(PlatformParts parts)
@@ -42,7 +47,7 @@ struct Platform::State {
           preferences(std::move(parts.preferences)),
           marker(std::move(parts.markerExists)) {
         if (!jot)
-            jot = makeJotService(stateFolder(runtime.folders));
+            jot = makeJotService(stateFolder(runtime.folders), clock.get());
         if (!notify)
             notify = makeNotifyService(noticeFolder(runtime.folders), parts.managedSettingsFile);
         if (!preferences)

@@ -26,6 +26,11 @@ class StandardPreferences;
 
 /// What a platform is put together from. Empty slots get the real thing.
 struct PlatformParts {
+    PlatformParts();
+    ~PlatformParts();
+    PlatformParts(PlatformParts&& other) noexcept;
+    PlatformParts& operator=(PlatformParts&& other) noexcept;
+
     std::unique_ptr<Clock> clock;
     std::optional<Folders> folders;
     std::unique_ptr<JotService> jot;

@@ -8,7 +8,6 @@
 #include "platform/cloud/CloudDocumentService.h"
 #include "platform/cloud/CloudService.h"
 #include "platform/cloud/Remote.h"
-#include "platform/cloud/StoreFileSystem.h"
 #include "platform/cloud/Tokens.h"
 #include "platform/files/ContentProvider.h"
 #include "platform/files/DirectoryWatcher.h"

@@ -54,7 +54,7 @@ public:
         /// Look at the store, and change nothing.
         bool readOnly = false;
         /// Empty: the real disk.
-        std::unique_ptr<StoreFileSystem> disk;
+        std::shared_ptr<StoreFileSystem> disk;
         /// Empty: the kinds that this version knows.
         std::function<std::unique_ptr<Remote>(const AccountRecord& account)> remotes;
     };

@@ -2,7 +2,6 @@
 
 #include "platform/cloud/CloudDocumentService.h"
 #include "platform/cloud/Remote.h"
-#include "platform/cloud/StoreFileSystem.h"
 #include "platform/cloud/Tokens.h"
 
 #include <future>

@@ -1,7 +1,6 @@
 #include "tools/pelmora/Session.h"
 
 #include "platform/base/Describe.h"
-#include "platform/cloud/StoreFileSystem.h"
 #include "tools/pelmora/Command.h"
 
 #include <csignal>
