@@ -191,6 +191,27 @@ TEST_F(Download, TwoCallersShareATransferThatEndsWithTheLastOfThem) {
     EXPECT_EQ(reads, 1);
 }
 
+TEST_F(Download, OneOfTwoCallersMayGoWithoutTheOtherLosingIt) {
+    std::promise<void> reached;
+    std::promise<void> goOn;
+    inTheMiddle([&, first = true]() mutable {
+        if (std::exchange(first, false)) {
+            reached.set_value();
+            goOn.get_future().wait();
+        }
+    });
+    givenListed("A/one.txt");
+    CancelFlag leaving;
+    std::future<Failure> stays = startFetch("A/one.txt", stop);
+    reached.get_future().wait();
+    std::future<Failure> leaves = startFetch("A/one.txt", leaving);
+    leaving.cancel();
+    EXPECT_TRUE(leaves.get()->is(ErrorCode::userCancelled));
+    goOn.set_value();
+    EXPECT_EQ(stays.get(), std::nullopt);
+    EXPECT_EQ(local("A/one.txt"), content);
+}
+
 TEST_F(Download, ARateIsKeptByTheClock) {
     rateLimit = 100'000;
     givenListed("A/one.txt");

@@ -196,6 +196,24 @@ TEST_F(Listing, ARefreshBringsNewItemsAndNewVersionsOfPromises) {
     EXPECT_NE(state("A/local.txt")->base->etag, state("A/local.txt")->remote->etag);
 }
 
+TEST_F(Listing, ADiskWithoutAttributesHoldsTheMarksAsContent) {
+    const std::string memory = "/dev/shm/tavrin-test-" + std::to_string(getpid());
+    ASSERT_EQ(FileManager::createDirectory(Url::file(memory), true), std::nullopt);
+    const bool refusesAttributes =
+        setExtendedAttribute(Url::file(memory), "user.test", "x").has_value();
+    givenRemote("A/one.txt", "1");
+    layout.folder = memory + "/store";
+    ASSERT_EQ(open(), std::nullopt);
+    ASSERT_EQ(list(), std::nullopt);
+    EXPECT_TRUE(isPromised("A/one.txt"));
+    const auto attributes = FileManager::attributes(sidecar("A/one.txt")->path, FollowLinks::no);
+    EXPECT_EQ(attributes->size > 0, refusesAttributes);
+    EXPECT_EQ(move("A/one.txt", "A/" + std::string(250, 'x')), std::nullopt);
+    EXPECT_EQ(fetch("A/" + std::string(250, 'x')), std::nullopt);
+    close();
+    EXPECT_EQ(FileManager::removeItem(Url::file(memory)), std::nullopt);
+}
+
 TEST_F(Listing, AFullDiskStopsItAndLeavesNothingHalfWritten) {
     givenRemote("A/one.txt", "1");
     disk = test::fullFileSystem();
