@@ -27,15 +27,19 @@ struct Subject {
     Date modified;
     SharedRole role = SharedRole::none;
     std::string_view downloadingStatus;
+    std::string type;
 };
 
-std::string typeOf(const Subject& subject) {
-    if (subject.isDirectory && !subject.isPackage)
-        return std::string(types::folder);
-    return TypeRegistry::identifierForFileName(subject.name);
+/// Looked up once for the two attributes that need it.
+const std::string& typeOf(Subject& subject) {
+    if (subject.type.empty())
+        subject.type = subject.isDirectory && !subject.isPackage
+                           ? std::string(types::folder)
+                           : TypeRegistry::identifierForFileName(subject.name);
+    return subject.type;
 }
 
-Value typeDescription(const Subject& subject) {
+Value typeDescription(Subject& subject) {
     std::optional<std::string> words = TypeRegistry::localizedDescription(typeOf(subject));
     return words ? Value(std::move(*words)) : Value();
 }
@@ -46,7 +50,7 @@ Value roleValue(SharedRole role) {
     return role == SharedRole::owner ? sharedRoleOwner : sharedRoleParticipant;
 }
 
-Value valueOf(const Subject& subject, ResourceKey key) {
+Value valueOf(Subject& subject, ResourceKey key) {
     switch (key) {
     case ResourceKey::name:
         return subject.name;
@@ -84,7 +88,7 @@ Value valueOf(const Subject& subject, ResourceKey key) {
     return {};
 }
 
-ResourceValues valuesOf(const Subject& subject, ResourceKeys keys) {
+ResourceValues valuesOf(Subject& subject, ResourceKeys keys) {
     ResourceValues values;
     for (const ResourceKey key : keys)
         values.set(key, valueOf(subject, key));
