@@ -25,7 +25,7 @@ struct ContainerDescription {
     std::optional<std::string> nameIn(std::string_view language) const;
 };
 
-inline constexpr std::uint64_t largestContainerFile = 64 * 1024;
+inline constexpr std::uint64_t largestContainerFile = 64ULL * 1024;
 
 /// Error text for the log when the file is malformed.
 Result<ContainerDescription> parseContainerFile(std::string_view content);
