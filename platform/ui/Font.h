@@ -16,17 +16,22 @@ public:
     static Font withSize(TextStyle style, double points);
 
     TextStyle style() const { return style_; }
-    double pointSize() const { return points_; }
+    /// At the user's text scale of this moment.
+    double pointSize() const;
     /// 400 is regular, 600 is semi-bold.
     int weight() const { return weight_; }
 
-    /// Metrics in points. The descender is negative: it lies below the baseline.
+    /// Metrics of the theme's line box in points: the ascender reaches from its top to the
+    /// baseline, the descender is negative and reaches to its bottom.
     double lineHeight() const;
     double ascender() const;
     double descender() const;
     double capHeight() const;
     /// The width of one line of text.
     double width(std::string_view text) const;
+
+    /// The same style and weight at `factor` times the size.
+    Font scaled(double factor) const { return {style_, points_ * factor, weight_}; }
 
     bool operator==(const Font&) const = default;
 

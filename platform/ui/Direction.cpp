@@ -1,0 +1,17 @@
+#include "platform/ui/Direction.h"
+
+#include "platform/ui/qt/Settings.h"
+
+namespace platform {
+
+Rect mirrored(Rect rect, double containerWidth) {
+    if (isRightToLeft())
+        rect.x = containerWidth - rect.maxX();
+    return rect;
+}
+
+double readingSign() {
+    return isRightToLeft() ? -1 : 1;
+}
+
+} // namespace platform
