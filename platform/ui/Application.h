@@ -81,6 +81,9 @@ public:
     /// Bounds of the main screen in points; all zero when there is none.
     Rect mainScreenBounds() const;
     double mainScreenScale() const;
+    /// Of the visible window; zero and unknown when there is none.
+    Rect statusBarFrame() const;
+    Orientation statusBarOrientation() const;
     DeviceIdiom idiom() const;
     /// By PELMORA_DEVICE ("phone", "tablet"), else a tablet when the screen's shorter side has 600
     /// points or more.
@@ -97,6 +100,8 @@ public:
     void processPending();
 
     struct Impl;
+    /// None while the application is being made.
+    Impl* impl() const { return impl_.get(); }
 
 private:
     std::unique_ptr<Impl> impl_;

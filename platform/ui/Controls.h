@@ -2,11 +2,13 @@
 
 #include "platform/ui/Font.h"
 #include "platform/ui/Image.h"
+#include "platform/ui/StyledText.h"
 #include "platform/ui/View.h"
 
 #include <functional>
 #include <string>
 #include <string_view>
+#include <utility>
 
 namespace platform {
 
@@ -21,6 +23,8 @@ public:
 
     const std::string& text() const;
     void setText(std::string_view text);
+    /// One line of text with pictures in it; takes the place of the plain text.
+    void setStyledText(const StyledText& text);
     Font font() const;
     void setFont(Font font);
     Color textColor() const;
@@ -31,6 +35,8 @@ public:
     int numberOfLines() const;
     void setNumberOfLines(int lines);
     void setLineBreak(LineBreak mode);
+    /// Whether the frame is too small for the whole text.
+    bool isTruncated() const;
 
     Size intrinsicContentSize() const override;
     double intrinsicHeightForWidth(double width) const override;
@@ -59,6 +65,7 @@ public:
     void sendActions(ControlEvent event);
 
     Size intrinsicContentSize() const override;
+    double intrinsicHeightForWidth(double width) const override;
 };
 
 enum class ContentMode { scaleToFill, aspectFit, center };

@@ -4,6 +4,7 @@
 #include "platform/ui/Geometry.h"
 #include "platform/ui/LayoutConstraint.h"
 
+#include <functional>
 #include <memory>
 #include <optional>
 #include <string>
@@ -12,7 +13,10 @@
 
 namespace platform {
 
+class Canvas;
+class ShapeLayer;
 class Window;
+struct LayerShadow;
 
 /// The value of an intrinsic width or height that a view does not have.
 inline constexpr double noIntrinsicMetric = -1;
@@ -75,6 +79,13 @@ public:
     void layoutIfNeeded();
     /// Resizes to the intrinsic size.
     void sizeToFit();
+    /// Calls the handler for every tap (or click) inside the view; makes it focusable, so that
+    /// Space and Enter tap it as well.
+    void addTapHandler(std::function<void()> handler);
+    /// Shapes drawn over the background, below the subviews, in the order of their addition.
+    void addLayer(const std::shared_ptr<ShapeLayer>& layer);
+    /// A shadow below those shapes.
+    void setLayerShadow(const LayerShadow& shadow);
     /// Repaints at the end of this turn of the event loop.
     void setNeedsDisplay();
 
@@ -86,6 +97,10 @@ protected:
     /// Called after the solver has set this view's frame and those of its children.
     virtual void layoutSubviews();
     virtual void didMoveToWindow();
+    /// A subview was hidden or shown, or its natural size changed.
+    virtual void subviewDidChange(View& child);
+    /// Paints the view's own content over its background and layers.
+    virtual void draw(Canvas& canvas);
 
 private:
     friend struct Impl;

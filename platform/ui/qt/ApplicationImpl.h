@@ -1,0 +1,53 @@
+#pragma once
+
+#include "platform/ui/Application.h"
+
+#include <QApplication>
+
+#include <memory>
+#include <optional>
+#include <string>
+#include <vector>
+
+namespace platform {
+
+class MainQueue;
+class MainQueueWaker;
+
+struct Application::Impl : public QObject {
+    Impl(Application& owner, int& argc, char** argv);
+    ~Impl() override;
+
+    bool eventFilter(QObject* watched, QEvent* event) override;
+    bool event(QEvent* event) override;
+
+    /// Joins the installed runtime's main queue; again when another runtime took its place.
+    void attachMainQueue();
+    void readEnvironment();
+    void askDesktop();
+    /// Every view looks again at fonts and directions.
+    void settingsChanged();
+    void showKeyboardFocus(bool shown);
+    void saveState();
+    void restoreState();
+
+    Application& owner;
+    QApplication application;
+    std::shared_ptr<MainQueueWaker> waker;
+    MainQueue* attachedQueue = nullptr;
+    std::shared_ptr<ApplicationDelegate> delegate;
+    std::vector<Window*> windows;
+    bool active = false;
+    bool keyboardFocus = false;
+    bool motionReduced = false;
+    double scale = 1;
+    /// The environment's word stands against the desktop's.
+    bool motionDecided = false;
+    bool scaleDecided = false;
+    std::optional<DeviceIdiom> idiom;
+};
+
+/// None before and after the application's life.
+Application::Impl* applicationImpl();
+
+} // namespace platform

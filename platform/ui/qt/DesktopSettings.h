@@ -1,0 +1,20 @@
+#pragma once
+
+#include <functional>
+#include <optional>
+
+class QObject;
+
+namespace platform {
+
+/// What the user told the desktop about every program; none where it does not say.
+struct DesktopSettings {
+    std::optional<bool> reducesMotion;
+    std::optional<double> textScale;
+};
+
+/// Asks the desktop's settings portal without waiting; `answer` runs on the main thread once for
+/// each setting that the desktop has, and not at all without a session bus or after `context`.
+void askDesktopSettings(QObject& context, std::function<void(const DesktopSettings&)> answer);
+
+} // namespace platform
