@@ -44,17 +44,13 @@ public:
     bool isToolbarHidden() const;
     void setToolbarHidden(bool hidden, bool animated);
 
+    bool performKeyCommand(KeyCommand command) override;
     void loadView() override;
-    void viewDidLoad() override;
-    void viewWillAppear(bool animated) override;
-    void viewDidAppear(bool animated) override;
-    void viewWillDisappear(bool animated) override;
-    void viewDidDisappear(bool animated) override;
     void viewDidLayoutSubviews() override;
-    void viewWillTransitionToSize(Size size, TransitionCoordinator& coordinator) override;
+
+    struct Stack;
 
 private:
-    struct Stack;
     std::unique_ptr<Stack> stack_;
 };
 

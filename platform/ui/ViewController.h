@@ -25,6 +25,18 @@ public:
                                   std::function<void()> completion) = 0;
 };
 
+/// What keys ask of a screen when no control has used them.
+enum class KeyCommand {
+    /// Escape.
+    cancel,
+    /// Enter.
+    confirm,
+    /// Alt+Left, or a keyboard's or mouse's own back key.
+    back,
+    /// Ctrl+F.
+    find
+};
+
 /// Keys and values of state restoration.
 using RestorationCoder = Value::Map;
 
@@ -49,7 +61,12 @@ public:
     virtual void viewWillDisappear(bool animated);
     virtual void viewDidDisappear(bool animated);
     virtual void viewDidLayoutSubviews();
+    /// The machine runs short of memory: drop what can be made again.
+    virtual void didReceiveMemoryWarning();
     virtual void viewWillTransitionToSize(Size size, TransitionCoordinator& coordinator);
+
+    /// Asked of the screens in view, the innermost first, until one answers true: the key is used.
+    virtual bool performKeyCommand(KeyCommand command);
 
     std::string title() const;
     /// Also the navigation item's title.
@@ -76,6 +93,11 @@ public:
     ViewController* presentingViewController() const;
     PresentationStyle modalPresentationStyle() const;
     void setModalPresentationStyle(PresentationStyle style);
+
+    /// Whether the view reaches below the status strip and below the bars of its navigation stack,
+    /// over the whole window; else (at first) it fills what they leave free.
+    bool extendsUnderBars() const;
+    void setExtendsUnderBars(bool extends);
 
     /// Of the window that shows the screen; unspecified outside any.
     TraitCollection traitCollection() const;

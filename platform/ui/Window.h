@@ -33,6 +33,8 @@ public:
     void resize(Size size);
     TraitCollection traitCollection() const;
     Orientation orientation() const;
+    /// Pixels a point of the screen that shows the window.
+    double screenScale() const;
     Rect statusBarFrame() const;
     void setStatusStrip(const StatusStripContent& content);
     const StatusStripContent& statusStrip() const;
