@@ -33,6 +33,8 @@ public:
 
     bool mayDismiss() const { return !shouldDismiss_ || shouldDismiss_(); }
     void run();
+    /// Drops all handlers, and with them what they hold: the alert has had its answer.
+    void release();
 
     AlertAction(std::string_view title, ActionStyle style, Handler handler);
 
@@ -48,6 +50,7 @@ private:
 /// A question over the window: a centred alert (with text fields and a content area), or a sheet of
 /// actions at the bottom of a phone and at its anchor on a tablet. Present it like any screen; it
 /// dismisses itself when an action is chosen. Escape takes the cancel action, Enter the default.
+/// Shown once: when it has gone its actions let go of their handlers.
 class AlertController : public ViewController {
 public:
     static std::shared_ptr<AlertController> create(std::string_view title, std::string_view message,
@@ -70,12 +73,14 @@ public:
                           ArrowDirection directions = ArrowDirection::any);
     void setPopoverAnchor(const BarButtonItem::Pointer& item);
 
-    /// What choosing the action does: asks it, dismisses, runs its handler.
+    /// What choosing the action does: asks it, dismisses, and runs its handler when the alert has
+    /// gone (at once where nothing moves).
     void choose(const AlertAction::Pointer& action);
 
+    bool performKeyCommand(KeyCommand command) override;
     void loadView() override;
-    void viewWillAppear(bool animated) override;
-    void viewDidAppear(bool animated) override;
+    void viewDidLayoutSubviews() override;
+    void viewDidDisappear(bool animated) override;
 
     struct Content;
 

@@ -28,6 +28,9 @@ std::shared_ptr<View> makeBarView(const BarButtonItem::Pointer& item);
 /// The width that a bar gives to the view.
 double barWidthOf(const View& view);
 
+/// Bars have a fixed height: their titles follow the user's text scale only up to half again.
+double barTitleScale();
+
 /// Draws the titles of the bar's own buttons smaller or larger, so that all of them fit.
 void scaleBarTitles(const std::vector<std::shared_ptr<View>>& views, double scale);
 

@@ -4,6 +4,7 @@
 #include "platform/ui/BarButtonImpl.h"
 #include "platform/ui/Theme.h"
 #include "platform/ui/qt/ButtonImpl.h"
+#include "platform/ui/qt/Settings.h"
 
 #include <algorithm>
 
@@ -155,6 +156,11 @@ std::shared_ptr<View> makeBarView(const BarButtonItem::Pointer& item) {
 double barWidthOf(const View& view) {
     const double natural = view.intrinsicContentSize().width;
     return natural == noIntrinsicMetric ? view.frame().width : natural;
+}
+
+double barTitleScale() {
+    constexpr double largest = 1.5;
+    return std::min(1.0, largest / textScale());
 }
 
 void scaleBarTitles(const std::vector<std::shared_ptr<View>>& views, double scale) {

@@ -9,6 +9,7 @@
 
 #include <QKeyEvent>
 #include <QPainter>
+#include <QPainterPath>
 
 #include <algorithm>
 #include <cmath>
@@ -19,6 +20,27 @@ namespace {
 constexpr double hoverShade = 0.05;
 constexpr double pressedShade = 0.10;
 constexpr double imageTitleGap = 8;
+
+/// A rectangle of which some corners are those of the card below.
+QPainterPath rowPath(const QRectF& bounds, RowCorners corners) {
+    const auto has = [corners](RowCorners corner) {
+        return (static_cast<unsigned>(corners) & static_cast<unsigned>(corner)) != 0;
+    };
+    const double r = Theme::overlayCorner;
+    QPainterPath round;
+    round.addRoundedRect(bounds, r, r);
+    QPainterPath square;
+    square.setFillRule(Qt::WindingFill);
+    if (!has(RowCorners::topLeft))
+        square.addRect(QRectF(bounds.left(), bounds.top(), r, r));
+    if (!has(RowCorners::topRight))
+        square.addRect(QRectF(bounds.right() - r, bounds.top(), r, r));
+    if (!has(RowCorners::bottomLeft))
+        square.addRect(QRectF(bounds.left(), bounds.bottom() - r, r, r));
+    if (!has(RowCorners::bottomRight))
+        square.addRect(QRectF(bounds.right() - r, bounds.bottom() - r, r, r));
+    return round.united(square);
+}
 
 ButtonImpl* implOf(const QWidget* widget) {
     View* const view = ownerOf(widget);
@@ -110,7 +132,7 @@ void ButtonImpl::paintFace(QPainter& painter, const QRectF& bounds) const {
     painter.setPen(Qt::NoPen);
     painter.setBrush(toQt(Theme::text.withAlpha(shade)));
     if (isRow)
-        painter.drawRect(bounds);
+        painter.drawPath(rowPath(bounds, rowCorners));
     else
         painter.drawRoundedRect(bounds, Theme::buttonCorner, Theme::buttonCorner);
 }

@@ -62,6 +62,10 @@ void Path::addOval(Rect rect) {
     data_->path.addEllipse(toQt(rect));
 }
 
+void Path::addRoundedRect(Rect rect, double radius) {
+    data_->path.addRoundedRect(toQt(rect), radius, radius);
+}
+
 void Path::close() {
     data_->path.closeSubpath();
 }

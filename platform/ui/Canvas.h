@@ -21,6 +21,7 @@ public:
     /// A straight line to the arc's start (when there is a current point), then the arc.
     void addArc(Point center, double radius, double startAngle, double endAngle, bool clockwise);
     void addOval(Rect rect);
+    void addRoundedRect(Rect rect, double radius);
     void close();
 
     struct Data;

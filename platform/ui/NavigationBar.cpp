@@ -18,7 +18,10 @@ namespace platform {
 namespace {
 
 /// From the edge of the bar to the first button's own padding: its text stands at the page margin.
-constexpr double edgeInset = 4;
+double edgeInset() {
+    return pageMargin() - Theme::iconGap;
+}
+
 constexpr double gap = 8;
 /// A back button with a title takes no more of the bar than this.
 constexpr double widestBack = 0.33;
@@ -27,6 +30,10 @@ constexpr double widestRightSide = 0.6;
 constexpr double titleTravel = 48;
 constexpr double backArrowPadding = 10;
 
+Font titleFont() {
+    return Font::preferred(TextStyle::headline).scaled(barTitleScale());
+}
+
 } // namespace
 
 /// The back button, the title and the right-hand items of one screen.
@@ -34,7 +41,7 @@ class NavigationBar::Page : public View {
 public:
     Page(const BarEntry& entry, const std::function<void()>& back) : backTitle_(entry.backTitle) {
         title_ = std::make_shared<Label>();
-        title_->setFont(Font::preferred(TextStyle::headline));
+        title_->setFont(titleFont());
         title_->setLineBreak(LineBreak::elideMiddle);
         title_->setTextAlignment(TextAlignment::center);
         title_->setText(entry.title);
@@ -64,11 +71,13 @@ public:
 
 protected:
     void layoutSubviews() override {
+        title_->setFont(titleFont());
+        scaleBarTitles(subviews(), barTitleScale());
         const double width = bounds().width;
         const double right = placeRightItems();
         const double left = placeBackButton(right);
         const double wanted = title_->intrinsicContentSize().width;
-        const double margin = Theme::phoneMargin;
+        const double margin = pageMargin();
         const double from = left > 0 ? left + gap : margin;
         const double to = width - (right > 0 ? right + gap : margin);
         const double room = std::max(0.0, to - from);
@@ -101,7 +110,7 @@ private:
     /// From the trailing edge inward; answers the width that they take.
     double placeRightItems() {
         const double limit = bounds().width * widestRightSide;
-        double taken = items_.empty() ? 0 : edgeInset;
+        double taken = items_.empty() ? 0 : edgeInset();
         for (const Item& item : items_) {
             if (!item.view) {
                 taken += gap;
@@ -127,16 +136,16 @@ private:
         const double whole = bounds().width;
         back_->setTitle(*backTitle_);
         double width = back_->intrinsicContentSize().width;
-        const double rest = whole - right - edgeInset - width - 2 * gap;
+        const double rest = whole - right - edgeInset() - width - 2 * gap;
         if (width > whole * widestBack || rest < title_->intrinsicContentSize().width) {
             back_->setTitle("");
             width = Theme::minimumTarget;
         }
         back_->setFrame(
-            mirrored({edgeInset, std::floor((bounds().height - Theme::minimumTarget) / 2), width,
+            mirrored({edgeInset(), std::floor((bounds().height - Theme::minimumTarget) / 2), width,
                       Theme::minimumTarget},
                      whole));
-        return edgeInset + width;
+        return edgeInset() + width;
     }
 
     struct Item {
@@ -160,7 +169,7 @@ NavigationBar::NavigationBar() : hairline_(std::make_shared<View>()) {
 NavigationBar::~NavigationBar() = default;
 
 double NavigationBar::contentHeight() {
-    return std::max(Theme::barHeight, Font::preferred(TextStyle::headline).lineHeight() + 8);
+    return std::max(Theme::barHeight, titleFont().lineHeight() + 8);
 }
 
 void NavigationBar::setBackHandler(std::function<void()> handler) {
@@ -210,11 +219,11 @@ void NavigationBar::setProgress(double progress) {
     if (!next_)
         return;
     const double way = titleTravel * (forward_ ? 1 : -1) * readingSign();
-    // The old title is gone before the new one stands out.
-    next_->setAlpha(std::clamp(2 * progress - 0.6, 0.0, 1.0));
+    // The old title is nearly gone before the new one comes.
+    next_->setAlpha(std::clamp((progress - 0.4) / 0.6, 0.0, 1.0));
     next_->impl().setTranslation({std::round(way * (1 - progress)), 0});
     if (page_) {
-        page_->setAlpha(std::clamp(1 - 2 * progress, 0.0, 1.0));
+        page_->setAlpha(std::clamp(1 - progress / 0.5, 0.0, 1.0));
         page_->impl().setTranslation({std::round(-way * progress), 0});
     }
 }

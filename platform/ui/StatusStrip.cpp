@@ -14,7 +14,6 @@
 namespace platform {
 namespace {
 
-constexpr double spinnerSize = 12;
 constexpr int spinnerSpokes = 8;
 /// One spoke further, so a turn takes 0.8 s.
 constexpr Duration spinnerStep = std::chrono::milliseconds(100);
@@ -103,7 +102,8 @@ double StatusStrip::height() {
 
 void StatusStrip::layoutSubviews() {
     const Rect area = bounds();
-    const double margin = Theme::phoneMargin;
+    const double margin = pageMargin();
+    const double spinnerSize = std::round(Font::preferred(TextStyle::caption).pointSize());
     const double middle = std::floor((area.height - spinnerSize) / 2);
     double end = area.width - margin;
     if (content_.activity) {

@@ -12,7 +12,11 @@
 namespace platform {
 namespace {
 
-constexpr double edgeInset = 4;
+/// A button's own padding stands within the page margin.
+double edgeInset() {
+    return pageMargin() - Theme::iconGap;
+}
+
 constexpr double fixedSpace = 8;
 /// Titles are not drawn smaller than this to make them fit; then they elide.
 constexpr double smallestTitleScale = 0.55;
@@ -35,19 +39,18 @@ public:
 
 protected:
     void layoutSubviews() override {
-        const double room = bounds().width - 2 * edgeInset;
-        const double natural = naturalWidth(1);
-        double scale = 1;
+        const double room = bounds().width - 2 * edgeInset();
+        double scale = barTitleScale();
         while (scale > smallestTitleScale && naturalWidth(scale) > room)
             scale -= 0.05;
         scaleBarTitles(views_, scale);
         // What still does not fit is shared out; labels and titles elide.
-        const double wanted = scale == 1 ? natural : naturalWidth(scale);
+        const double wanted = naturalWidth(scale);
         const double squeeze = wanted > room && wanted > 0 ? room / wanted : 1;
         const auto springs = static_cast<double>(
             std::ranges::count_if(entries_, [](const Entry& each) { return each.flexible; }));
         const double spring = springs > 0 ? std::max(0.0, room - wanted) / springs : 0;
-        double x = edgeInset;
+        double x = edgeInset();
         for (const Entry& entry : entries_) {
             const double width = entry.flexible ? spring : widthOf(entry) * squeeze;
             if (entry.view)

@@ -23,6 +23,18 @@ protected:
     void keyPressEvent(QKeyEvent* event) override;
 };
 
+/// The corners of a row that are corners of the card it stands on.
+enum class RowCorners : unsigned {
+    none = 0,
+    topLeft = 1,
+    topRight = 2,
+    bottomLeft = 4,
+    bottomRight = 8
+};
+constexpr RowCorners operator|(RowCorners a, RowCorners b) {
+    return static_cast<RowCorners>(static_cast<unsigned>(a) | static_cast<unsigned>(b));
+}
+
 struct ButtonImpl : View::Impl {
     explicit ButtonImpl(ButtonType buttonType);
 
@@ -57,6 +69,7 @@ struct ButtonImpl : View::Impl {
     double padding = 12;
     /// A row of an alert or a sheet: no corners of its own, darkened whole.
     bool isRow = false;
+    RowCorners rowCorners = RowCorners::none;
     TextAlignment titleAlignment = TextAlignment::center;
 
 private:

@@ -76,10 +76,11 @@ void TextFieldWidget::updateClearButton() {
     clear_->setVisible(shown);
     const int edge = impl_ && !impl_->bordered ? 0 : sidePadding;
     const int room = shown ? clearButtonWidth : edge;
-    if (layoutDirection() == Qt::RightToLeft)
-        setTextMargins(room, 0, edge, 0);
-    else
-        setTextMargins(edge, 0, room, 0);
+    // Text stands at the leading edge of the program, in whichever direction it runs itself.
+    const bool rightToLeft = layoutDirection() == Qt::RightToLeft;
+    setAlignment((rightToLeft ? Qt::AlignRight : Qt::AlignLeft) | Qt::AlignAbsolute |
+                 Qt::AlignVCenter);
+    setTextMargins(rightToLeft ? room : edge, 0, rightToLeft ? edge : room, 0);
 }
 
 bool TextFieldWidget::event(QEvent* event) {

@@ -158,20 +158,23 @@ void Window::Impl::settingsChanged() {
 }
 
 void Window::Impl::show() {
-    if (!widget || visible)
+    if (!widget)
         return;
+    if (visible) {
+        widget->raise();
+        widget->activateWindow();
+        return;
+    }
     visible = true;
-    if (root)
-        root->impl().take(AppearanceStep::willAppear, false);
-    for (const auto& screen : presentations.screens())
+    std::vector<std::shared_ptr<ViewController>> shown = presentations.screens();
+    if (root && !presentations.lastCoveringHost())
+        shown.insert(shown.begin(), root);
+    for (const auto& screen : shown)
         screen->impl().take(AppearanceStep::willAppear, false);
     layout();
     widget->show();
-    widget->raise();
     widget->activateWindow();
-    if (root)
-        root->impl().take(AppearanceStep::didAppear, false);
-    for (const auto& screen : presentations.screens())
+    for (const auto& screen : shown)
         screen->impl().take(AppearanceStep::didAppear, false);
 }
 
