@@ -25,6 +25,11 @@ ViewController::~ViewController() {
 }
 
 std::shared_ptr<View> ViewController::view() {
+    // A screen that outlived the application lost its widgets with it; the next one loads it anew.
+    if (impl_->loaded && impl_->view && !impl_->view->impl().widget) {
+        setView(nullptr);
+        impl_->loaded = false;
+    }
     // Within loadView the view under way is answered, whatever there is of it.
     if (!impl_->loaded && !impl_->loading) {
         impl_->loading = true;

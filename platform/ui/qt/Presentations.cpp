@@ -94,10 +94,11 @@ void Presentations::dismissFrom(ViewController& screen, bool animated, Completio
             completion();
         return;
     }
-    const auto last = chain_[first];
-    while (chain_.size() > 1 && chain_.back() != last)
-        remove(chain_.size() - 1, false, {});
-    dismissOne(*last->screen, animated, std::move(completion));
+    // The topmost goes as the user sees it go; those below it are out of the way before.
+    const auto topmost = chain_.back();
+    while (first < chain_.size() && chain_[first] != topmost)
+        remove(first, false, {});
+    dismissOne(*topmost->screen, animated, std::move(completion));
 }
 
 void Presentations::dismissOne(ViewController& screen, bool animated, Completion completion) {
@@ -122,7 +123,10 @@ void Presentations::remove(std::size_t index, bool animated, Completion completi
     index = indexOf(*removed->screen);
     if (index >= chain_.size())
         return;
-    const auto uncovered = removed->covers ? contextBelow(index) : nullptr;
+    const bool isCovered =
+        std::any_of(chain_.begin() + static_cast<std::ptrdiff_t>(index) + 1, chain_.end(),
+                    [](const Pointer& each) { return each->covers; });
+    const auto uncovered = removed->covers && !isCovered ? contextBelow(index) : nullptr;
     chain_.erase(chain_.begin() + static_cast<std::ptrdiff_t>(index));
     leaving_.push_back(removed);
     removed->completion = std::move(completion);
@@ -146,6 +150,7 @@ void Presentations::wentOut(const Pointer& presentation,
     presentation->screen->impl().take(AppearanceStep::didDisappear, animated);
     presentation->screen->impl().presentedIn = nullptr;
     presentation->screen->view()->removeFromSuperview();
+    presentation->screen->view()->setHidden(false);
     window_.impl().restackStrip();
     if (uncovered)
         uncovered->impl().take(AppearanceStep::didAppear, animated);

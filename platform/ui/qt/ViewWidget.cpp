@@ -115,7 +115,8 @@ void ViewWidget::mouseReleaseEvent(QMouseEvent* event) {
 
 void ViewWidget::keyPressEvent(QKeyEvent* event) {
     View::Impl* const impl = implOf(this);
-    if (impl && !impl->tapHandlers.empty() && isTapKey(*event))
+    // Not a key that a control inside has left alone.
+    if (impl && !impl->tapHandlers.empty() && hasFocus() && isTapKey(*event))
         impl->activateTap();
     else
         QWidget::keyPressEvent(event);
