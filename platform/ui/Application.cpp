@@ -5,6 +5,7 @@
 #include "platform/base/Runtime.h"
 #include "platform/ui/Window.h"
 #include "platform/ui/qt/ApplicationImpl.h"
+#include "platform/ui/qt/WindowImpl.h"
 
 #include <QScreen>
 
@@ -32,6 +33,11 @@ Application::Application(int& argc, char** argv) {
 }
 
 Application::~Application() {
+    // The screens hear of their end while there still is an application to ask.
+    const std::vector<Window*> windows = impl_->windows;
+    for (Window* const window : windows)
+        window->impl().willClose();
+    impl_->delegate.reset();
     impl_.reset();
     sharedApplication = nullptr;
 }
@@ -103,6 +109,16 @@ Rect Application::mainScreenBounds() const {
 double Application::mainScreenScale() const {
     const QScreen* const screen = QGuiApplication::primaryScreen();
     return screen ? screen->devicePixelRatio() : 1;
+}
+
+Rect Application::statusBarFrame() const {
+    const Window* const window = impl_->visibleWindow();
+    return window ? window->statusBarFrame() : Rect{};
+}
+
+Orientation Application::statusBarOrientation() const {
+    const Window* const window = impl_->visibleWindow();
+    return window ? window->orientation() : Orientation::unknown;
 }
 
 DeviceIdiom Application::idiom() const {

@@ -74,11 +74,20 @@ void ButtonWidget::paintEvent(QPaintEvent* /*event*/) {
 }
 
 void ButtonWidget::keyPressEvent(QKeyEvent* event) {
-    // Enter presses the button that has the focus; Qt would look for a dialog's default one.
-    if (event->key() == Qt::Key_Return || event->key() == Qt::Key_Enter)
+    switch (event->key()) {
+    case Qt::Key_Return:
+    case Qt::Key_Enter:
+        // Qt would look for a dialog's default button.
         click();
-    else
+        break;
+    case Qt::Key_Space:
+    case Qt::Key_Select:
         QPushButton::keyPressEvent(event);
+        break;
+    default:
+        // The arrows are the screen's; Qt would move the focus by them.
+        event->ignore();
+    }
 }
 
 ButtonImpl::ButtonImpl(ButtonType buttonType)
@@ -99,6 +108,7 @@ QString ButtonImpl::toQtTitle() const {
 }
 
 void ButtonImpl::changed() {
+    blocks_.clear();
     updateAccessibleName();
     self->invalidateIntrinsicContentSize();
     self->setNeedsDisplay();
@@ -151,7 +161,8 @@ void ButtonImpl::paintContent(QPainter& painter, const QRectF& bounds) {
             std::min({1.0, bounds.width() / size.width, bounds.height() / size.height});
         const double width = size.width * shrink;
         const double height = size.height * shrink;
-        const double whole = title.empty() ? width : width + imageTitleGap + titleSize().width();
+        const bool alone = title.empty() || titleHidden;
+        const double whole = alone ? width : width + imageTitleGap + titleSize().width();
         const double start = std::floor(bounds.center().x() - std::min(whole, room.width()) / 2);
         const double y = std::floor(bounds.center().y() - height / 2);
         const bool rightToLeft = isRightToLeft();
@@ -163,7 +174,7 @@ void ButtonImpl::paintContent(QPainter& painter, const QRectF& bounds) {
         else
             room.setLeft(x + width + imageTitleGap);
     }
-    if (!title.empty())
+    if (!title.empty() && !titleHidden)
         paintTitle(painter, room);
     painter.setOpacity(1);
     if (widget && widget->hasFocus() && showsKeyboardFocus())
@@ -172,24 +183,28 @@ void ButtonImpl::paintContent(QPainter& painter, const QRectF& bounds) {
 
 void ButtonImpl::paintTitle(QPainter& painter, QRectF room) const {
     painter.setPen(toQt(shownTitleColor()));
-    const TextBlockStyle style{shownFont(), wraps ? 0 : 1, LineBreak::elideMiddle};
     const TextAlignment alignment = image.empty() ? titleAlignment : TextAlignment::natural;
-    TextBlock(toQtTitle(), style, room.width()).draw(painter, room, alignment);
+    titleBlock(room.width()).draw(painter, room, alignment);
+}
+
+const TextBlock& ButtonImpl::titleBlock(double width) const {
+    return blocks_.block(toQtTitle(), {shownFont(), wraps ? 0 : 1, LineBreak::elideMiddle}, width);
 }
 
 QSizeF ButtonImpl::titleSize() const {
-    if (title.empty())
-        return {0, 0};
-    return TextBlock(toQtTitle(), {shownFont(), 1, LineBreak::elideMiddle},
-                     TextBlock::unlimitedWidth)
-        .size();
+    return title.empty() ? QSizeF(0, 0) : titleBlock(TextBlock::unlimitedWidth).size();
+}
+
+void ButtonImpl::settingsChanged() {
+    blocks_.clear();
+    View::Impl::settingsChanged();
 }
 
 double ButtonImpl::heightForWidth(double width) const {
     if (!wraps || title.empty())
         return noIntrinsicMetric;
-    const TextBlock block(toQtTitle(), {shownFont(), 0, LineBreak::wrap}, width - 2 * padding);
-    return std::max(Theme::minimumTarget, block.size().height() + padding);
+    const double height = titleBlock(width - 2 * padding).size().height();
+    return std::max(Theme::minimumTarget, height + padding);
 }
 
 Button::Button(ButtonType type, Rect frame) : View(std::make_unique<ButtonImpl>(type)) {

@@ -49,7 +49,7 @@ void LabelImpl::paintContent(QPainter& painter, const QRectF& bounds) {
 }
 
 void LabelImpl::settingsChanged() {
-    block_.reset();
+    blocks.clear();
     View::Impl::settingsChanged();
 }
 
@@ -62,18 +62,14 @@ QString LabelImpl::accessibleText() const {
 }
 
 void LabelImpl::textChanged() {
-    block_.reset();
+    blocks.clear();
     updateAccessibleName();
     self->invalidateIntrinsicContentSize();
     self->setNeedsDisplay();
 }
 
 const TextBlock& LabelImpl::blockFor(double width) const {
-    if (!block_ || blockWidth_ != width) {
-        block_ = std::make_unique<TextBlock>(toQt(text), style(), width);
-        blockWidth_ = width;
-    }
-    return *block_;
+    return blocks.block(toQt(text), style(), width);
 }
 
 Size LabelImpl::styledSize() const {
@@ -144,8 +140,11 @@ Font Label::font() const {
 }
 
 void Label::setFont(Font font) {
-    implOf(*this).font = font;
-    implOf(*this).textChanged();
+    LabelImpl& impl = implOf(*this);
+    if (impl.font == font)
+        return;
+    impl.font = font;
+    impl.textChanged();
 }
 
 Color Label::textColor() const {
@@ -171,8 +170,11 @@ int Label::numberOfLines() const {
 }
 
 void Label::setNumberOfLines(int lines) {
-    implOf(*this).lines = lines;
-    implOf(*this).textChanged();
+    LabelImpl& impl = implOf(*this);
+    if (impl.lines == lines)
+        return;
+    impl.lines = lines;
+    impl.textChanged();
 }
 
 void Label::setLineBreak(LineBreak mode) {
@@ -193,7 +195,7 @@ Size Label::intrinsicContentSize() const {
         return impl.styledSize();
     if (impl.text.empty())
         return {0, 0};
-    const QSizeF size = TextBlock(toQt(impl.text), impl.style(), TextBlock::unlimitedWidth).size();
+    const QSizeF size = impl.blockFor(TextBlock::unlimitedWidth).size();
     return {size.width(), size.height()};
 }
 
@@ -201,7 +203,7 @@ double Label::intrinsicHeightForWidth(double width) const {
     const LabelImpl& impl = implOf(*this);
     if (impl.lines == 1 || impl.text.empty() || !impl.styled.runs.empty())
         return noIntrinsicMetric;
-    return TextBlock(toQt(impl.text), impl.style(), width).size().height();
+    return impl.blockFor(width).size().height();
 }
 
 } // namespace platform

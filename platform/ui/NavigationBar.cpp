@@ -13,6 +13,7 @@
 
 #include <algorithm>
 #include <cmath>
+#include <utility>
 
 namespace platform {
 namespace {
@@ -44,6 +45,7 @@ public:
         title_->setFont(titleFont());
         title_->setLineBreak(LineBreak::elideMiddle);
         title_->setTextAlignment(TextAlignment::center);
+        title_->impl().role = QAccessible::Heading;
         title_->setText(entry.title);
         if (backTitle_)
             addBackButton(back);
@@ -93,6 +95,7 @@ private:
     void addBackButton(const std::function<void()>& back) {
         back_ = std::make_shared<Button>(ButtonType::system);
         back_->setImage(Image::system(SystemImage::back));
+        back_->setTitle(*backTitle_);
         implOf(*back_).padding = backArrowPadding;
         back_->setAccessibleName(backTitle_->empty() ? localized("Back")
                                                      : localized("Back") + ", " + *backTitle_);
@@ -134,13 +137,14 @@ private:
         if (!back_)
             return 0;
         const double whole = bounds().width;
-        back_->setTitle(*backTitle_);
         double width = back_->intrinsicContentSize().width;
         const double rest = whole - right - edgeInset() - width - 2 * gap;
-        if (width > whole * widestBack || rest < title_->intrinsicContentSize().width) {
-            back_->setTitle("");
+        const bool arrowAlone =
+            width > whole * widestBack || rest < title_->intrinsicContentSize().width;
+        if (arrowAlone)
             width = Theme::minimumTarget;
-        }
+        if (std::exchange(implOf(*back_).titleHidden, arrowAlone) != arrowAlone)
+            back_->setNeedsDisplay();
         back_->setFrame(
             mirrored({edgeInset(), std::floor((bounds().height - Theme::minimumTarget) / 2), width,
                       Theme::minimumTarget},

@@ -27,6 +27,10 @@ constexpr double indicatorWidth = 4;
 
 struct ScrollBox::Scrolling : View::Impl {
     Scrolling();
+    ~Scrolling() override {
+        // The widget's own end moves the focus once more.
+        QObject::disconnect(focusWatch);
+    }
 
     double farthest() const {
         return self ? std::max(0.0, contentHeight - self->bounds().height) : 0;
@@ -60,6 +64,7 @@ struct ScrollBox::Scrolling : View::Impl {
 
     std::shared_ptr<View> content;
     std::shared_ptr<View> indicator;
+    QMetaObject::Connection focusWatch;
     double contentHeight = 0;
     double offset = 0;
 };
@@ -111,8 +116,8 @@ private:
 
 ScrollBox::Scrolling::Scrolling()
     : View::Impl(std::make_unique<ScrollWidget>([this](double step) { moveTo(offset + step); })) {
-    QObject::connect(qApp, &QApplication::focusChanged, widget.data(),
-                     [this](QWidget*, QWidget* now) { showFocused(now); });
+    focusWatch = QObject::connect(qApp, &QApplication::focusChanged, widget.data(),
+                                  [this](QWidget*, QWidget* now) { showFocused(now); });
 }
 
 ScrollBox::ScrollBox(std::shared_ptr<View> content) : View(std::make_unique<Scrolling>()) {

@@ -19,7 +19,8 @@ Window::Window(Rect frame) : impl_(std::make_unique<Impl>(*this, frame)) {
 }
 
 Window::~Window() {
-    std::erase(Application::shared().impl()->windows, this);
+    if (Application::Impl* const application = applicationImpl())
+        std::erase(application->windows, this);
     impl_->presentations.dismissAll();
     setRootViewController(nullptr);
     impl_->rootView->impl().moveToWindow(nullptr);

@@ -13,8 +13,9 @@ class AlertTest : public UiTest {
 protected:
     AlertAction::Pointer action(const std::string& title,
                                 ActionStyle style = ActionStyle::standard) {
+        // A choice may end after the test's own members have gone.
         return AlertAction::make(
-            title, style, [this](AlertAction& chosen) { answers.push_back(chosen.title()); });
+            title, style, [&log = journal](AlertAction& chosen) { log.push_back(chosen.title()); });
     }
     std::shared_ptr<AlertController> alert(const std::vector<AlertAction::Pointer>& actions,
                                            AlertStyle style = AlertStyle::alert) {
@@ -124,6 +125,16 @@ TEST_F(AlertTest, TabGoesRoundInsideAndTheFocusReturnsAfterwards) {
     EXPECT_EQ(focusedTitle(), "Replace");
     press(Key::escape);
     EXPECT_EQ(focusedTitle(), "Outside");
+}
+
+TEST_F(AlertTest, WhereNothingHadTheFocusNothingHasItAfterwards) {
+    auto outside = std::make_shared<Button>(ButtonType::system, Rect{20, 100, 120, 44});
+    outside->setTitle("Outside");
+    window().rootViewController()->view()->addSubview(outside);
+    givenPrompt(action("Done"));
+    press(Key::enter);
+    advance(180ms);
+    EXPECT_EQ(focusedTitle(), "");
 }
 
 TEST_F(AlertTest, WhereSomethingCouldBeDestroyedTheKeyboardRestsOnTheWayOut) {

@@ -4,6 +4,8 @@
 
 #include <QApplication>
 #include <QInputMethodEvent>
+#include <QPointer>
+#include <QPointingDevice>
 #include <QTest>
 #include <QWidget>
 #include <QWindow>
@@ -26,7 +28,10 @@ QWindow* windowHandleOf(Window& window) {
 }
 
 QPointingDevice* touchScreen() {
-    static QPointingDevice* const device = QTest::createTouchDevice();
+    // An application takes its devices along.
+    static QPointer<QPointingDevice> device;
+    if (!device)
+        device = QTest::createTouchDevice();
     return device;
 }
 
@@ -49,13 +54,23 @@ bool visit(View& view, const std::function<bool(View&)>& found) {
 }
 
 std::unique_ptr<UiEnvironment>& environmentSlot() {
-    static auto one = std::make_unique<UiEnvironment>();
+    static std::unique_ptr<UiEnvironment> one;
     return one;
 }
+
+/// Ends the application while Qt's own static objects still live.
+class ApplicationEnd : public testing::Environment {
+public:
+    void TearDown() override { environmentSlot().reset(); }
+};
+[[maybe_unused]] testing::Environment* const applicationEnd =
+    testing::AddGlobalTestEnvironment(new ApplicationEnd);
 
 } // namespace
 
 UiEnvironment& UiTest::environment() {
+    if (!environmentSlot())
+        environmentSlot() = std::make_unique<UiEnvironment>();
     return *environmentSlot();
 }
 
@@ -63,7 +78,7 @@ void UiTest::restartApplication() {
     stack_.reset();
     window_.reset();
     environmentSlot().reset();
-    environmentSlot() = std::make_unique<UiEnvironment>();
+    environment();
 }
 
 UiTest::UiTest() {

@@ -21,6 +21,8 @@
 #include <QKeyEvent>
 #include <QLocale>
 
+#include <algorithm>
+
 namespace platform {
 namespace {
 
@@ -153,6 +155,12 @@ void Application::Impl::showKeyboardFocus(bool shown) {
     keyboardFocus = shown;
     if (QWidget* const focused = QApplication::focusWidget())
         focused->update();
+}
+
+Window* Application::Impl::visibleWindow() const {
+    const auto found = std::find_if(windows.rbegin(), windows.rend(),
+                                    [](const Window* each) { return each->isVisible(); });
+    return found == windows.rend() ? nullptr : *found;
 }
 
 void Application::Impl::saveState() {

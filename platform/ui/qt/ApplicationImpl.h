@@ -28,6 +28,8 @@ struct Application::Impl : public QObject {
     /// Every view looks again at fonts and directions.
     void settingsChanged();
     void showKeyboardFocus(bool shown);
+    /// The latest of those in view; none when there is none.
+    Window* visibleWindow() const;
     void saveState();
     void restoreState();
 

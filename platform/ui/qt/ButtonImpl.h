@@ -1,6 +1,7 @@
 #pragma once
 
 #include "platform/ui/Controls.h"
+#include "platform/ui/qt/TextBlock.h"
 #include "platform/ui/qt/ViewImpl.h"
 
 #include <QPushButton>
@@ -50,7 +51,9 @@ struct ButtonImpl : View::Impl {
     bool isHovered() const;
     void paintFace(QPainter& painter, const QRectF& bounds) const;
     void paintTitle(QPainter& painter, QRectF room) const;
+    const TextBlock& titleBlock(double width) const;
     QSizeF titleSize() const;
+    void settingsChanged() override;
     double heightForWidth(double width) const;
 
     ButtonType type;
@@ -61,6 +64,8 @@ struct ButtonImpl : View::Impl {
     std::vector<std::function<void()>> actions;
 
     // What bars and alerts ask for beyond the public contract.
+    /// Only the image is drawn; the title stays what the screen reader says.
+    bool titleHidden = false;
     /// A factor on the title's size, for bars whose room is fixed.
     double titleScale = 1;
     /// The title may take as many lines as it needs.
@@ -74,6 +79,8 @@ struct ButtonImpl : View::Impl {
 
 private:
     void sendClick();
+
+    TextBlockCache blocks_;
 };
 
 ButtonImpl& implOf(const Button& button);

@@ -32,10 +32,7 @@ struct LabelImpl : View::Impl {
     TextAlignment alignment = TextAlignment::natural;
     int lines = 1;
     LineBreak lineBreak = LineBreak::elideTail;
-
-private:
-    mutable std::unique_ptr<TextBlock> block_;
-    mutable double blockWidth_ = -1;
+    TextBlockCache blocks;
 };
 
 } // namespace platform

@@ -111,4 +111,17 @@ void TextBlock::draw(QPainter& painter, const QRectF& bounds, TextAlignment alig
     }
 }
 
+const TextBlock& TextBlockCache::block(const QString& text, const TextBlockStyle& style,
+                                       double width) const {
+    const double points = style.font.pointSize();
+    for (const Entry& each : entries_)
+        if (each.width == width && each.maximumLines == style.maximumLines && each.points == points)
+            return *each.block;
+    if (entries_.size() == capacity)
+        entries_.erase(entries_.begin());
+    entries_.push_back(
+        {width, style.maximumLines, points, std::make_unique<TextBlock>(text, style, width)});
+    return *entries_.back().block;
+}
+
 } // namespace platform

@@ -52,4 +52,22 @@ private:
     QSizeF size_;
 };
 
+/// The blocks of one text at the few widths for which layout and painting ask in turn.
+class TextBlockCache {
+public:
+    const TextBlock& block(const QString& text, const TextBlockStyle& style, double width) const;
+    /// The text or its style changed.
+    void clear() { entries_.clear(); }
+
+private:
+    struct Entry {
+        double width;
+        int maximumLines;
+        double points;
+        std::unique_ptr<TextBlock> block;
+    };
+    static constexpr std::size_t capacity = 3;
+    mutable std::vector<Entry> entries_;
+};
+
 } // namespace platform

@@ -13,7 +13,7 @@ namespace platform {
 namespace {
 
 constexpr int sidePadding = 12;
-constexpr int clearButtonWidth = 36;
+constexpr int clearButtonWidth = 44;
 constexpr double clearDiscRadius = 9;
 
 /// The grey disc with a cross that empties the field.

@@ -1,6 +1,7 @@
 #include "platform/ui/qt/WindowImpl.h"
 
 #include "platform/base/Identity.h"
+#include "platform/base/Log.h"
 #include "platform/ui/Application.h"
 #include "platform/ui/Theme.h"
 #include "platform/ui/ViewControllerImpl.h"
@@ -105,16 +106,17 @@ bool Window::Impl::layout() {
     if (inLayout || !rootView)
         return false;
     inLayout = true;
-    bool worked = false;
-    for (int round = 0; round < layoutRounds; ++round) {
+    int round = 0;
+    for (; round < layoutRounds; ++round) {
         if (!engine.needsSolve() && !rootView->impl().treeNeedsLayout)
             break;
-        worked = true;
         engine.solve();
         rootView->impl().runLayoutSubviews();
     }
     inLayout = false;
-    return worked;
+    if (round == layoutRounds)
+        platformLog(LogLevel::warning, "The layout of a window does not come to rest");
+    return round > 0;
 }
 
 void Window::Impl::place() {
