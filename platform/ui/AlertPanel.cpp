@@ -312,7 +312,7 @@ AlertPanel::AlertPanel(const AlertPanelParts& parts, const Choose& choose,
 AlertPanel::~AlertPanel() = default;
 
 double AlertPanel::heightForWidth(double width) {
-    const double height = body_->arrange(width);
+    const double height = std::ceil(body_->arrange(width));
     scroll_->setContentHeight(height);
     return height;
 }

@@ -178,7 +178,8 @@ void ButtonImpl::paintContent(QPainter& painter, const QRectF& bounds) {
         paintTitle(painter, room);
     painter.setOpacity(1);
     if (widget && widget->hasFocus() && showsKeyboardFocus())
-        paintFocusRing(painter, bounds, isRow ? 4 : Theme::buttonCorner);
+        paintFocusRing(painter, isRow ? bounds.adjusted(4, 4, -4, -4) : bounds,
+                       Theme::buttonCorner);
 }
 
 void ButtonImpl::paintTitle(QPainter& painter, QRectF room) const {

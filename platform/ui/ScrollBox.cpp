@@ -32,8 +32,10 @@ struct ScrollBox::Scrolling : View::Impl {
         QObject::disconnect(focusWatch);
     }
 
+    /// Less than a point is rounding, not content.
     double farthest() const {
-        return self ? std::max(0.0, contentHeight - self->bounds().height) : 0;
+        const double hiddenPart = self ? contentHeight - self->bounds().height : 0;
+        return hiddenPart < 1 ? 0 : hiddenPart;
     }
     void moveTo(double wanted) {
         offset = std::clamp(wanted, 0.0, farthest());

@@ -6,7 +6,13 @@
 #include "platform/ui/Controls.h"
 #include "platform/ui/StackView.h"
 #include "platform/ui/Theme.h"
+#include "platform/ui/qt/Bridge.h"
 #include "tests/ui/UiEnvironment.h"
+
+#include <QApplication>
+#include <QKeyEvent>
+#include <QMouseEvent>
+#include <QWidget>
 
 #include <cstdio>
 #include <filesystem>
@@ -58,6 +64,22 @@ public:
         return screen;
     }
     void after(Duration time) { environment_.advance(time); }
+    /// Moves the keyboard's focus on, as the Tab key does.
+    void pressTab(int times) {
+        QWidget* const top = widgetOf(*stack->view())->window();
+        for (int i = 0; i < times; ++i) {
+            QWidget* const focused = QApplication::focusWidget();
+            QKeyEvent tab(QEvent::KeyPress, Qt::Key_Tab, Qt::NoModifier);
+            QCoreApplication::sendEvent(focused ? focused : top, &tab);
+        }
+        environment_.settle();
+    }
+    /// Leaves the button pressed.
+    static void hold(const Button& button) {
+        QMouseEvent press(QEvent::MouseButtonPress, QPointF(9, 9), QPointF(9, 9), Qt::LeftButton,
+                          Qt::LeftButton, Qt::NoModifier);
+        QCoreApplication::sendEvent(widgetOf(button), &press);
+    }
     void save(const std::filesystem::path& folder) {
         environment_.settle();
         const Bytes png = window_->snapshotPng(2);
@@ -276,6 +298,26 @@ std::shared_ptr<AlertController> actionsSheet() {
 
 using Scene = std::function<void(Picture&)>;
 
+/// Buttons at rest, disabled, and one pressed or with the keyboard's focus.
+void states(Picture& picture, bool isPressed) {
+    picture.push("Tavrin");
+    const auto screen = picture.push("Documents");
+    setEditingBars(*screen);
+    screen->navigationItem().setHidesBackButton(false, false);
+    const auto changed = button(isPressed ? "Pressed" : "With the focus");
+    double y = 24;
+    for (const auto& each : {changed, button("At rest"), button("Disabled", false)}) {
+        each->sizeToFit();
+        each->setFrame({16, y, each->frame().width, each->frame().height});
+        screen->view()->addSubview(each);
+        y += 56;
+    }
+    if (isPressed)
+        Picture::hold(*changed);
+    else
+        picture.pressTab(3);
+}
+
 void controls(Picture& picture) {
     picture.push("Tavrin");
     const auto screen = picture.push("Documents");
@@ -358,6 +400,8 @@ int main(int argc, char** argv) {
         {{"controls-phone-200", phone, DeviceIdiom::phone, false, 2}, controls},
         {{"controls-phone-turned", phoneTurned}, controls},
         {{"controls-tablet", tablet, onTablet}, controls},
+        {{"pressed", smallPhone}, [](Picture& picture) { states(picture, true); }},
+        {{"focus", smallPhone}, [](Picture& picture) { states(picture, false); }},
         {{"editing-small-phone", smallPhone}, editing},
         {{"editing-small-phone-200", smallPhone, DeviceIdiom::phone, false, 2}, editing},
         {{"editing-phone-rtl", phone, DeviceIdiom::phone, true}, editing},
@@ -369,6 +413,11 @@ int main(int argc, char** argv) {
         {{"alert-german", smallPhone}, presenting(longQuestion)},
         {{"alert-german-200", smallPhone, DeviceIdiom::phone, false, 2}, presenting(longQuestion)},
         {{"alert-tablet", tablet, onTablet}, presenting(twoAnswers)},
+        {{"alert-focus", phone},
+         [](Picture& picture) {
+             presenting(twoAnswers)(picture);
+             picture.pressTab(1);
+         }},
         {{"prompt", phone}, presenting([] { return prompt(false); })},
         {{"prompt-error", phone}, presenting([] { return prompt(true); })},
         {{"prompt-error-200", smallPhone, DeviceIdiom::phone, false, 2},

@@ -129,6 +129,9 @@ void Presentations::remove(std::size_t index, bool animated, Completion completi
     const auto uncovered = removed->covers && !isCovered ? contextBelow(index) : nullptr;
     chain_.erase(chain_.begin() + static_cast<std::ptrdiff_t>(index));
     leaving_.push_back(removed);
+    // The screen above came over one that is gone: the focus goes back to where that one took it.
+    if (index < chain_.size())
+        chain_[index]->focusBefore = removed->focusBefore;
     removed->completion = std::move(completion);
     removed->host->setUserInteractionEnabled(false);
 
