@@ -56,6 +56,7 @@ void AlertController::Content::build() {
         if (style == AlertStyle::actionSheet)
             escape();
     });
+    dim->impl().role = QAccessible::Client;
     if (QWidget* const widget = widgetOf(*dim)) {
         widget->setFocusPolicy(Qt::NoFocus);
         widget->setCursor(Qt::ArrowCursor);

@@ -1,11 +1,11 @@
 #include "platform/ui/AlertPanel.h"
 
 #include "platform/ui/Direction.h"
+#include "platform/ui/FieldBox.h"
 #include "platform/ui/Theme.h"
 #include "platform/ui/Window.h"
 #include "platform/ui/qt/Bridge.h"
 #include "platform/ui/qt/ButtonImpl.h"
-#include "platform/ui/qt/TextFieldImpl.h"
 
 #include <algorithm>
 #include <cmath>
@@ -19,8 +19,6 @@ constexpr double headerBottom = 20;
 constexpr double titleMessageGap = 4;
 constexpr double sheetHeaderMargin = 14;
 constexpr double fieldGap = 8;
-constexpr double fieldInset = 12;
-constexpr double fieldPadding = 16;
 constexpr double rowHeight = 48;
 constexpr double sheetRowHeight = 52;
 
@@ -33,56 +31,6 @@ std::shared_ptr<Label> makeLabel(const std::string& text, TextStyle style, Color
     label->setText(text);
     return label;
 }
-
-/// For what must not stand in the way of a panel that has no width yet.
-LayoutConstraint::Pointer yielding(const LayoutConstraint::Pointer& constraint) {
-    constraint->setPriority(layoutRequired - 1);
-    return constraint;
-}
-
-/// The box round a text field; a tap anywhere in it is a tap on the field.
-class FieldBox : public View {
-public:
-    explicit FieldBox(const std::shared_ptr<TextField>& field) : field_(field) {
-        implOf(*field).bordered = false;
-        implOf(*field).applyFont();
-        field->setLaidOutByConstraints(true);
-        addSubview(field);
-        addTapHandler([weak = std::weak_ptr(field)] {
-            if (const auto target = weak.lock())
-                target->becomeFirstResponder();
-        });
-        if (QWidget* const widget = widgetOf(*this)) {
-            widget->setFocusPolicy(Qt::NoFocus);
-            widget->setCursor(Qt::IBeamCursor);
-        }
-        using enum LayoutAttribute;
-        LayoutConstraint::activate(
-            {LayoutConstraint::equal(*field, leading, *this, leading, fieldInset),
-             yielding(LayoutConstraint::equal(*field, trailing, *this, trailing, -fieldInset / 2)),
-             LayoutConstraint::equal(*field, centerY, *this, centerY)});
-    }
-
-    double height() const {
-        return std::max(Theme::minimumTarget, field_->frame().height + fieldPadding);
-    }
-
-protected:
-    void layoutSubviews() override {
-        if (View* const body = superview())
-            body->setNeedsLayout();
-    }
-    void draw(Canvas& canvas) override {
-        const double line = field_->isFirstResponder() ? 2 : 1;
-        const Rect box = bounds().inset(line / 2, line / 2);
-        Path outline;
-        outline.addRoundedRect(box, Theme::buttonCorner);
-        canvas.stroke(outline, field_->isFirstResponder() ? Theme::accent : Theme::hairline, line);
-    }
-
-private:
-    std::shared_ptr<TextField> field_;
-};
 
 } // namespace
 

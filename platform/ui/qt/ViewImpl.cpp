@@ -1,23 +1,18 @@
 #include "platform/ui/qt/ViewImpl.h"
 
-#include "platform/ui/Canvas.h"
 #include "platform/ui/Theme.h"
 #include "platform/ui/ViewController.h"
 #include "platform/ui/Window.h"
 #include "platform/ui/layout/ViewLayout.h"
 #include "platform/ui/qt/Bridge.h"
 #include "platform/ui/qt/LiveViews.h"
-#include "platform/ui/qt/PainterCanvas.h"
-#include "platform/ui/qt/TransformEffect.h"
 #include "platform/ui/qt/ViewWidget.h"
 #include "platform/ui/qt/WindowImpl.h"
 
 #include <QCoreApplication>
-#include <QPainter>
 
 #include <algorithm>
 #include <cmath>
-#include <numbers>
 #include <utility>
 
 namespace platform {
@@ -42,9 +37,6 @@ View::Impl::~Impl() {
     delete widget.data();
 }
 
-void View::Impl::paintContent(QPainter& /*painter*/, const QRectF& /*bounds*/) {
-}
-
 void View::Impl::settingsChanged() {
     itemChanged();
     markNeedsLayout();
@@ -58,58 +50,6 @@ QAccessible::Role View::Impl::accessibleRole() const {
 
 QString View::Impl::accessibleText() const {
     return {};
-}
-
-void View::Impl::paint(QPainter& painter) {
-    const QRectF bounds(contentOffset.x, contentOffset.y, frame.width, frame.height);
-    painter.setRenderHint(QPainter::Antialiasing);
-    paintBackground(painter, bounds);
-    paintContent(painter, bounds);
-    painter.save();
-    painter.translate(bounds.topLeft());
-    paintLayers(painter);
-    PainterCanvas canvas(painter);
-    self->draw(canvas);
-    painter.restore();
-}
-
-void View::Impl::paintBackground(QPainter& painter, const QRectF& bounds) const {
-    if (!background || background->alpha <= 0)
-        return;
-    if (cornerRadius <= 0) {
-        painter.fillRect(bounds, toQt(*background));
-        return;
-    }
-    painter.setPen(Qt::NoPen);
-    painter.setBrush(toQt(*background));
-    painter.drawRoundedRect(bounds, cornerRadius, cornerRadius);
-}
-
-void View::Impl::paintLayers(QPainter& painter) const {
-    PainterCanvas canvas(painter);
-    const auto drawAll = [&](const auto& colorOf) {
-        for (const auto& layer : layers) {
-            if (layer->fillColor())
-                canvas.fill(layer->path(), colorOf(*layer->fillColor()));
-            if (layer->strokeColor())
-                canvas.stroke(layer->path(), colorOf(*layer->strokeColor()), layer->lineWidth());
-        }
-    };
-    if (shadow.opacity > 0) {
-        // A blur of a fraction of a point: the shapes, faint, at eight places around their own.
-        constexpr int places = 8;
-        const Color faint =
-            shadow.color.withAlpha(shadow.color.alpha * shadow.opacity / (places / 2.0));
-        for (int i = 0; i < places; ++i) {
-            const double angle = 2 * std::numbers::pi * i / places;
-            painter.save();
-            painter.translate(shadow.offset.x + shadow.radius * std::cos(angle),
-                              shadow.offset.y + shadow.radius * std::sin(angle));
-            drawAll([&](const Color&) { return faint; });
-            painter.restore();
-        }
-    }
-    drawAll([](const Color& own) { return own; });
 }
 
 void View::Impl::activateTap() {
@@ -217,21 +157,6 @@ void View::Impl::setTranslation(Point value) {
 void View::Impl::setScale(double value) {
     scale = value;
     applyEffect();
-}
-
-void View::Impl::applyEffect() {
-    if (!widget)
-        return;
-    if (alpha >= 1 && scale == 1) {
-        widget->setGraphicsEffect(nullptr);
-        return;
-    }
-    auto* effect = static_cast<TransformEffect*>(widget->graphicsEffect());
-    if (!effect) {
-        effect = new TransformEffect;
-        widget->setGraphicsEffect(effect);
-    }
-    effect->set(alpha, scale);
 }
 
 void View::Impl::markNeedsLayout() {
