@@ -9,8 +9,8 @@ struct Color {
     double blue = 0;
     double alpha = 1;
 
-    static constexpr Color gray(double white, double alpha = 1) {
-        return {white, white, white, alpha};
+    static constexpr Color gray(double level, double alpha = 1) {
+        return {level, level, level, alpha};
     }
     /// From 0xRRGGBB.
     static constexpr Color hex(unsigned rgb) {

@@ -97,9 +97,7 @@ Image Image::named(std::string_view name) {
     const auto found = loaded.find(name);
     if (found != loaded.end())
         return found->second;
-    const Image image(loadDrawing(toQt(name)));
-    loaded.emplace(name, image);
-    return image;
+    return loaded.emplace(name, Image(loadDrawing(toQt(name)))).first->second;
 }
 
 Image Image::system(SystemImage which) {

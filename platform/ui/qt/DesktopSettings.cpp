@@ -7,6 +7,7 @@
 #include <QFileInfo>
 #include <QGuiApplication>
 
+#include <iterator>
 #include <memory>
 
 namespace platform {
@@ -40,6 +41,25 @@ const Question questions[] = {
      }},
 };
 
+/// The answers of one round, which come one by one.
+struct Round {
+    std::function<void(const DesktopSettings&)> answer;
+    DesktopSettings all;
+    std::size_t waiting = std::size(questions);
+
+    void take(const DesktopSettings& one) {
+        // Desktops ask for less motion in different words; one of them is enough.
+        if (one.reducesMotion)
+            all.reducesMotion = *one.reducesMotion || all.reducesMotion.value_or(false);
+        if (one.textScale)
+            all.textScale = one.textScale;
+    }
+    void oneCame() {
+        if (--waiting == 0)
+            answer(all);
+    }
+};
+
 /// Without an address libdbus would try to start a bus of its own.
 bool hasSessionBus() {
     return qEnvironmentVariableIsSet("DBUS_SESSION_BUS_ADDRESS") ||
@@ -61,7 +81,8 @@ void askDesktopSettings(QObject& context, std::function<void(const DesktopSettin
     const QDBusConnection bus = QDBusConnection::sessionBus();
     if (!bus.isConnected())
         return;
-    const auto shared = std::make_shared<decltype(answer)>(std::move(answer));
+    const auto round = std::make_shared<Round>();
+    round->answer = std::move(answer);
     for (const Question& question : questions) {
         QDBusMessage call = QDBusMessage::createMethodCall(
             QStringLiteral("org.freedesktop.portal.Desktop"),
@@ -71,12 +92,13 @@ void askDesktopSettings(QObject& context, std::function<void(const DesktopSettin
         auto* const watcher =
             new QDBusPendingCallWatcher(bus.asyncCall(call, portalTimeoutMs), &context);
         QObject::connect(watcher, &QDBusPendingCallWatcher::finished, &context,
-                         [shared, read = question.read](QDBusPendingCallWatcher* done) {
+                         [round, read = question.read](QDBusPendingCallWatcher* done) {
                              const QDBusMessage reply = done->reply();
                              done->deleteLater();
                              if (reply.type() == QDBusMessage::ReplyMessage &&
                                  !reply.arguments().isEmpty())
-                                 (*shared)(read(unwrapped(reply.arguments().constFirst())));
+                                 round->take(read(unwrapped(reply.arguments().constFirst())));
+                             round->oneCame();
                          });
     }
 }

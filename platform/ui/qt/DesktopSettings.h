@@ -13,8 +13,8 @@ struct DesktopSettings {
     std::optional<double> textScale;
 };
 
-/// Asks the desktop's settings portal without waiting; `answer` runs on the main thread once for
-/// each setting that the desktop has, and not at all without a session bus or after `context`.
+/// Asks the desktop's settings portal without waiting; `answer` runs on the main thread when all is
+/// known that the desktop says, and not at all without a session bus or after `context`.
 void askDesktopSettings(QObject& context, std::function<void(const DesktopSettings&)> answer);
 
 } // namespace platform
