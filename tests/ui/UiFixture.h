@@ -4,6 +4,7 @@
 #include "platform/ui/Controls.h"
 #include "platform/ui/NavigationController.h"
 #include "platform/ui/Window.h"
+#include "tests/ui/Person.h"
 #include "tests/ui/UiEnvironment.h"
 
 #include <gtest/gtest.h>
@@ -20,11 +21,9 @@ using namespace std::chrono_literals;
 inline constexpr platform::Size phoneSize{390, 844};
 inline constexpr platform::Size tabletSize{1024, 768};
 
-enum class Key { escape, enter, tab, backtab, space, backspace, altLeft, left, right };
-
-/// The words of a person at the screen, over a real window whose time stands still. The environment
-/// is one for the whole program; each test gets a phone in portrait, reading to the right.
-class UiTest : public testing::Test {
+/// A person before a real window whose time stands still. The environment is one for the whole
+/// program; each test gets a phone in portrait, reading to the right.
+class UiTest : public testing::Test, public Person {
 protected:
     UiTest();
     ~UiTest() override;
@@ -37,35 +36,13 @@ protected:
     /// A visible window; the one before goes.
     platform::Window& givenWindow(platform::Size size = phoneSize,
                                   platform::DeviceIdiom idiom = platform::DeviceIdiom::phone);
-    platform::Window& window();
+    platform::Window& window() override;
     /// A stack with that screen at its bottom as the window's root.
     platform::NavigationController&
     givenStack(const std::shared_ptr<platform::ViewController>& bottom);
 
     static void advance(platform::Duration time) { environment().advance(time); }
-    static void settle() { environment().settle(); }
-
-    /// Presses where the view's middle shows, so that what lies over it gets the press.
-    void tap(const platform::View& view);
-    void tapAt(platform::Point point);
-    void pressDown(platform::Point point);
-    void letGo(platform::Point point);
-    void press(Key key);
-    /// Letter by letter, as keys do.
-    void type(std::string_view text);
-    /// As an input method hands over a finished word.
-    void commit(std::string_view text);
-    void fingerDown(platform::Point point);
-    void fingerTo(platform::Point point);
-    void fingerUp(platform::Point point);
-
-    /// The button, bar or alert, that shows the title; none when there is none in sight.
-    platform::Button* button(std::string_view title);
-    std::vector<std::string> buttonTitles();
-    platform::Label* label(std::string_view text);
-    /// The title of the button with the keyboard's focus; "" for none.
-    std::string focusedTitle();
-    std::shared_ptr<platform::ViewController> topPresented();
+    void settle() override { environment().settle(); }
 
     /// What the test's screens and handlers wrote down; outlives the window.
     std::vector<std::string> journal;
