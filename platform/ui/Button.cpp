@@ -132,7 +132,7 @@ bool ButtonImpl::isPressed() const {
 }
 
 bool ButtonImpl::isHovered() const {
-    return widget && widget->isEnabled() && widget->underMouse();
+    return widget && widget->isEnabled() && pointerHovers() && widget->underMouse();
 }
 
 void ButtonImpl::paintFace(QPainter& painter, const QRectF& bounds) const {

@@ -1,9 +1,11 @@
 #include "platform/ui/ViewController.h"
 
 #include "platform/base/Log.h"
+#include "platform/ui/Application.h"
 #include "platform/ui/NavigationController.h"
 #include "platform/ui/ViewControllerImpl.h"
 #include "platform/ui/Window.h"
+#include "platform/ui/qt/ApplicationImpl.h"
 #include "platform/ui/qt/Presentations.h"
 #include "platform/ui/qt/ViewImpl.h"
 #include "platform/ui/qt/WindowImpl.h"
@@ -162,10 +164,11 @@ NavigationController* ViewController::navigationController() const {
 
 void ViewController::presentViewController(const std::shared_ptr<ViewController>& screen,
                                            bool animated, std::function<void()> completion) {
-    Window* const window = impl_->window();
+    // A screen that has left meanwhile still has something to say: what it shows is for the user.
+    Window* const own = impl_->window();
+    Window* const window = own ? own : Application::shared().impl()->visibleWindow();
     if (!window) {
-        platformLog(LogLevel::warning, "A screen outside any window cannot present “%@”",
-                    screen->title());
+        platformLog(LogLevel::warning, "There is no window to present “%@” in", screen->title());
         return;
     }
     window->impl().presentations.present(screen, animated, std::move(completion));

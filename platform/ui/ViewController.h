@@ -84,7 +84,8 @@ public:
     /// The nearest navigation stack that holds this screen; none outside any.
     NavigationController* navigationController() const;
 
-    /// Shows `screen` over this one's window; `completion` runs when it has come in.
+    /// Shows `screen` over this one's window (over the visible one when this screen has left), above
+    /// what is presented already; `completion` runs when it has come in.
     void presentViewController(const std::shared_ptr<ViewController>& screen, bool animated,
                                std::function<void()> completion = {});
     /// Takes away what this screen presents or, when it presents nothing, this screen itself.

@@ -165,6 +165,16 @@ TEST_F(AlertTest, AnAnswerMayAskTheNextQuestion) {
     EXPECT_EQ(topPresented(), next);
 }
 
+TEST_F(AlertTest, AScreenThatHasLeftStillTellsTheUserWhatWentWrong) {
+    auto& stack = givenStack(std::make_shared<ViewController>());
+    const auto page = std::make_shared<ViewController>();
+    stack.pushViewController(page, false);
+    stack.popViewController(false);
+    const auto error = alert({action("OK")});
+    page->presentViewController(error, true);
+    EXPECT_EQ(topPresented(), error);
+}
+
 TEST_F(AlertTest, AContentAreaTakesRoomOnlyWhileItIsShown) {
     const auto prompt = givenPrompt(action("Done"));
     const double before = rectOf(*button("Done")).y;

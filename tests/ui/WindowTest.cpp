@@ -2,6 +2,8 @@
 #include "tests/support/TemporaryFolder.h"
 #include "tests/ui/UiFixture.h"
 
+#include <QIcon>
+
 #include <gmock/gmock.h>
 
 #include <algorithm>
@@ -126,6 +128,12 @@ TEST_F(WindowTest, AScreenOfStaticLifeOutlivesOneApplicationAndServesTheNext) {
     EXPECT_EQ(stack->topViewController(), kept);
     EXPECT_EQ(kept->view()->window(), &window());
     EXPECT_EQ(std::ranges::count(journal, "Kept didLoad"), 2) << "its widgets went with the first";
+}
+
+TEST_F(WindowTest, IconsAreFoundWithoutADesktop) {
+    EXPECT_FALSE(QIcon::fromTheme(QStringLiteral("application-pdf")).isNull());
+    EXPECT_FALSE(Image::named("Cloudload").empty());
+    EXPECT_TRUE(Image::named("NoSuchPicture").empty());
 }
 
 TEST_F(WindowTest, RestorationValuesSurviveTheirFile) {

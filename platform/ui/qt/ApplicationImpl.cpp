@@ -20,6 +20,9 @@
 #include <QIcon>
 #include <QKeyEvent>
 #include <QLocale>
+#include <QMouseEvent>
+#include <QPointingDevice>
+#include <QStandardPaths>
 
 #include <algorithm>
 
@@ -33,6 +36,19 @@ constexpr double largestTextScale = 4;
 char** withoutDesktopLook(char** argv) {
     QApplication::setDesktopSettingsAware(false);
     return argv;
+}
+
+/// The user's icon theme with Breeze behind it, also on platforms that know of no themes.
+void chooseIconTheme() {
+    QStringList paths = QIcon::themeSearchPaths();
+    for (const QString& data :
+         QStandardPaths::standardLocations(QStandardPaths::GenericDataLocation))
+        if (const QString icons = data + QLatin1String("/icons"); !paths.contains(icons))
+            paths.append(icons);
+    QIcon::setThemeSearchPaths(paths);
+    QIcon::setFallbackThemeName(QStringLiteral("breeze"));
+    if (QIcon::themeName().isEmpty())
+        QIcon::setThemeName(QStringLiteral("breeze"));
 }
 
 std::string restorationPath() {
@@ -52,7 +68,7 @@ Application::Impl::Impl(Application& theOwner, int& argc, char** argv)
     chooseFontFamilies();
     readEnvironment();
     QApplication::setFont(toQt(Font::preferred(TextStyle::body)));
-    QIcon::setFallbackThemeName(QStringLiteral("breeze"));
+    chooseIconTheme();
     QApplication::setWindowIcon(QIcon(QStringLiteral(":/icons/Tavrin.svg")));
     QGuiApplication::setLayoutDirection(QLocale().textDirection());
     installAccessibility();
@@ -93,9 +109,17 @@ bool Application::Impl::eventFilter(QObject* watched, QEvent* event) {
             showKeyboardFocus(true);
         break;
     }
-    case QEvent::MouseButtonPress:
     case QEvent::TouchBegin:
+        pointerHovers = false;
         showKeyboardFocus(false);
+        break;
+    case QEvent::MouseButtonPress:
+        showKeyboardFocus(false);
+        break;
+    case QEvent::MouseMove:
+        // A finger's touches arrive as moves of a mouse as well.
+        if (const auto* const device = static_cast<QMouseEvent*>(event)->pointingDevice())
+            pointerHovers = device->type() != QInputDevice::DeviceType::TouchScreen;
         break;
     default:
         break;
@@ -201,6 +225,11 @@ bool isRightToLeft() {
 double textScale() {
     const Application::Impl* const impl = applicationImpl();
     return impl ? impl->scale : 1;
+}
+
+bool pointerHovers() {
+    const Application::Impl* const impl = applicationImpl();
+    return !impl || impl->pointerHovers;
 }
 
 bool showsKeyboardFocus() {

@@ -41,6 +41,7 @@ struct Application::Impl : public QObject {
     std::vector<Window*> windows;
     bool active = false;
     bool keyboardFocus = false;
+    bool pointerHovers = true;
     bool motionReduced = false;
     double scale = 1;
     /// The environment's word stands against the desktop's.

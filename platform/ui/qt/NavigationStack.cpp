@@ -119,7 +119,7 @@ void NavigationController::Stack::showTop() {
     layout();
 }
 
-/// The bars hear of changes of the top screen's items only.
+/// The bars hear of changes of the top screen's items, and of the title that the way back bears.
 void NavigationController::Stack::follow(const Screen& screen) {
     Screens others = screens;
     if (transition)
@@ -129,6 +129,8 @@ void NavigationController::Stack::follow(const Screen& screen) {
         each->impl().toolbarItemsChanged = {};
     }
     screen->navigationItem().setChangeHandler([this] { updateBar(); });
+    if (screens.size() > 1)
+        screens[screens.size() - 2]->navigationItem().setChangeHandler([this] { updateBar(); });
     screen->impl().toolbarItemsChanged = [this](bool) { updateToolbar(); };
 }
 

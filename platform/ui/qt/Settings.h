@@ -7,6 +7,8 @@ namespace platform {
 bool reducesMotion();
 bool isRightToLeft();
 double textScale();
+/// The pointer is one that can stand over a thing without pressing it; a finger is not.
+bool pointerHovers();
 /// The keyboard was used last, so the focus must be seen.
 bool showsKeyboardFocus();
 
