@@ -44,9 +44,10 @@ AlertController::Content::Form AlertController::Content::form() const {
 void AlertController::Content::build() {
     View& view = *owner.impl().loadedView();
     for (const std::shared_ptr<View>& former :
-         std::initializer_list<std::shared_ptr<View>>{dim, card, cancelCard})
+         std::initializer_list<std::shared_ptr<View>>{dim, backdrop, card, cancelCard})
         if (former)
             former->removeFromSuperview();
+    backdrop = nullptr;
     cancelCard = nullptr;
     cancelPanel = nullptr;
     builtForm = form();
@@ -75,7 +76,12 @@ void AlertController::Content::build() {
                           defaultAction(),
                           wayOut,
                           style == AlertStyle::actionSheet};
-    card = std::make_shared<Card>();
+    if (apart) {
+        backdrop = std::make_shared<Card>(Card::Look::shadowOnly);
+        backdrop->setUserInteractionEnabled(false);
+        view.addSubview(backdrop);
+    }
+    card = std::make_shared<Card>(apart ? Card::Look::groundOnly : Card::Look::whole);
     const auto resized = [this] {
         if (View* const whole = owner.impl().loadedView())
             whole->setNeedsLayout();
@@ -86,7 +92,7 @@ void AlertController::Content::build() {
     card->addSubview(panel);
     view.addSubview(card);
     if (apart) {
-        cancelCard = std::make_shared<Card>();
+        cancelCard = std::make_shared<Card>(Card::Look::groundOnly);
         cancelPanel = std::make_shared<AlertPanel>(
             AlertPanelParts{{}, {}, {}, nullptr, {wayOut}, nullptr, wayOut, true}, choose, resized);
         cancelCard->addSubview(cancelPanel);
@@ -148,6 +154,8 @@ void AlertController::Content::layoutBottomSheet(Rect room) {
     const double height = std::min(panel->heightForWidth(width), bottom - room.y);
     card->setGround({x, bottom - height, width, height});
     panel->setFrame(card->ground());
+    if (backdrop)
+        backdrop->setGround({x, bottom - height, width, room.maxY() - bottom + height});
 }
 
 void AlertController::Content::layoutPopover(Rect room) {
@@ -187,9 +195,9 @@ void AlertController::Content::showStep(double shown) {
     }
     const double below = dim->frame().height - card->frame().y - Card::reach;
     const Point away{0, std::round((1 - shown) * std::max(0.0, below))};
-    card->impl().setTranslation(away);
-    if (cancelCard)
-        cancelCard->impl().setTranslation(away);
+    for (const auto& each : {backdrop, card, cancelCard})
+        if (each)
+            each->impl().setTranslation(away);
 }
 
 void AlertController::Content::takeFocus() const {

@@ -54,7 +54,8 @@ struct AlertController::Content {
     std::shared_ptr<View> dim;
     std::shared_ptr<Card> card;
     std::shared_ptr<AlertPanel> panel;
-    /// The way out of a bottom sheet stands apart from the other actions.
+    /// The way out of a bottom sheet stands apart from the other actions, over the same shadow.
+    std::shared_ptr<Card> backdrop;
     std::shared_ptr<Card> cancelCard;
     std::shared_ptr<AlertPanel> cancelPanel;
     Form builtForm = Form::centered;

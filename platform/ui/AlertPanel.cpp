@@ -116,8 +116,8 @@ private:
         ButtonImpl& face = implOf(*row.button);
         face.isRow = true;
         face.wraps = true;
-        const bool strong =
-            action == (sheet_ ? parts.escapeAction : parts.defaultAction) && !isAlone(parts);
+        const bool strong = sheet_ ? action == parts.escapeAction
+                                   : action == parts.defaultAction && parts.actions.size() > 1;
         row.button->setTitle(action->title());
         row.button->setTitleFont(Font::preferred(strong ? TextStyle::headline : TextStyle::body));
         if (action->style() == ActionStyle::destructive)
@@ -133,8 +133,6 @@ private:
         addSubview(row.line);
         rows_.push_back(std::move(row));
     }
-
-    static bool isAlone(const AlertPanelParts& parts) { return parts.actions.size() == 1; }
 
     double headerMargin() const { return sheet_ ? sheetHeaderMargin : headerTop; }
     double bottomMargin() const {

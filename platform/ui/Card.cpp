@@ -120,23 +120,30 @@ QPainterPath arrowPath(const QRectF& ground, ArrowDirection side, double at) {
 } // namespace
 
 struct Card::Painting : View::Impl {
+    explicit Painting(Look whichLook) : look(whichLook) {}
+
     void paintContent(QPainter& painter, const QRectF& bounds) override {
         const QRectF ground = bounds.adjusted(reach, reach, -reach, -reach);
         if (ground.isEmpty())
             return;
-        painter.setRenderHint(QPainter::SmoothPixmapTransform);
-        const QPixmap soft = shadowOf(ground.size());
-        painter.drawPixmap(bounds, soft, QRectF(soft.rect()));
+        if (look != Look::groundOnly) {
+            painter.setRenderHint(QPainter::SmoothPixmapTransform);
+            const QPixmap soft = shadowOf(ground.size());
+            painter.drawPixmap(bounds, soft, QRectF(soft.rect()));
+        }
+        if (look == Look::shadowOnly)
+            return;
         QPainterPath path;
         path.addRoundedRect(ground, Theme::overlayCorner, Theme::overlayCorner);
         painter.fillPath(path.united(arrowPath(ground, arrow, arrowAt)), toQt(Theme::page));
     }
 
+    Look look;
     ArrowDirection arrow = ArrowDirection::any;
     double arrowAt = 0;
 };
 
-Card::Card() : View(std::make_unique<Painting>()) {
+Card::Card(Look look) : View(std::make_unique<Painting>(look)) {
 }
 
 Card::Painting& Card::painting() const {

@@ -10,8 +10,10 @@ namespace platform {
 class Card : public View {
 public:
     static constexpr double reach = 48;
+    /// Cards that stand close together share one shadow behind all of them.
+    enum class Look { whole, groundOnly, shadowOnly };
 
-    Card();
+    explicit Card(Look look = Look::whole);
     /// Puts the ground itself at `ground` (the parent's coordinates).
     void setGround(Rect ground);
     /// The ground in this view's coordinates.

@@ -401,7 +401,6 @@ int main(int argc, char** argv) {
         {{"controls-phone-turned", phoneTurned}, controls},
         {{"controls-tablet", tablet, onTablet}, controls},
         {{"pressed", smallPhone}, [](Picture& picture) { states(picture, true); }},
-        {{"focus", smallPhone}, [](Picture& picture) { states(picture, false); }},
         {{"editing-small-phone", smallPhone}, editing},
         {{"editing-small-phone-200", smallPhone, DeviceIdiom::phone, false, 2}, editing},
         {{"editing-phone-rtl", phone, DeviceIdiom::phone, true}, editing},
@@ -413,11 +412,6 @@ int main(int argc, char** argv) {
         {{"alert-german", smallPhone}, presenting(longQuestion)},
         {{"alert-german-200", smallPhone, DeviceIdiom::phone, false, 2}, presenting(longQuestion)},
         {{"alert-tablet", tablet, onTablet}, presenting(twoAnswers)},
-        {{"alert-focus", phone},
-         [](Picture& picture) {
-             presenting(twoAnswers)(picture);
-             picture.pressTab(1);
-         }},
         {{"prompt", phone}, presenting([] { return prompt(false); })},
         {{"prompt-error", phone}, presenting([] { return prompt(true); })},
         {{"prompt-error-200", smallPhone, DeviceIdiom::phone, false, 2},
@@ -429,6 +423,13 @@ int main(int argc, char** argv) {
         {{"popover-button", tablet, onTablet}, popover(deleteSheet, true)},
         {{"popover-row", tablet, onTablet}, popover(actionsSheet, false)},
         {{"popover-row-rtl", tablet, onTablet, true}, popover(actionsSheet, false)},
+        // Last: from the first Tab on the focus shows.
+        {{"focus", smallPhone}, [](Picture& picture) { states(picture, false); }},
+        {{"alert-focus", phone},
+         [](Picture& picture) {
+             presenting(twoAnswers)(picture);
+             picture.pressTab(1);
+         }},
     };
     for (const auto& [look, scene] : scenes) {
         Picture picture(environment, look);
