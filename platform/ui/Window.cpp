@@ -76,8 +76,7 @@ Size Window::size() const {
 }
 
 void Window::resize(Size size) {
-    if (impl_->widget)
-        impl_->widget->resize(static_cast<int>(size.width), static_cast<int>(size.height));
+    impl_->resize(size);
 }
 
 TraitCollection Window::traitCollection() const {

@@ -16,6 +16,7 @@ struct StatusStripContent {
 /// the constraints of its whole tree.
 class Window {
 public:
+    /// An empty frame, or one as large as the screen, stands for the device's own size on a desk.
     explicit Window(Rect frame);
     ~Window();
     Window(const Window&) = delete;
@@ -29,7 +30,7 @@ public:
     void close();
 
     Size size() const;
-    /// As a user's resize or rotation does.
+    /// As a user's resize or rotation does; no smaller than 320 x 480, or 480 x 320 when turned.
     void resize(Size size);
     TraitCollection traitCollection() const;
     Orientation orientation() const;

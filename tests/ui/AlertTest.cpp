@@ -243,14 +243,14 @@ TEST_F(AlertTest, APopoverPointsAtItsAnchorInsideTheTabletsWindow) {
 }
 
 TEST_F(AlertTest, AnAlertHigherThanTheWindowScrollsToTheFocus) {
-    givenWindow({360, 400});
+    givenWindow({480, 320});
     application().setTextScale(2);
     present(alert({action("First choice"), action("Second choice"), action("Third choice"),
                    action("Cancel", ActionStyle::cancel)}));
     press(Key::tab);
     while (focusedTitle() != "Cancel")
         press(Key::tab);
-    EXPECT_LE(rectOf(*button("Cancel")).maxY(), 400);
+    EXPECT_LE(rectOf(*button("Cancel")).maxY(), 320);
     press(Key::tab);
     EXPECT_EQ(focusedTitle(), "First choice");
     EXPECT_GE(rectOf(*button("First choice")).y, 0);

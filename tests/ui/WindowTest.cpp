@@ -48,7 +48,9 @@ TEST_F(WindowTest, ItsSizeFollowsTheDeviceUnlessItIsGiven) {
     EXPECT_EQ(whole.size().width, std::min(1024.0, screen.width));
     EXPECT_EQ(givenWindow({500, 600}).size(), (Size{500, 600}));
     givenWindow({100, 100});
-    EXPECT_EQ(window().size(), (Size{320, 320}));
+    EXPECT_EQ(window().size(), (Size{320, 480}));
+    window().resize({200, 100});
+    EXPECT_EQ(window().size(), (Size{480, 320}));
 }
 
 TEST_F(WindowTest, AResizeIsAnnouncedWithTheOldTraitsAndEndsWithTheNewOnes) {

@@ -20,9 +20,9 @@ namespace {
 
 constexpr Size defaultPhoneSize{390, 844};
 constexpr Size defaultTabletSize{1024, 768};
-/// A phone's smallest screen, and what is left of it when it is turned.
-constexpr int smallestWidth = 320;
-constexpr int smallestHeight = 320;
+/// A phone's smallest screen, upright; turned it is as small the other way.
+constexpr int smallestShortSide = 320;
+constexpr int smallestLongSide = 480;
 /// Layout that asks for layout comes to rest in two or three rounds; more is a fault of a view.
 constexpr int layoutRounds = 10;
 
@@ -80,9 +80,7 @@ Window::Impl::Impl(Window& theOwner, Rect wanted)
     rootView->impl().widget->setParent(widget);
     rootView->impl().widget->show();
     widget->setWindowTitle(toQt(applicationName));
-    widget->setMinimumSize(smallestWidth, smallestHeight);
-    const Size first = initialSize(wanted);
-    widget->resize(static_cast<int>(first.width), static_cast<int>(first.height));
+    resize(initialSize(wanted));
     size = {static_cast<double>(widget->width()), static_cast<double>(widget->height())};
     engine.setRightToLeft(Application::shared().isRightToLeft());
     engine.setOnNeedsSolve([this] { scheduleLayout(); });
@@ -95,6 +93,28 @@ Window::Impl::~Impl() {
     if (rootView->impl().widget)
         rootView->impl().widget->setParent(nullptr);
     delete widget.data();
+}
+
+void Window::Impl::resize(Size wanted) {
+    if (!widget)
+        return;
+    const bool turned = wanted.width > wanted.height;
+    const int width = turned ? smallestLongSide : smallestShortSide;
+    const int height = turned ? smallestShortSide : smallestLongSide;
+    // The minimum of the former orientation must not stand in the way.
+    if (widget->minimumWidth() != width)
+        widget->setMinimumSize(smallestShortSide, smallestShortSide);
+    widget->resize(std::max(width, static_cast<int>(wanted.width)),
+                   std::max(height, static_cast<int>(wanted.height)));
+    applyMinimum(wanted);
+}
+
+void Window::Impl::applyMinimum(Size now) {
+    const bool turned = now.width > now.height;
+    const QSize least(turned ? smallestLongSide : smallestShortSide,
+                      turned ? smallestShortSide : smallestLongSide);
+    if (widget->minimumSize() != least)
+        widget->setMinimumSize(least);
 }
 
 void Window::Impl::scheduleLayout() {
@@ -139,6 +159,7 @@ void Window::Impl::sizeChanged() {
             screen->impl().sizeWillChange(now, coordinator);
     }
     size = now;
+    applyMinimum(size);
     engine.setRootSize(size);
     place();
     coordinator.runAnimations();

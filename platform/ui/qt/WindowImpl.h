@@ -16,6 +16,9 @@ struct Window::Impl {
     Impl(Window& owner, Rect wanted);
     ~Impl();
 
+    void resize(Size wanted);
+    /// What a user may shrink the window to, in the orientation that it has.
+    void applyMinimum(Size now);
     void scheduleLayout();
     bool layout();
     void place();
