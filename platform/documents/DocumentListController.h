@@ -69,10 +69,10 @@ public:
     void setAssociatedObject(const std::string& key, std::shared_ptr<void> object);
 
     void loadView() override;
-    void viewDidLoad() override;
     void viewWillAppear(bool animated) override;
     void viewDidAppear(bool animated) override;
     void viewWillDisappear(bool animated) override;
+    bool performKeyCommand(KeyCommand command) override;
 
     struct Impl;
     Impl& impl() const { return *impl_; }

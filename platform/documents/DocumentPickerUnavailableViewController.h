@@ -18,7 +18,7 @@ public:
 
 private:
     struct Content;
-    std::unique_ptr<Content> content_;
+    std::shared_ptr<Content> content_;
 };
 
 /// Makes a platform screen by the name of its class; none when the platform has no such screen.

@@ -19,6 +19,7 @@ public:
 
     void loadView() override;
     void viewDidAppear(bool animated) override;
+    bool performKeyCommand(KeyCommand command) override;
 
     struct Impl;
 

@@ -1,0 +1,186 @@
+#include "platform/documents/DocumentListController.h"
+
+#include "platform/base/Identity.h"
+#include "platform/cloud/CloudDocumentService.h"
+#include "platform/documents/DisplayName.h"
+#include "platform/documents/ListScreen.h"
+#include "platform/documents/list/ListWidget.h"
+#include "platform/files/FileManager.h"
+#include "platform/ui/Theme.h"
+
+namespace platform {
+namespace {
+
+std::string titleFor(const Url& folder, const CloudDocumentService& documents) {
+    if (documents.shelfroot() == folder)
+        return std::string(applicationName);
+    if (documents.isDocumentsContainer(folder))
+        if (const auto container = documents.containerForItemAtURL(folder))
+            return displayName((*container)->localizedName());
+    return displayName(folder.lastPathComponent());
+}
+
+bool isFolder(const Url& url) {
+    bool directory = false;
+    return FileManager::exists(url.path(), &directory) && directory;
+}
+
+/// The folders from below `top` down to `folder`, which lies inside it.
+std::vector<Url> foldersBetween(const Url& top, const Url& folder) {
+    std::vector<Url> folders;
+    for (std::optional<Url> each = folder; each && *each != top;
+         each = each->deletingLastPathComponent())
+        folders.insert(folders.begin(), each->markedAsDirectory(true));
+    return folders;
+}
+
+} // namespace
+
+DocumentListController::DocumentListController(std::unique_ptr<Impl> impl)
+    : impl_(std::move(impl)) {
+    impl_->self = this;
+}
+
+DocumentListController::~DocumentListController() = default;
+
+std::shared_ptr<DocumentListController> DocumentListController::create() {
+    const std::optional<Url> root = DocumentServices::current().documents.shelfroot();
+    return root ? createForURL(*root) : nullptr;
+}
+
+std::shared_ptr<DocumentListController> DocumentListController::createForURL(const Url& folder) {
+    const DocumentServices services = DocumentServices::current();
+    const Url place = folder.standardized().markedAsDirectory(true);
+    std::shared_ptr<DocumentListController> controller(
+        new DocumentListController(std::make_unique<Impl>(place, services)));
+    controller->setTitle(titleFor(place, services.documents));
+    return controller;
+}
+
+std::optional<std::vector<std::shared_ptr<DocumentListController>>>
+DocumentListController::listControllerHierarchyForURL(const Url& folder) {
+    const CloudDocumentService& documents = DocumentServices::current().documents;
+    const std::optional<Url> root = documents.shelfroot();
+    Url wanted = folder.standardized();
+    if (!root || !documents.isInShelfroot(wanted) || !isFolder(wanted))
+        return std::nullopt;
+    std::vector<std::shared_ptr<DocumentListController>> lists{create()};
+    if (wanted == *root)
+        return lists;
+    const auto container = documents.containerForItemAtURL(wanted);
+    if (!container || !(*container)->documentsURL())
+        return std::nullopt;
+    const Url& top = *(*container)->documentsURL();
+    // A container's own folder is shown as its documents.
+    if (top.isInside(wanted))
+        wanted = top;
+    if (!wanted.isInside(top))
+        return std::nullopt;
+    lists.push_back(createForURL(top));
+    for (const Url& each : foldersBetween(top, wanted))
+        lists.push_back(createForURL(each));
+    return lists;
+}
+
+const Url& DocumentListController::presentedURL() const {
+    return impl_->model->folder();
+}
+
+std::vector<Url> DocumentListController::containedItems() const {
+    std::vector<Url> urls;
+    urls.reserve(impl_->model->count());
+    for (std::size_t i = 0; i < impl_->model->count(); ++i)
+        urls.push_back(impl_->model->urlAt(i));
+    return urls;
+}
+
+std::size_t DocumentListController::containedItemCount() const {
+    return impl_->model->count();
+}
+
+std::vector<Url> DocumentListController::selectedItems() const {
+    return impl_->urlsOf(impl_->selection().indices(*impl_->model));
+}
+
+std::size_t DocumentListController::selectedItemCount() const {
+    return impl_->selection().size();
+}
+
+void DocumentListController::setSelectedItems(const std::vector<Url>& items) {
+    std::vector<RowId> rows;
+    for (const Url& item : items)
+        if (const std::optional<std::size_t> index = impl_->model->indexOf(item))
+            rows.push_back(impl_->model->idAt(*index));
+    if (!impl_->selection().set(rows))
+        return;
+    impl_->repaint();
+    impl_->itemsChanged();
+}
+
+bool DocumentListController::isEditing() const {
+    return impl_->editing;
+}
+
+void DocumentListController::setEditing(bool editing, bool animated) {
+    impl_->setEditing(editing, animated);
+}
+
+unsigned DocumentListController::availableActions() const {
+    return impl_->actions;
+}
+
+void DocumentListController::setAvailableActions(unsigned bits) {
+    if (std::exchange(impl_->actions, bits) != bits)
+        impl_->repaint();
+}
+
+void DocumentListController::setDelegate(std::weak_ptr<DocumentListControllerDelegate> delegate) {
+    impl_->delegate = std::move(delegate);
+    // Whoever comes later than the first reading hears of it as well.
+    if (impl_->model->state() != ModelState::loading)
+        impl_->itemsChanged();
+}
+
+std::shared_ptr<DocumentListControllerDelegate> DocumentListController::delegate() const {
+    return impl_->delegate.lock();
+}
+
+std::shared_ptr<void> DocumentListController::associatedObject(const std::string& key) const {
+    const auto found = impl_->associated.find(key);
+    return found == impl_->associated.end() ? nullptr : found->second;
+}
+
+void DocumentListController::setAssociatedObject(const std::string& key,
+                                                 std::shared_ptr<void> object) {
+    impl_->associated[key] = std::move(object);
+}
+
+void DocumentListController::loadView() {
+    impl_->makeView();
+    setView(impl_->list);
+}
+
+void DocumentListController::viewWillAppear(bool animated) {
+    ViewController::viewWillAppear(animated);
+    impl_->willAppear();
+}
+
+void DocumentListController::viewDidAppear(bool animated) {
+    ViewController::viewDidAppear(animated);
+    impl_->list->takeFocus();
+}
+
+void DocumentListController::viewWillDisappear(bool animated) {
+    ViewController::viewWillDisappear(animated);
+    impl_->willDisappear();
+}
+
+bool DocumentListController::performKeyCommand(KeyCommand command) {
+    if (command == KeyCommand::find) {
+        impl_->openSearch();
+        return true;
+    }
+    return command == KeyCommand::cancel && impl_->leaveEditing();
+}
+
+} // namespace platform

@@ -1,0 +1,74 @@
+#include "platform/documents/DocumentPickerUnavailableViewController.h"
+
+#include "platform/base/Text.h"
+#include "platform/cloud/CloudAccountService.h"
+#include "platform/documents/CenteredColumn.h"
+#include "platform/documents/DocumentServices.h"
+#include "platform/ui/Theme.h"
+
+namespace platform {
+namespace {
+
+constexpr double gap = 12;
+constexpr Color commandFill = Color::hex(0xF1F3F7);
+
+} // namespace
+
+struct DocumentPickerUnavailableViewController::Content : public CenteredColumn {
+    explicit Content(const DocumentServices& theServices)
+        : services(theServices),
+          title(addText(TextStyle::title2, Theme::text, 0)),
+          cause(addText(TextStyle::body, Theme::text, gap)),
+          advice(addText(TextStyle::subheadline, Theme::secondaryText, 1.5 * gap)),
+          command(addBox(commandFill, gap)),
+          rest(addText(TextStyle::footnote, Theme::secondaryText, gap)) {
+        setBackgroundColor(Theme::page);
+        const auto cloud = std::make_shared<ImageView>();
+        cloud->setImage(Image::named("Cloud").tinted(Theme::badge));
+        cloud->setContentMode(ContentMode::aspectFit);
+        setPicture(cloud);
+        title->setText(localized("Pelmora is not enabled"));
+        advice->setText(
+            localized("Sign in to a folder that holds your documents, such as a disk or "
+                      "a network folder. In a terminal, type:"));
+        command->setText("pelmora sign-in folder PATH");
+        rest->setText(localized("PATH is that folder. The documents appear here as soon as you are "
+                                "signed in."));
+    }
+
+    void refresh() {
+        const std::optional<std::string> problem = services.accounts.problem();
+        cause->setText(problem.value_or(std::string()));
+        cause->setHidden(!problem);
+        setNeedsLayout();
+    }
+
+    DocumentServices services;
+    std::shared_ptr<Label> title;
+    std::shared_ptr<Label> cause;
+    std::shared_ptr<Label> advice;
+    std::shared_ptr<Label> command;
+    std::shared_ptr<Label> rest;
+};
+
+DocumentPickerUnavailableViewController::DocumentPickerUnavailableViewController() = default;
+DocumentPickerUnavailableViewController::~DocumentPickerUnavailableViewController() = default;
+
+void DocumentPickerUnavailableViewController::loadView() {
+    content_ = std::make_shared<Content>(DocumentServices::current());
+    setView(content_);
+    content_->refresh();
+}
+
+void DocumentPickerUnavailableViewController::viewWillAppear(bool animated) {
+    ViewController::viewWillAppear(animated);
+    content_->refresh();
+}
+
+std::shared_ptr<ViewController> makeScreenByClassName(std::string_view className) {
+    if (className == "DocumentPickerUnavailableViewController")
+        return std::make_shared<DocumentPickerUnavailableViewController>();
+    return nullptr;
+}
+
+} // namespace platform

@@ -1,0 +1,279 @@
+#include "platform/documents/ListScreen.h"
+
+#include "platform/base/Text.h"
+#include "platform/cloud/CloudDocumentService.h"
+#include "platform/cloud/CloudService.h"
+#include "platform/documents/DisplayName.h"
+#include "platform/documents/DocumentSearchController.h"
+#include "platform/documents/list/ListWidget.h"
+#include "platform/documents/list/SearchPill.h"
+#include "platform/ui/AlertController.h"
+#include "platform/ui/NavigationController.h"
+#include "platform/ui/Theme.h"
+
+namespace platform {
+namespace {
+
+/// How often an empty list looks whether the store knows all of the cloud by now.
+constexpr Duration listingCheckTime = std::chrono::seconds(1);
+
+std::shared_ptr<SearchPill> makePill(DocumentListController::Impl& screen,
+                                     const std::weak_ptr<bool>& alive) {
+    return std::make_shared<SearchPill>([&screen, alive] {
+        if (!alive.expired())
+            screen.openSearch();
+    });
+}
+
+} // namespace
+
+DocumentListController::Impl::Impl(const Url& folder, const DocumentServices& theServices)
+    : services(theServices),
+      model(std::make_shared<FolderModel>(folder, services)),
+      arrivals_(services.progress, services.mainQueue, [this](RowId row, auto share) {
+          if (!list)
+              return;
+          if (share)
+              rows().arriving[row] = *share;
+          else
+              rows().arriving.erase(row);
+          list->widget().update();
+      }) {
+    model->start();
+}
+
+DocumentListController::Impl::~Impl() {
+    if (list)
+        list->leaveClient();
+}
+
+ListState& DocumentListController::Impl::rows() const {
+    return list->widget().state();
+}
+
+void DocumentListController::Impl::makeView() {
+    list = std::make_shared<ListView>(model, *this);
+    list->setBackgroundColor(Theme::page);
+    list->setHeader(makePill(*this, alive_), SearchPill::heightWithMargins());
+    list->widget().setChangeHandlers([this] { rowsChanged(); }, [this] { updatePage(); });
+    rows().setEditing(editing, false);
+    rows().selection = early_;
+    if (model->state() == ModelState::loading)
+        loading_ = services.mainQueue.timer(Theme::loadingDelay, [this] {
+            showsLoading_ = true;
+            updatePage();
+        });
+    updatePage();
+    if (model->state() == ModelState::ready)
+        itemsChanged();
+}
+
+void DocumentListController::Impl::willAppear() {
+    model->refreshShown();
+    if (model->state() == ModelState::failed)
+        model->read();
+}
+
+void DocumentListController::Impl::willDisappear() {
+    rows().swipe.close();
+    rows().scrolling.stop();
+}
+
+RowSelection& DocumentListController::Impl::selection() {
+    return list ? rows().selection : early_;
+}
+
+void DocumentListController::Impl::repaint() {
+    if (list)
+        list->widget().update();
+}
+
+void DocumentListController::Impl::setEditing(bool value, bool animated) {
+    editing = value;
+    if (list)
+        rows().setEditing(value, animated);
+    else if (!value)
+        early_.clear();
+}
+
+void DocumentListController::Impl::rowsChanged() {
+    followArrivals();
+    updatePage();
+    itemsChanged();
+}
+
+void DocumentListController::Impl::followArrivals() {
+    arrivals_.follow(*model, rows().firstInView(), rows().endInView());
+}
+
+void DocumentListController::Impl::listDidScroll() {
+    if (!list)
+        return;
+    list->didScroll();
+    followArrivals();
+}
+
+void DocumentListController::Impl::itemsChanged() {
+    if (std::exchange(reportPending_, true))
+        return;
+    services.mainQueue.async([this, alive = std::weak_ptr(alive_)] {
+        if (alive.expired())
+            return;
+        reportPending_ = false;
+        const auto keep = self->shared_from_this();
+        if (const auto receiver = delegate.lock())
+            receiver->documentListControllerItemsChanged(*self);
+    });
+}
+
+std::vector<Url>
+DocumentListController::Impl::urlsOf(const std::vector<std::size_t>& indices) const {
+    std::vector<Url> urls;
+    urls.reserve(indices.size());
+    for (const std::size_t index : indices)
+        urls.push_back(model->urlAt(index));
+    return urls;
+}
+
+// What is done with rows
+
+void DocumentListController::Impl::listDidOpenRow(std::size_t index) {
+    const auto keep = self->shared_from_this();
+    const auto receiver = delegate.lock();
+    if (!receiver)
+        return;
+    const Url url = model->urlAt(index);
+    if (isDocument(model->entryAt(index).kind))
+        receiver->documentListControllerDidSelectItemAtURL(*self, url);
+    else
+        receiver->documentListControllerDidSelectContainerWithViewController(*self,
+                                                                             createForURL(url));
+}
+
+void DocumentListController::Impl::listDidChooseAction(int action, std::size_t index, Rect from,
+                                                       std::function<void()> done) {
+    performAction(action, model->urlAt(index), from, std::move(done));
+}
+
+void DocumentListController::Impl::performAction(int action, const Url& url, Rect from,
+                                                 std::function<void()> done) {
+    const auto keep = self->shared_from_this();
+    const auto receiver = delegate.lock();
+    if (!receiver) {
+        done();
+        return;
+    }
+    receiver->documentListControllerPerformAction(*self, action, url, list->anchorAt(from),
+                                                  std::move(done));
+}
+
+void DocumentListController::Impl::listDidAskForActions(std::size_t index, Rect from,
+                                                        std::function<void()> done) {
+    const Url url = model->urlAt(index);
+    const auto sheet = AlertController::create(displayName(model->entryAt(index).title()), {},
+                                               AlertStyle::actionSheet);
+    const auto finished = std::make_shared<std::function<void()>>(std::move(done));
+    for (const int action : offeredActions(actions)) {
+        const auto style = action == static_cast<int>(DocumentAction::remove)
+                               ? ActionStyle::destructive
+                               : ActionStyle::standard;
+        sheet->addAction(AlertAction::make(
+            actionTitle(action), style,
+            [this, alive = std::weak_ptr(alive_), action, url, from, finished](AlertAction&) {
+                if (!alive.expired())
+                    performAction(action, url, from, *finished);
+            }));
+    }
+    sheet->addAction(AlertAction::make(localized("Cancel"), ActionStyle::cancel,
+                                       [finished](AlertAction&) { (*finished)(); }));
+    const auto anchor = list->anchorAt(from);
+    sheet->setPopoverAnchor(anchor, anchor->bounds());
+    self->presentViewController(sheet, true);
+}
+
+void DocumentListController::Impl::listDidAskForRefresh(std::function<void()> done) {
+    const auto finished = std::make_shared<std::function<void()>>(std::move(done));
+    // The disk is read again whatever the cloud says, and also where there is no way to it.
+    services.cloud.refresh(
+        model->folder(),
+        [&main = services.mainQueue, weak = std::weak_ptr(model), finished](const Failure&) {
+            main.async([weak, finished] {
+                if (const auto still = weak.lock())
+                    still->read([finished] { (*finished)(); });
+            });
+        });
+}
+
+void DocumentListController::Impl::openSearch() {
+    if (editing)
+        return;
+    const auto presented =
+        std::static_pointer_cast<DocumentListController>(self->shared_from_this());
+    ViewController* const presenter = self->navigationController();
+    (presenter ? *presenter : *self)
+        .presentViewController(DocumentSearchController::create(presented), true);
+}
+
+/// As the screen's own cancel button would.
+bool DocumentListController::Impl::leaveEditing() {
+    if (!editing)
+        return false;
+    for (const BarButtonItem::Pointer& item : self->navigationItem().rightBarButtonItems())
+        if (item && item->systemItem() == SystemItem::cancel) {
+            item->perform();
+            return true;
+        }
+    return false;
+}
+
+// What stands in place of rows
+
+void DocumentListController::Impl::updatePage() {
+    if (!list)
+        return;
+    const bool listing =
+        model->state() == ModelState::ready && model->count() == 0 && storeIsStillListing();
+    if (model->state() != ModelState::loading) {
+        loading_.cancel();
+        showsLoading_ = false;
+    }
+    list->setShowsPlaceholders(showsLoading_ || listing);
+    if (listing)
+        listingCheck_ = services.mainQueue.timer(listingCheckTime, [this] { updatePage(); });
+    list->setPage(listing ? std::nullopt : pageContent(), [this] { model->read(); });
+}
+
+/// An empty folder is not known to be empty before the cloud has been looked through once.
+bool DocumentListController::Impl::storeIsStillListing() const {
+    const std::optional<CloudStatus> status = services.cloud.status();
+    return status && !status->listed && !services.accounts.problem();
+}
+
+std::optional<StatusPage::Content> DocumentListController::Impl::pageContent() const {
+    if (model->state() == ModelState::failed)
+        return failurePage(*model->error());
+    if (model->state() == ModelState::ready && model->count() == 0)
+        return emptyPage();
+    return std::nullopt;
+}
+
+StatusPage::Content DocumentListController::Impl::emptyPage() const {
+    const bool isRoot = services.documents.shelfroot() == model->folder();
+    return {StatusPage::Drawing::emptyFolder,
+            localized("No documents here"),
+            isRoot ? localized("What applications keep in the cloud appears here.")
+                   : localized("Documents that are added to this folder, here or on another "
+                               "device, appear here."),
+            {}};
+}
+
+StatusPage::Content DocumentListController::Impl::failurePage(const Error& error) const {
+    const bool gone = error.is(ErrorCode::noSuchItem);
+    std::string cause = error.localizedDescription.value_or(std::string());
+    return {StatusPage::Drawing::problem,
+            gone ? localized("This folder is no longer here")
+                 : localized("This folder cannot be shown"),
+            std::move(cause), localized("Try Again")};
+}
+
+} // namespace platform

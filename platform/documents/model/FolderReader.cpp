@@ -1,0 +1,223 @@
+#include "platform/documents/model/FolderReader.h"
+
+#include "platform/cloud/CloudDocumentService.h"
+#include "platform/cloud/Sidecar.h"
+#include "platform/documents/model/Parallel.h"
+#include "platform/files/FileManager.h"
+#include "platform/launch/TypeRegistry.h"
+
+#include <algorithm>
+#include <unordered_set>
+
+namespace platform {
+namespace {
+
+/// Beyond that, one pass over the folder is cheaper than a look at each name.
+constexpr std::size_t mostSingleLooks = 1024;
+
+bool isHidden(std::string_view name) {
+    return name.starts_with('.');
+}
+
+/// The name that a promise of this name stands for, unless its mark says otherwise.
+std::string plainNameOf(std::string_view sidecar) {
+    return promisedName(sidecar, {});
+}
+
+EntryKind kindOf(FileKind kind, std::string_view name) {
+    if (kind != FileKind::directory)
+        return EntryKind::file;
+    return TypeRegistry::isPackageName(name) ? EntryKind::package : EntryKind::folder;
+}
+
+} // namespace
+
+struct FolderReader::Names {
+    std::vector<DirectoryEntry> plain;
+    std::vector<std::string> sidecars;
+};
+
+FolderReader::FolderReader(Url folder, const CloudDocumentService& documents)
+    : folder_(std::move(folder)), documents_(documents) {
+}
+
+Result<FolderReader::Names> FolderReader::readNames(const CancelFlag& cancel) const {
+    Names names;
+    const Failure failure =
+        FileManager::enumerate(folder_.path(), [&](const DirectoryEntry& entry) {
+            if (!isHidden(entry.name))
+                names.plain.push_back(entry);
+            else if (hasSidecarForm(entry.name))
+                names.sidecars.push_back(entry.name);
+            return !cancel.isCancelled();
+        });
+    if (failure)
+        return *failure;
+    return names;
+}
+
+Result<std::vector<DocumentEntry>> FolderReader::readAll(const CancelFlag& cancel) {
+    Result<Names> names = readNames(cancel);
+    if (!names)
+        return names.error();
+    std::vector<DocumentEntry> entries;
+    entries.reserve(names->plain.size() + names->sidecars.size());
+    for (const DirectoryEntry& found : names->plain)
+        entries.push_back(entryFor(found));
+    shortened_.clear();
+    if (!names->sidecars.empty())
+        addPromises(*names, entries, cancel);
+    return entries;
+}
+
+void FolderReader::addPromises(const Names& names, std::vector<DocumentEntry>& entries,
+                               const CancelFlag& cancel) {
+    // Each mark is a system call on a file of its own, which is most of the work for a store whose
+    // contents are still in the cloud.
+    const std::size_t count = names.sidecars.size();
+    std::vector<std::optional<std::string>> promised(count);
+    const std::size_t pieces = parallelPieces(count);
+    inParallel(pieces, [&](std::size_t piece) {
+        const std::size_t end = count * (piece + 1) / pieces;
+        for (std::size_t i = count * piece / pieces; i < end && !cancel.isCancelled(); ++i)
+            promised[i] = promisedBy(names.sidecars[i]);
+    });
+    // A document that has arrived a moment ago may have its promise still beside it.
+    std::unordered_set<std::string_view> present;
+    for (const DirectoryEntry& each : names.plain)
+        present.insert(each.name);
+    for (std::size_t i = 0; i < count; ++i) {
+        const std::string& sidecar = names.sidecars[i];
+        if (!promised[i])
+            entries.push_back({sidecar, EntryKind::file, false, nullptr});
+        else if (!isHidden(*promised[i]) && !present.contains(*promised[i]))
+            entries.push_back({*promised[i], EntryKind::file, true, nullptr});
+        if (promised[i] && *promised[i] != plainNameOf(sidecar))
+            shortened_.emplace(sidecar, *promised[i]);
+    }
+}
+
+std::optional<std::string> FolderReader::promisedBy(const std::string& sidecar) const {
+    const std::optional<Url> document = documents_.logicalURLOfPromise(folder_.appending(sidecar));
+    if (!document)
+        return std::nullopt;
+    return std::string(document->lastPathComponent());
+}
+
+DocumentEntry FolderReader::entryFor(const DirectoryEntry& found) const {
+    FileKind kind = found.kind;
+    if (kind == FileKind::symbolicLink || kind == FileKind::other) {
+        // A link is what it leads to; one that leads nowhere is a document that cannot be opened.
+        const auto attributes =
+            FileManager::attributes(folder_.appending(found.name).path(), FollowLinks::yes);
+        kind = attributes ? attributes->kind : FileKind::file;
+    }
+    return {found.name, kindOf(kind, found.name), false, nullptr};
+}
+
+/// What stands under a name now, whichever notice led to it.
+EntryFact FolderReader::factFor(const std::string& name) const {
+    EntryFact fact{{name, EntryKind::file, false, nullptr}, false};
+    const Url url = folder_.appending(name);
+    const auto attributes = FileManager::attributes(url.path(), FollowLinks::no);
+    if (isHidden(name)) {
+        fact.present = hasSidecarForm(name) && attributes && !documents_.isPromiseAtURL(url);
+    } else if (attributes) {
+        fact = {entryFor({name, attributes->kind}), true};
+    } else if (documents_.isPromised(url)) {
+        fact.entry.promised = true;
+        fact.present = true;
+    }
+    return fact;
+}
+
+/// Gathers the names that a list shows of what notices tell of files on the disk.
+class FolderReader::Notices {
+public:
+    explicit Notices(FolderReader& reader) : reader_(reader) {}
+
+    void take(const DirectoryChange& change) {
+        const std::optional<std::string> shown = shownName(change.name);
+        if (change.kind == DirectoryChange::Kind::movedFrom && shown) {
+            from_ = Half{change.cookie, *shown};
+        } else if (change.kind == DirectoryChange::Kind::movedTo && shown && from_ &&
+                   from_->cookie == change.cookie && from_->name != *shown) {
+            renamings.push_back({from_->name, *shown});
+            from_.reset();
+        }
+    }
+
+    std::vector<EntryRenaming> renamings;
+    std::vector<std::string> names;
+
+private:
+    struct Half {
+        std::uint32_t cookie;
+        std::string name;
+    };
+
+    void add(std::string name) {
+        if (seen_.insert(name).second)
+            names.push_back(std::move(name));
+    }
+
+    /// The name under which the file's row stands, or stood.
+    std::optional<std::string> shownName(const std::string& file) {
+        if (!isHidden(file)) {
+            add(file);
+            return file;
+        }
+        if (!hasSidecarForm(file))
+            return std::nullopt;
+        add(file);
+        std::string document = plainNameOf(file);
+        if (const auto known = reader_.shortened_.find(file); known != reader_.shortened_.end())
+            document = known->second;
+        if (const std::optional<std::string> now = reader_.promisedBy(file)) {
+            if (*now != document) {
+                add(document);
+                document = *now;
+                reader_.shortened_[file] = *now;
+            }
+        }
+        add(document);
+        return document;
+    }
+
+    FolderReader& reader_;
+    std::optional<Half> from_;
+    std::unordered_set<std::string> seen_;
+};
+
+std::optional<EntryChanges> FolderReader::resolve(const std::vector<DirectoryChange>& changes) {
+    Notices notices(*this);
+    for (const DirectoryChange& change : changes) {
+        if (change.kind == DirectoryChange::Kind::overflow ||
+            notices.names.size() > mostSingleLooks)
+            return std::nullopt;
+        if (!change.name.empty())
+            notices.take(change);
+    }
+    EntryChanges result{std::move(notices.renamings), {}};
+    result.facts.reserve(notices.names.size());
+    for (const std::string& name : notices.names)
+        result.facts.push_back(factFor(name));
+    return result;
+}
+
+std::optional<std::size_t> FolderReader::count(const Url& folder,
+                                               const CloudDocumentService& documents,
+                                               const CancelFlag& cancel) {
+    FolderReader reader(folder, documents);
+    const Result<Names> names = reader.readNames(cancel);
+    if (!names || cancel.isCancelled())
+        return std::nullopt;
+    if (names->sidecars.empty())
+        return names->plain.size();
+    const Result<std::vector<DocumentEntry>> entries = reader.readAll(cancel);
+    if (!entries || cancel.isCancelled())
+        return std::nullopt;
+    return entries->size();
+}
+
+} // namespace platform

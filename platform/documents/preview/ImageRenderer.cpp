@@ -1,0 +1,160 @@
+#include "platform/base/Text.h"
+#include "platform/documents/DisplayName.h"
+#include "platform/documents/preview/PreviewKinds.h"
+#include "platform/documents/preview/PreviewWorker.h"
+#include "platform/documents/preview/ZoomWidget.h"
+#include "platform/launch/TypeRegistry.h"
+#include "platform/ui/qt/Bridge.h"
+
+#include <QImageReader>
+#include <QPainter>
+
+#include <cmath>
+#include <vector>
+
+namespace platform {
+namespace {
+
+/// A picture with more pixels is read smaller: that many take 128 MB, and no screen has more.
+constexpr double mostPixels = 32e6;
+constexpr int smallestLevel = 512;
+
+/// The picture and its halves, quarters and so on: drawing from the nearest one is fast and smooth.
+struct Pyramid {
+    /// As the file has it, after turning it upright.
+    QSize fullSize;
+    std::vector<QImage> levels;
+};
+
+Pyramid buildPyramid(QImage image, QSize fullSize) {
+    Pyramid pyramid{fullSize, {}};
+    pyramid.levels.push_back(std::move(image).convertToFormat(QImage::Format_ARGB32_Premultiplied));
+    while (std::max(pyramid.levels.back().width(), pyramid.levels.back().height()) >
+           2 * smallestLevel) {
+        const QImage& last = pyramid.levels.back();
+        pyramid.levels.push_back(last.scaled(std::max(1, last.width() / 2),
+                                             std::max(1, last.height() / 2), Qt::IgnoreAspectRatio,
+                                             Qt::SmoothTransformation));
+    }
+    return pyramid;
+}
+
+class PictureContent final : public ZoomContent {
+public:
+    void set(Pyramid pyramid) { pyramid_ = std::move(pyramid); }
+    bool isEmpty() const { return pyramid_.levels.empty(); }
+
+    QSizeF contentSize() const override { return pyramid_.fullSize; }
+
+    void paintContent(QPainter& painter, const QRectF& visible, double zoom) override {
+        if (pyramid_.levels.empty())
+            return;
+        const double pixels = zoom * painter.device()->devicePixelRatioF();
+        const QImage* level = &pyramid_.levels.front();
+        for (const QImage& each : pyramid_.levels)
+            if (each.width() >= pyramid_.fullSize.width() * pixels)
+                level = &each;
+        const double scale = level->width() / static_cast<double>(pyramid_.fullSize.width());
+        const QRectF part(visible.topLeft() * scale, visible.size() * scale);
+        // Single pixels of a much enlarged picture are what one wants to see.
+        painter.setRenderHint(QPainter::SmoothPixmapTransform, pixels < 4);
+        painter.drawImage(visible, *level, part);
+    }
+
+private:
+    Pyramid pyramid_;
+};
+
+class ImageRenderer final : public PreviewRenderer {
+public:
+    ImageRenderer(MainQueue& main, PreviewReports reports)
+        : reports_(std::move(reports)), worker_(main) {
+        auto content = std::make_unique<PictureContent>();
+        content_ = content.get();
+        auto widget = std::make_unique<ZoomWidget>(
+            std::move(content), ZoomWidget::Settings{ZoomWidget::Fit::whole, 0, true, 8});
+        widget_ = widget.get();
+        view_ = std::make_shared<WidgetView>(std::move(widget));
+    }
+
+    std::shared_ptr<View> view() override { return view_; }
+
+    void load(const Url& file) override {
+        file_ = file;
+        view_->setAccessibleName(
+            localizedFormat("Picture “%1$@”", displayName(file.lastPathComponent())));
+        read();
+    }
+
+    void reload() override { read(); }
+
+    std::optional<std::function<void(double)>> zoom() override {
+        return [this](double factor) { widget_->zoomBy(factor); };
+    }
+
+private:
+    void read() {
+        worker_.cancel();
+        worker_.run([this, file = file_](PreviewToken& token) -> Job {
+            const auto pyramid = std::make_shared<Pyramid>();
+            const Failure failure = readDocument(
+                file, token, [&](const std::string& path) { return decode(file, path, *pyramid); });
+            return [this, pyramid, failure] { take(std::move(*pyramid), failure); };
+        });
+    }
+
+    static Failure decode(const Url& file, const std::string& path, Pyramid& into) {
+        QImageReader reader(QString::fromStdString(path));
+        // The content says what it is: a picture with a wrong extension still is one.
+        reader.setDecideFormatFromContent(true);
+        reader.setAutoTransform(true);
+        QSize size = reader.size();
+        const double pixels = static_cast<double>(size.width()) * size.height();
+        if (pixels > mostPixels)
+            reader.setScaledSize(size * std::sqrt(mostPixels / pixels));
+        QImage image = reader.read();
+        if (image.isNull())
+            return damagedDocument(file, reader.errorString().toStdString());
+        const bool turned =
+            reader.transformation().testFlag(QImageIOHandler::TransformationRotate90);
+        if (turned)
+            size.transpose();
+        into = buildPyramid(std::move(image), size);
+        if (size.isEmpty())
+            into.fullSize = into.levels.front().size();
+        return std::nullopt;
+    }
+
+    void take(Pyramid pyramid, const Failure& failure) {
+        if (failure) {
+            reports_.failed(*failure);
+            return;
+        }
+        content_->set(std::move(pyramid));
+        widget_->contentChanged();
+        reports_.shown();
+    }
+
+    PreviewReports reports_;
+    Url file_;
+    PictureContent* content_ = nullptr;
+    ZoomWidget* widget_ = nullptr;
+    std::shared_ptr<View> view_;
+    PreviewWorker worker_;
+};
+
+bool readsType(std::string_view identifier) {
+    if (!TypeRegistry::conformsTo(identifier, types::image))
+        return false;
+    const std::string mime = TypeRegistry::mimeTypeForIdentifier(identifier);
+    return QImageReader::supportedMimeTypes().contains(QByteArray::fromStdString(mime));
+}
+
+} // namespace
+
+const PreviewKind imagePreview{
+    &readsType, [](MainQueue& main, PreviewReports reports) -> std::unique_ptr<PreviewRenderer> {
+        return std::make_unique<ImageRenderer>(main, std::move(reports));
+    }};
+
+} // namespace platform

@@ -1,0 +1,33 @@
+#pragma once
+
+#include "platform/base/Result.h"
+#include "platform/base/Url.h"
+
+#include <QImage>
+#include <QSizeF>
+
+#include <memory>
+#include <string>
+#include <vector>
+
+class QPdfDocument;
+
+namespace platform {
+
+/// An open PDF. Made, used and destroyed on one queue.
+class PdfFile {
+public:
+    PdfFile();
+    ~PdfFile();
+
+    Failure open(const Url& file, const std::string& path);
+    /// In points.
+    std::vector<QSizeF> pageSizes() const;
+    /// The page on white, that many pixels wide.
+    QImage render(int page, int width) const;
+
+private:
+    std::unique_ptr<QPdfDocument> document_;
+};
+
+} // namespace platform

@@ -1,0 +1,11 @@
+#pragma once
+
+#include "platform/documents/preview/PreviewRenderer.h"
+
+namespace platform {
+
+extern const PreviewKind imagePreview;
+extern const PreviewKind pdfPreview;
+extern const PreviewKind textPreview;
+
+} // namespace platform

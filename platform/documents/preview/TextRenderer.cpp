@@ -1,0 +1,113 @@
+#include "platform/documents/DisplayName.h"
+#include "platform/documents/preview/PreviewKinds.h"
+#include "platform/documents/preview/PreviewWorker.h"
+#include "platform/documents/preview/TextWidget.h"
+#include "platform/launch/TypeRegistry.h"
+#include "platform/ui/qt/Bridge.h"
+
+#include <optional>
+
+namespace platform {
+namespace {
+
+/// The open file; of the worker's queue alone.
+struct TextSlot {
+    std::optional<TextFile> file;
+};
+
+/// Plain text of any length: windows of it are read as one comes near them.
+class TextRenderer final : public PreviewRenderer {
+public:
+    TextRenderer(MainQueue& main, PreviewReports reports)
+        : reports_(std::move(reports)), worker_(main) {
+        auto widget = std::make_unique<TextWidget>(TextWidget::Wishes{
+            [this](std::uint64_t offset) {
+                read([offset](const TextFile& file) { return file.linesFrom(offset); },
+                     [this](auto lines) { widget_->appendLines(std::move(lines)); });
+            },
+            [this](std::uint64_t offset) {
+                read([offset](const TextFile& file) { return file.linesBefore(offset); },
+                     [this](auto lines) { widget_->prependLines(std::move(lines)); });
+            },
+            [this](std::uint64_t offset) { show(offset); }});
+        widget_ = widget.get();
+        view_ = std::make_shared<WidgetView>(std::move(widget));
+    }
+
+    std::shared_ptr<View> view() override { return view_; }
+
+    void load(const Url& file) override {
+        file_ = file;
+        view_->setAccessibleName(displayName(file.lastPathComponent()));
+        open(0);
+    }
+
+    void reload() override { open(widget_->topOffset()); }
+
+    std::optional<std::function<void(double)>> zoom() override {
+        return [this](double factor) { widget_->zoomBy(factor); };
+    }
+
+private:
+    using Lines = std::vector<TextLine>;
+
+    void open(std::uint64_t top) {
+        worker_.cancel();
+        worker_.run([this, file = file_, slot = slot_, top](PreviewToken& token) -> Job {
+            slot->file.reset();
+            const Failure failure = readDocument(file, token, [&](const std::string& path) {
+                Result<TextFile> text = TextFile::open(file, path);
+                if (!text)
+                    return Failure(text.error());
+                slot->file.emplace(std::move(*text));
+                return Failure();
+            });
+            return [this, failure, top] {
+                if (failure) {
+                    reports_.failed(*failure);
+                    return;
+                }
+                reports_.shown();
+                show(top);
+            };
+        });
+    }
+
+    void show(std::uint64_t place) {
+        worker_.run([this, slot = slot_, place](PreviewToken&) -> Job {
+            if (!slot->file)
+                return {};
+            const auto lines = std::make_shared<Lines>(slot->file->linesAround(place));
+            return [this, lines, place, start = slot->file->start(), size = slot->file->size()] {
+                widget_->setLines(std::move(*lines), start, size, place);
+            };
+        });
+    }
+
+    void read(std::function<Lines(const TextFile&)> what, std::function<void(Lines)> take) {
+        worker_.run(
+            [slot = slot_, what = std::move(what), take = std::move(take)](PreviewToken&) -> Job {
+                if (!slot->file)
+                    return {};
+                const auto lines = std::make_shared<Lines>(what(*slot->file));
+                return [lines, take] { take(std::move(*lines)); };
+            });
+    }
+
+    PreviewReports reports_;
+    Url file_;
+    const std::shared_ptr<TextSlot> slot_ = std::make_shared<TextSlot>();
+    TextWidget* widget_ = nullptr;
+    std::shared_ptr<View> view_;
+    PreviewWorker worker_;
+};
+
+} // namespace
+
+const PreviewKind textPreview{
+    [](std::string_view identifier) { return TypeRegistry::conformsTo(identifier, types::text); },
+    [](MainQueue& main, PreviewReports reports) -> std::unique_ptr<PreviewRenderer> {
+        return std::make_unique<TextRenderer>(main, std::move(reports));
+    }};
+
+} // namespace platform

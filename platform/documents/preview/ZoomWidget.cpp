@@ -1,0 +1,312 @@
+#include "platform/documents/preview/ZoomWidget.h"
+
+#include "platform/base/Runtime.h"
+
+#include <QKeyEvent>
+#include <QMouseEvent>
+#include <QNativeGestureEvent>
+#include <QPainter>
+#include <QTouchEvent>
+#include <QWheelEvent>
+
+#include <algorithm>
+#include <cmath>
+
+namespace platform {
+namespace {
+
+constexpr double notch = 120;
+constexpr double zoomPerNotch = 1.2;
+constexpr double stepPerNotch = 80;
+constexpr double keyStep = 60;
+constexpr double doubleTapZoom = 2.5;
+constexpr double slop = 10;
+constexpr Duration doubleTapTime = std::chrono::milliseconds(350);
+constexpr double doubleTapReach = 40;
+
+Point fromQt(QPointF point) {
+    return {point.x(), point.y()};
+}
+
+double distanceOf(const QTouchEvent& event) {
+    const QPointF way = event.points()[1].position() - event.points()[0].position();
+    return std::max(1.0, std::hypot(way.x(), way.y()));
+}
+
+QPointF middleOf(const QTouchEvent& event) {
+    return (event.points()[0].position() + event.points()[1].position()) / 2;
+}
+
+} // namespace
+
+ZoomWidget::ZoomWidget(std::unique_ptr<ZoomContent> content, const Settings& settings)
+    : content_(std::move(content)), settings_(settings), flinger_([this](Point stretch) {
+          return moveBy({stretch.x, stretch.y});
+      }) {
+    setFocusPolicy(Qt::StrongFocus);
+    setAttribute(Qt::WA_AcceptTouchEvents);
+    setAttribute(Qt::WA_OpaquePaintEvent, false);
+}
+
+ZoomWidget::~ZoomWidget() = default;
+
+QRectF ZoomWidget::visibleRect() const {
+    const QRectF seen(toContent({0, 0}), QSizeF(width(), height()) / zoom_);
+    return seen.intersected(QRectF(QPointF(), content_->contentSize()));
+}
+
+double ZoomWidget::fittingZoom() const {
+    const QSizeF size = content_->contentSize();
+    const double room = std::max(1.0, width() - 2 * settings_.margin);
+    if (size.isEmpty())
+        return 1;
+    if (settings_.fit == Fit::width)
+        return room / size.width();
+    const double high = std::max(1.0, height() - 2 * settings_.margin);
+    return std::min({1.0, room / size.width(), high / size.height()});
+}
+
+double ZoomWidget::clampedZoom(double zoom) const {
+    const double fitting = fittingZoom();
+    return std::clamp(zoom, std::min(fitting, 1.0), std::max(settings_.largestZoom, fitting));
+}
+
+QPointF ZoomWidget::toContent(QPointF point) const {
+    return (point - origin_) / zoom_;
+}
+
+void ZoomWidget::zoomBy(double factor) {
+    zoomAround(zoom_ * factor, rect().center());
+}
+
+void ZoomWidget::zoomAround(double zoom, QPointF point) {
+    const QPointF content = toContent(point);
+    zoom_ = clampedZoom(zoom);
+    fitted_ = std::abs(zoom_ - fittingZoom()) < 1e-9;
+    origin_ = point - content * zoom_;
+    place();
+    changed();
+}
+
+void ZoomWidget::toggleZoom(QPointF point) {
+    const double fitting = fittingZoom();
+    zoomAround(zoom_ > fitting * 1.05 ? fitting : fitting * doubleTapZoom, point);
+}
+
+void ZoomWidget::fitAgain() {
+    zoomAround(fittingZoom(), rect().center());
+}
+
+void ZoomWidget::contentChanged() {
+    if (fitted_)
+        zoom_ = fittingZoom();
+    place();
+    changed();
+}
+
+bool ZoomWidget::moveBy(QPointF distance) {
+    const QPointF wanted = origin_ + distance;
+    origin_ = wanted;
+    place();
+    changed();
+    return (origin_ - wanted).manhattanLength() < std::max(1.0, distance.manhattanLength());
+}
+
+/// What is smaller than the view stands in its middle; what is larger leaves no gap at an edge.
+void ZoomWidget::place() {
+    const QSizeF size = content_->contentSize() * zoom_;
+    const auto along = [&](double origin, double length, double room, bool centred) {
+        const double free = room - length;
+        if (free >= 2 * settings_.margin)
+            return centred ? free / 2 : settings_.margin;
+        return std::clamp(origin, free - settings_.margin, settings_.margin);
+    };
+    origin_ = {along(origin_.x(), size.width(), width(), true),
+               along(origin_.y(), size.height(), height(), settings_.fit == Fit::whole)};
+}
+
+void ZoomWidget::changed() {
+    update();
+    if (moved_)
+        moved_();
+}
+
+void ZoomWidget::paintEvent(QPaintEvent* /*event*/) {
+    QPainter painter(this);
+    painter.setRenderHint(QPainter::SmoothPixmapTransform);
+    painter.translate(origin_);
+    painter.scale(zoom_, zoom_);
+    content_->paintContent(painter, visibleRect(), zoom_);
+}
+
+void ZoomWidget::resizeEvent(QResizeEvent* event) {
+    QWidget::resizeEvent(event);
+    contentChanged();
+}
+
+bool ZoomWidget::event(QEvent* event) {
+    switch (event->type()) {
+    case QEvent::TouchBegin:
+    case QEvent::TouchUpdate:
+    case QEvent::TouchEnd:
+    case QEvent::TouchCancel:
+        return touch(static_cast<QTouchEvent&>(*event));
+    case QEvent::NativeGesture: {
+        const auto& gesture = static_cast<QNativeGestureEvent&>(*event);
+        if (gesture.gestureType() != Qt::ZoomNativeGesture)
+            return QWidget::event(event);
+        zoomAround(zoom_ * (1 + gesture.value()), gesture.position());
+        return true;
+    }
+    default:
+        return QWidget::event(event);
+    }
+}
+
+bool ZoomWidget::touch(QTouchEvent& event) {
+    event.accept();
+    if (event.points().size() >= 2 && event.type() != QEvent::TouchEnd) {
+        pinch(event);
+        return true;
+    }
+    const bool over = event.type() == QEvent::TouchEnd || event.type() == QEvent::TouchCancel;
+    const bool pinched = pinch_.has_value();
+    if (pinched && event.type() != QEvent::TouchBegin) {
+        if (over)
+            pinch_.reset();
+        return true;
+    }
+    const QPointF at = event.points().isEmpty() ? QPointF() : event.points()[0].position();
+    if (event.type() == QEvent::TouchBegin) {
+        flinger_.stop();
+        flinger_.forget();
+        dragged_ = tap_ = at;
+    } else if (dragged_) {
+        moveBy(at - *dragged_);
+        dragged_ = at;
+        if (tap_ && (at - *tap_).manhattanLength() > slop)
+            tap_.reset();
+    }
+    flinger_.track(fromQt(at));
+    if (!over)
+        return true;
+    dragged_.reset();
+    if (event.type() == QEvent::TouchCancel)
+        return true;
+    if (!tap_)
+        flinger_.release();
+    else if (tappedTwice(at))
+        toggleZoom(at);
+    return true;
+}
+
+void ZoomWidget::pinch(const QTouchEvent& event) {
+    dragged_.reset();
+    tap_.reset();
+    const QPointF middle = middleOf(event);
+    if (!pinch_) {
+        pinch_ = Pinch{distanceOf(event), zoom_, toContent(middle)};
+        return;
+    }
+    zoom_ = clampedZoom(pinch_->zoom * distanceOf(event) / pinch_->distance);
+    fitted_ = false;
+    origin_ = middle - pinch_->content * zoom_;
+    place();
+    changed();
+}
+
+bool ZoomWidget::tappedTwice(QPointF point) {
+    const Duration now = Runtime::current().clock.monotonic();
+    const auto former = std::exchange(lastTap_, std::pair(now, point));
+    const bool twice = former && now - former->first < doubleTapTime &&
+                       (point - former->second).manhattanLength() < doubleTapReach;
+    if (twice)
+        lastTap_.reset();
+    return twice;
+}
+
+void ZoomWidget::mousePressEvent(QMouseEvent* event) {
+    if (event->button() != Qt::LeftButton)
+        return;
+    flinger_.stop();
+    flinger_.forget();
+    dragged_ = event->position();
+}
+
+void ZoomWidget::mouseMoveEvent(QMouseEvent* event) {
+    if (!dragged_ || !event->buttons().testFlag(Qt::LeftButton))
+        return;
+    moveBy(event->position() - *dragged_);
+    dragged_ = event->position();
+    flinger_.track(fromQt(event->position()));
+}
+
+void ZoomWidget::mouseReleaseEvent(QMouseEvent* event) {
+    if (event->button() != Qt::LeftButton || !dragged_)
+        return;
+    dragged_.reset();
+    flinger_.release();
+}
+
+void ZoomWidget::mouseDoubleClickEvent(QMouseEvent* event) {
+    if (event->button() == Qt::LeftButton)
+        toggleZoom(event->position());
+}
+
+void ZoomWidget::wheelEvent(QWheelEvent* event) {
+    event->accept();
+    flinger_.stop();
+    const double notches = event->angleDelta().y() / notch;
+    if (settings_.wheelZooms || event->modifiers().testFlag(Qt::ControlModifier)) {
+        zoomAround(zoom_ * std::pow(zoomPerNotch, notches), event->position());
+        return;
+    }
+    const QPointF pixels = event->pixelDelta();
+    const QPointF turned = QPointF(event->angleDelta()) / notch * stepPerNotch;
+    moveBy(pixels.isNull() ? turned : pixels);
+}
+
+void ZoomWidget::keyPressEvent(QKeyEvent* event) {
+    const double page = std::max(keyStep, height() - keyStep);
+    switch (event->key()) {
+    case Qt::Key_Plus:
+    case Qt::Key_Equal:
+        zoomBy(zoomPerNotch);
+        break;
+    case Qt::Key_Minus:
+        zoomBy(1 / zoomPerNotch);
+        break;
+    case Qt::Key_0:
+        fitAgain();
+        break;
+    case Qt::Key_Down:
+        moveBy({0, -keyStep});
+        break;
+    case Qt::Key_Up:
+        moveBy({0, keyStep});
+        break;
+    case Qt::Key_Right:
+        moveBy({-keyStep, 0});
+        break;
+    case Qt::Key_Left:
+        moveBy({keyStep, 0});
+        break;
+    case Qt::Key_PageDown:
+    case Qt::Key_Space:
+        moveBy({0, -page});
+        break;
+    case Qt::Key_PageUp:
+        moveBy({0, page});
+        break;
+    case Qt::Key_Home:
+        moveBy({0, 1e12});
+        break;
+    case Qt::Key_End:
+        moveBy({0, -1e12});
+        break;
+    default:
+        QWidget::keyPressEvent(event);
+    }
+}
+
+} // namespace platform

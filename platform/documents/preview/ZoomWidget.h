@@ -1,0 +1,104 @@
+#pragma once
+
+#include "platform/documents/preview/Flinger.h"
+
+#include <QRectF>
+#include <QWidget>
+
+#include <functional>
+#include <memory>
+#include <optional>
+
+class QTouchEvent;
+
+namespace platform {
+
+/// What can be looked at through a ZoomWidget. Its measures are points at a zoom of 1.
+class ZoomContent {
+public:
+    virtual ~ZoomContent() = default;
+    virtual QSizeF contentSize() const = 0;
+    /// Paints the part `visible`; the painter draws in the content's measures.
+    virtual void paintContent(QPainter& painter, const QRectF& visible, double zoom) = 0;
+};
+
+/// A view through which one sees a part of something larger: drags and flings, wheel, keys, pinch,
+/// double tap. Keeps the content fitted until somebody zooms.
+class ZoomWidget : public QWidget {
+public:
+    enum class Fit {
+        /// All of it is in view, and nothing is drawn larger than it is.
+        whole,
+        /// As wide as the view.
+        width
+    };
+    struct Settings {
+        Fit fit = Fit::whole;
+        /// Around the content, in points of the view.
+        double margin = 0;
+        /// A wheel makes larger and smaller; else it scrolls, and Ctrl makes it zoom.
+        bool wheelZooms = false;
+        /// Pixels of the content that one zooms in to at most, for each point of the view.
+        double largestZoom = 8;
+    };
+
+    ZoomWidget(std::unique_ptr<ZoomContent> content, const Settings& settings);
+    ~ZoomWidget() override;
+
+    ZoomContent& content() const { return *content_; }
+    double zoom() const { return zoom_; }
+    /// The part of the content that is in view.
+    QRectF visibleRect() const;
+    void zoomBy(double factor);
+    /// The content has another size now; the same share of it stays in view.
+    void contentChanged();
+    /// Called after every change of what is in view.
+    void setMovedHandler(std::function<void()> moved) { moved_ = std::move(moved); }
+
+protected:
+    bool event(QEvent* event) override;
+    void paintEvent(QPaintEvent* event) override;
+    void resizeEvent(QResizeEvent* event) override;
+    void mousePressEvent(QMouseEvent* event) override;
+    void mouseMoveEvent(QMouseEvent* event) override;
+    void mouseReleaseEvent(QMouseEvent* event) override;
+    void mouseDoubleClickEvent(QMouseEvent* event) override;
+    void wheelEvent(QWheelEvent* event) override;
+    void keyPressEvent(QKeyEvent* event) override;
+
+private:
+    struct Pinch {
+        double distance;
+        double zoom;
+        QPointF content;
+    };
+
+    double fittingZoom() const;
+    double clampedZoom(double zoom) const;
+    QPointF toContent(QPointF point) const;
+    void zoomAround(double zoom, QPointF point);
+    void toggleZoom(QPointF point);
+    void fitAgain();
+    /// Keeps the content in the view; answers whether all of the way was free.
+    bool moveBy(QPointF distance);
+    void place();
+    bool touch(QTouchEvent& event);
+    void pinch(const QTouchEvent& event);
+    bool tappedTwice(QPointF point);
+    void changed();
+
+    std::unique_ptr<ZoomContent> content_;
+    const Settings settings_;
+    double zoom_ = 1;
+    /// Of the content, in the view.
+    QPointF origin_;
+    bool fitted_ = true;
+    std::optional<QPointF> dragged_;
+    std::optional<Pinch> pinch_;
+    std::optional<QPointF> tap_;
+    std::optional<std::pair<Duration, QPointF>> lastTap_;
+    Flinger flinger_;
+    std::function<void()> moved_;
+};
+
+} // namespace platform

@@ -1,0 +1,89 @@
+#include "tests/documents/SampleDocuments.h"
+
+#include <QBuffer>
+#include <QImageWriter>
+#include <QLinearGradient>
+#include <QPainter>
+#include <QPdfWriter>
+
+namespace test {
+namespace {
+
+QImage landscape(int width, int height) {
+    QImage image(width, height, QImage::Format_RGB32);
+    QPainter painter(&image);
+    QLinearGradient sky(0, 0, 0, height * 0.6);
+    sky.setColorAt(0, QColor(70, 130, 200));
+    sky.setColorAt(1, QColor(230, 220, 200));
+    painter.fillRect(image.rect(), sky);
+    painter.setRenderHint(QPainter::Antialiasing);
+    painter.setPen(Qt::NoPen);
+    painter.setBrush(QColor(250, 230, 120));
+    painter.drawEllipse(QPointF(width * 0.75, height * 0.25), height * 0.08, height * 0.08);
+    painter.setBrush(QColor(90, 140, 70));
+    painter.drawEllipse(QPointF(width * 0.3, height * 1.1), width * 0.6, height * 0.5);
+    painter.setBrush(QColor(60, 110, 60));
+    painter.drawEllipse(QPointF(width * 0.8, height * 1.15), width * 0.6, height * 0.5);
+    return image;
+}
+
+std::string encoded(const QImage& image, const char* format,
+                    QImageIOHandler::Transformations transformation) {
+    QBuffer buffer;
+    buffer.open(QIODevice::WriteOnly);
+    QImageWriter writer(&buffer, format);
+    writer.setTransformation(transformation);
+    writer.write(image);
+    return buffer.data().toStdString();
+}
+
+} // namespace
+
+std::string turnedPhoto(int width, int height) {
+    const QImage lying = landscape(width, height).transformed(QTransform().rotate(-90));
+    return encoded(lying, "jpeg", QImageIOHandler::TransformationRotate90);
+}
+
+std::string pngPicture(int width, int height) {
+    return encoded(landscape(width, height), "png", QImageIOHandler::TransformationNone);
+}
+
+std::string pdfOfPages(int pages) {
+    QBuffer buffer;
+    buffer.open(QIODevice::WriteOnly);
+    QPdfWriter writer(&buffer);
+    writer.setPageSize(QPageSize(QPageSize::A4));
+    writer.setResolution(72);
+    QPainter painter(&writer);
+    for (int page = 0; page < pages; ++page) {
+        if (page > 0)
+            writer.newPage();
+        QFont font = painter.font();
+        font.setPixelSize(28);
+        painter.setFont(font);
+        painter.drawText(QRectF(20, 20, 400, 60), QStringLiteral("Page %1").arg(page + 1));
+        font.setPixelSize(12);
+        painter.setFont(font);
+        for (int line = 0; line < 40; ++line)
+            painter.drawText(QPointF(20, 110 + line * 16),
+                             QStringLiteral("The quarter closed with a result above the plan; "
+                                            "line %1 says so as well.")
+                                 .arg(line + 1));
+    }
+    painter.end();
+    return buffer.data().toStdString();
+}
+
+std::string longText(int lines) {
+    std::string text;
+    for (int i = 1; i <= lines; ++i) {
+        text += "Line " + std::to_string(i);
+        if (i % 7 == 0)
+            text += " goes on for a good while, so that it has to be wrapped, at least where the "
+                    "window is as narrow as that of a phone";
+        text += '\n';
+    }
+    return text;
+}
+
+} // namespace test

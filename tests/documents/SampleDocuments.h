@@ -1,0 +1,16 @@
+#pragma once
+
+#include <string>
+
+namespace test {
+
+/// A JPEG whose pixels lie on their side, with the mark that tells so. Upright it is `width` wide:
+/// sky above, meadow below.
+std::string turnedPhoto(int width, int height);
+std::string pngPicture(int width, int height);
+/// A PDF of A4 pages that bear their numbers.
+std::string pdfOfPages(int pages);
+/// Numbered lines, some of them long.
+std::string longText(int lines);
+
+} // namespace test
