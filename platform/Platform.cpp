@@ -1,13 +1,17 @@
 #include "platform/Platform.h"
 
+#include "platform/base/Process.h"
+#include "platform/cloud/AccountFile.h"
 #include "platform/cloud/CloudService.h"
 #include "platform/files/DirectoryWatcher.h"
 #include "platform/files/FileCoordinator.h"
 #include "platform/files/FileManager.h"
 #include "platform/files/Progress.h"
 #include "platform/system/JotService.h"
+#include "platform/system/NetworkActivityIndicator.h"
 #include "platform/system/NotifyService.h"
 #include "platform/system/PreferencesStore.h"
+#include "platform/system/ReachabilityService.h"
 
 #include <cstdio>
 #include <cstdlib>
@@ -25,6 +29,26 @@ std::string stateFolder(const Folders& folders) {
 
 std::string noticeFolder(const Folders& folders) {
     return (folders.runtime ? *folders.runtime + "/pelmora" : stateFolder(folders)) + "/notices";
+}
+
+/// The host of an authority ("user@host:port", "[::1]:80").
+std::string hostOf(std::string_view authority) {
+    authority.remove_prefix(authority.rfind('@') + 1); // npos + 1 is 0
+    if (authority.starts_with('['))
+        return std::string(authority.substr(1, authority.find(']') - 1));
+    return std::string(authority.substr(0, authority.find(':')));
+}
+
+/// Where the documents of the signed-in account come from.
+std::optional<WatchedRemote> remoteOf(const CloudAccountService& accounts) {
+    const std::optional<AccountSummary> account = accounts.account();
+    if (!account)
+        return std::nullopt;
+    if (account->kind == folderAccountKind)
+        return WatchedRemote{account->address, {}};
+    const std::optional<Url> server = Url::parse(account->address);
+    // An address that names no host is nowhere: no name stands for it, and nothing resolves "".
+    return WatchedRemote{{}, server ? hostOf(server->host()) : std::string()};
 }
 
 } // namespace
@@ -45,6 +69,7 @@ struct Platform::State {
           jot(std::move(parts.jot)),
           notify(std::move(parts.notify)),
           preferences(std::move(parts.preferences)),
+          reachability(std::move(parts.reachability)),
           marker(std::move(parts.markerExists)) {
         if (!jot)
             jot = makeJotService(stateFolder(runtime.folders), clock.get());
@@ -56,6 +81,13 @@ struct Platform::State {
         cloud = std::make_unique<CloudService>(CloudService::Parts{
             *clock, main, notifications, watcher, progress, runtime.folders, false, nullptr, {}});
         FileCoordinator::setContentProvider(&cloud->contents());
+        if (!reachability)
+            reachability = makeReachability(*clock, environmentVariable("PELMORA_NETWORK"));
+        const auto followAccount = [this](const Notification&) {
+            reachability->setWatchedRemote(remoteOf(cloud->accounts()));
+        };
+        accountChanged = notifications.observe(cloudIdentityDidChangeNotification, followAccount);
+        followAccount({});
     }
 
     /// The lowest floor finds the runtime for as long as anything here lives.
@@ -75,10 +107,13 @@ struct Platform::State {
     std::unique_ptr<NotifyService> notify;
     std::unique_ptr<PreferencesStore> preferences;
     std::unique_ptr<StandardPreferences> standardPreferences;
+    std::unique_ptr<ReachabilityService> reachability;
+    NetworkActivityIndicator networkActivity;
     std::function<bool(const std::string& path)> marker;
     DirectoryWatcher watcher;
     FileProgressSubscription progress;
     std::unique_ptr<CloudService> cloud;
+    Observation accountChanged;
 };
 
 Platform::Platform(PlatformParts parts) : state_(std::make_unique<State>(std::move(parts))) {
@@ -129,6 +164,14 @@ DirectoryWatcher& Platform::directoryWatcher() {
 
 FileProgressSubscription& Platform::fileProgress() {
     return state_->progress;
+}
+
+ReachabilityService& Platform::reachability() {
+    return *state_->reachability;
+}
+
+NetworkActivityIndicator& Platform::networkActivityIndicator() {
+    return state_->networkActivity;
 }
 
 CloudService& Platform::cloud() {

@@ -36,6 +36,7 @@ struct PlatformParts {
     std::unique_ptr<JotService> jot;
     std::unique_ptr<NotifyService> notify;
     std::unique_ptr<PreferencesStore> preferences;
+    std::unique_ptr<ReachabilityService> reachability;
     /// Where an administrator's settings lie.
     std::string managedSettingsFile = "/etc/tavrin/managed-settings.json";
     /// Answers whether a file exists, for marker files outside the user's folders.

@@ -1,0 +1,12 @@
+#include "tests/support/PrivateBus.h"
+
+namespace test {
+
+PrivateBus::PrivateBus(const std::string& folder)
+    : daemon_(std::make_unique<Program>(
+          Program::Start{{"dbus-daemon", "--session", "--nofork", "--nopidfile", "--print-address",
+                          "--address=unix:path=" + folder + "/bus"}})),
+      address_(daemon_->readLine().value_or("")) {
+}
+
+} // namespace test
