@@ -1,0 +1,29 @@
+#pragma once
+
+#include <optional>
+#include <string>
+
+namespace platform {
+
+class PeerProcess;
+
+/// The programs whose requests bear a name.
+struct KnownCallers {
+    /// The installed opener, which stands for the home screen; "" for none.
+    std::string opener;
+    /// The runner of tests; "" for none, as in every installation.
+    std::string testRunner;
+
+    /// The opener beside this program.
+    static KnownCallers besideThisProgram();
+};
+
+/// This program's own file; "" when the system does not say.
+std::string executablePath();
+
+/// Who a process is: the identifier of a known caller, else the path of its executable; none when
+/// it has ended, or its executable cannot be read. A known caller's file counts only where nobody
+/// may write it who may not write this program's own.
+std::optional<std::string> identityOf(const PeerProcess& process, const KnownCallers& callers);
+
+} // namespace platform
