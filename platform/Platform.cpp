@@ -13,6 +13,7 @@
 #include "platform/system/PreferencesStore.h"
 #include "platform/system/ReachabilityService.h"
 
+#include <atomic>
 #include <cstdio>
 #include <cstdlib>
 #include <utility>
@@ -20,7 +21,7 @@
 namespace platform {
 namespace {
 
-Platform* installedPlatform = nullptr; // main thread writes; see Platform's own contract
+std::atomic<Platform*> installedPlatform{nullptr}; // the main thread writes, any reads
 
 /// Where the log lies when the machine has no journal, and notices when it has no runtime folder.
 std::string stateFolder(const Folders& folders) {
@@ -123,15 +124,17 @@ Platform::Platform(PlatformParts parts) : state_(std::make_unique<State>(std::mo
 Platform::~Platform() {
     FileCoordinator::setContentProvider(nullptr);
     state_->cloud.reset(); // what ends with it may still ask for the others
+    FileCoordinator::waitUntilIdle();
     installedPlatform = nullptr;
 }
 
 Platform& Platform::current() {
-    if (!installedPlatform) {
+    Platform* const installed = installedPlatform;
+    if (!installed) {
         std::fputs("platform: used before it was installed\n", stderr);
         std::abort();
     }
-    return *installedPlatform;
+    return *installed;
 }
 
 bool Platform::installed() {

@@ -44,7 +44,8 @@ struct PlatformParts {
 };
 
 /// The one global: the services that the product runs on. The process entry installs the real one,
-/// a test one on a temporary folder with a manual clock. Made and destroyed on the main thread.
+/// a test one on a temporary folder with a manual clock. Made and destroyed on the main thread;
+/// found from any.
 class Platform {
 public:
     explicit Platform(PlatformParts parts = {});
