@@ -7,9 +7,11 @@
 #include "platform/system/EventThread.h"
 #include "platform/system/InstanceBus.h"
 #include "platform/system/InstanceClient.h"
+#include "platform/system/InstanceFolder.h"
 #include "platform/system/InstanceMessage.h"
 #include "platform/system/InstanceServer.h"
 
+#include <deque>
 #include <mutex>
 #include <poll.h>
 #include <utility>
@@ -22,16 +24,67 @@ constexpr int retryMilliseconds = 10;
 /// As many may ask before the program is ready to hear them.
 constexpr std::size_t mostWaiting = 256;
 
+/// Where the instance is, as far as there is a place: none when neither folder can be used.
+struct Place {
+    std::optional<InstanceFolder> folder;
+    FileDescriptor lock;
+    bool isTaken = false;
+
+    static Place find(const Folders& folders) {
+        Result<InstanceFolder> found = InstanceFolder::open(folders);
+        if (!found)
+            return without(found.error());
+        Result<FileDescriptor> lock = found->tryLock();
+        if (!lock)
+            return without(lock.error());
+        const bool taken = !*lock;
+        return {*std::move(found), *std::move(lock), taken};
+    }
+
+    static Place without(const Error& error) {
+        platformLog(LogLevel::warning,
+                    "There is no place for the lock, so a second start may not be noticed: %@",
+                    error);
+        return {};
+    }
+};
+
 } // namespace
 
 /// Requests come in on the event thread and go out on the handler's queue.
 struct SingleInstance::State : std::enable_shared_from_this<State> {
-    State(Options theOptions, InstanceFolder theFolder, FileDescriptor theLock)
-        : options(std::move(theOptions)), folder(std::move(theFolder)), lock(std::move(theLock)) {}
+    State(Options theOptions, Place thePlace)
+        : options(std::move(theOptions)), place(std::move(thePlace)) {}
 
-    /// The end, on whoever's thread holds the instance: what the event thread still holds of this
-    /// for a moment must never be the last of it.
-    void close() {
+    void start() {
+        thread = EventThread::create("platform.instance");
+        if (!thread)
+            return;
+        const RequestTaker taker = [weak = weak_from_this()](OpenRequest request) -> Failure {
+            const auto self = weak.lock();
+            return self ? self->take(std::move(request)) : Failure(instanceSilentError());
+        };
+        thread->sync([&] {
+            bus = std::make_unique<InstanceBus>(*thread, options, taker);
+            if (isOnlyOne())
+                listen(taker);
+        });
+    }
+
+    void listen(const RequestTaker& taker) {
+        if (!place.folder)
+            return;
+        if (Result<FileDescriptor> listener = place.folder->listen())
+            server = std::make_unique<InstanceServer>(*thread, *std::move(listener),
+                                                      options.callers, options.patience, taker);
+        else
+            platformLog(LogLevel::error, "Requests of other starts cannot be heard: %@",
+                        listener.error());
+    }
+
+    /// On whoever's thread holds the instance: what the event thread still holds of this for a
+    /// moment must never be the last of it.
+    void stop() {
         if (!thread)
             return;
         thread->sync([this] {
@@ -39,28 +92,16 @@ struct SingleInstance::State : std::enable_shared_from_this<State> {
             bus.reset();
         });
         thread.reset();
-        folder.removeSocket(); // while the lock is held, it is ours
-    }
-
-    Failure start() {
-        thread = EventThread::create("platform.instance");
-        Result<FileDescriptor> listener = folder.listen();
-        if (!listener)
-            return listener.error();
-        if (!thread)
-            return makeErrorWithText(ErrorCode::unknownIo,
-                                     localized("The system has no open files left."));
-        const RequestTaker taker = [weak = weak_from_this()](OpenRequest request) -> Failure {
-            const auto self = weak.lock();
-            return self ? self->take(std::move(request)) : Failure(instanceSilentError());
-        };
-        thread->sync([&] {
-            bus = std::make_unique<InstanceBus>(*thread, options, taker);
-            if (bus->standing() != InstanceBus::Standing::taken)
-                server = std::make_unique<InstanceServer>(*thread, *std::move(listener),
-                                                          options.callers, options.patience, taker);
-        });
-        return std::nullopt;
+        if (place.folder && place.lock)
+            place.folder->removeSocket(); // while the lock is held, it is ours
+        const std::lock_guard handled(handling);
+        const std::lock_guard guard(mutex);
+        handler = nullptr;
+        queue = nullptr;
+        if (!waiting.empty())
+            platformLog(LogLevel::warning, "%@ requests came too late to be heard",
+                        std::to_string(waiting.size()));
+        waiting.clear();
     }
 
     void takeOwn(OpenRequest own) {
@@ -69,7 +110,7 @@ struct SingleInstance::State : std::enable_shared_from_this<State> {
             static_cast<void>(take(std::move(own))); // the first of all is never too many
     }
 
-    bool isOnlyOne() const { return bus->standing() != InstanceBus::Standing::taken; }
+    bool isOnlyOne() const { return !bus || bus->standing() != InstanceBus::Standing::taken; }
 
     Failure take(OpenRequest request) {
         const std::lock_guard guard(mutex);
@@ -91,25 +132,29 @@ struct SingleInstance::State : std::enable_shared_from_this<State> {
 
     /// On the handler's queue.
     void handle() {
-        std::vector<OpenRequest> taken;
-        std::shared_ptr<Handler> current;
-        {
-            const std::lock_guard guard(mutex);
-            taken.swap(waiting);
-            current = handler;
-        }
-        for (const OpenRequest& request : taken)
-            (*current)(request);
+        const std::lock_guard handled(handling);
+        while (const auto next = takeNext())
+            (*next->first)(next->second);
+    }
+
+    std::optional<std::pair<std::shared_ptr<Handler>, OpenRequest>> takeNext() {
+        const std::lock_guard guard(mutex);
+        if (!handler || waiting.empty())
+            return std::nullopt;
+        OpenRequest request = std::move(waiting.front());
+        waiting.pop_front();
+        return std::pair(handler, std::move(request));
     }
 
     Options options;
-    InstanceFolder folder;
-    FileDescriptor lock;
+    Place place;
     std::unique_ptr<EventThread> thread;
     std::unique_ptr<InstanceServer> server; // of the thread, as is the next
     std::unique_ptr<InstanceBus> bus;
+    /// Held while the handler runs; the handler itself may stop the instance.
+    std::recursive_mutex handling;
     std::mutex mutex;
-    std::vector<OpenRequest> waiting; // guarded by mutex, as are the next two
+    std::deque<OpenRequest> waiting; // guarded by mutex, as are the next two
     Executor* queue = nullptr;
     std::shared_ptr<Handler> handler;
 };
@@ -126,7 +171,12 @@ SingleInstance::SingleInstance(std::shared_ptr<State> state) : state_(std::move(
 }
 
 SingleInstance::~SingleInstance() {
-    state_->close();
+    state_->stop();
+    state_->place.lock.reset();
+}
+
+void SingleInstance::stop() {
+    state_->stop();
 }
 
 Result<std::unique_ptr<SingleInstance>> SingleInstance::claim(Options options,
@@ -135,25 +185,22 @@ Result<std::unique_ptr<SingleInstance>> SingleInstance::claim(Options options,
         return *std::move(failure);
     const auto deadline = std::chrono::steady_clock::now() + options.patience;
     for (;;) {
-        Result<InstanceFolder> folder = InstanceFolder::open(options.folders);
-        if (!folder)
-            return folder.error();
-        Result<FileDescriptor> lock = folder->tryLock();
-        if (!lock)
-            return lock.error();
-        const bool locked = bool(*lock);
+        Place place = Place::find(options.folders);
+        const bool locked = !place.isTaken;
+        Result<bool> taken = false;
         if (locked) {
-            auto state = std::make_shared<State>(options, *std::move(folder), *std::move(lock));
+            auto state = std::make_shared<State>(options, std::move(place));
             std::unique_ptr<SingleInstance> instance(new SingleInstance(state));
-            if (Failure failure = state->start())
-                return *std::move(failure);
+            state->start();
             if (state->isOnlyOne()) {
                 state->takeOwn(own);
                 return instance;
             }
+            instance.reset();
+            taken = handToBus(options, own);
+        } else {
+            taken = handToSocket(*place.folder, own, options.patience);
         }
-        const Result<bool> taken =
-            locked ? handToBus(options, own) : handToSocket(*folder, own, options.patience);
         if (!taken)
             return taken.error();
         if (*taken)
@@ -174,11 +221,14 @@ void SingleInstance::setHandler(Executor& queue, Handler handler) {
 
 Result<bool> handToRunningInstance(const SingleInstance::Options& options,
                                    const OpenRequest& request) {
-    const Result<InstanceFolder> folder = InstanceFolder::open(options.folders);
-    if (!folder)
-        return folder.error();
-    Result<bool> taken = handToSocket(*folder, request, options.patience);
-    return taken && !*taken ? handToBus(options, request) : taken;
+    if (Failure failure = checkRequestLimits(request))
+        return *std::move(failure);
+    if (const Result<InstanceFolder> folder = InstanceFolder::open(options.folders)) {
+        Result<bool> taken = handToSocket(*folder, request, options.patience);
+        if (!taken || *taken)
+            return taken;
+    }
+    return handToBus(options, request);
 }
 
 std::string activationTokenOfThisProcess() {

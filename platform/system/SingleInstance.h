@@ -49,16 +49,21 @@ public:
 
     /// Becomes the only instance, which then finds `own` among its requests, unless `own` is empty;
     /// or, when there is one already, hands `own` to it and answers none. Of several claims at the
-    /// same moment exactly one becomes the instance. An error when one runs and does not answer, or
-    /// when there is no safe place for the lock.
+    /// same moment exactly one becomes the instance. An error when one runs and does not answer.
+    /// Without a safe place for the lock (logged) the name on the bus decides alone, and without a
+    /// bus every claim is granted.
     static Result<std::unique_ptr<SingleInstance>> claim(Options options, const OpenRequest& own);
+    /// Only when it is gone can another start become the instance.
     ~SingleInstance();
     SingleInstance(const SingleInstance&) = delete;
     SingleInstance& operator=(const SingleInstance&) = delete;
 
     /// `handler` runs on `queue` for each request in the order of their arrival, also for those
-    /// that came before it was set. The queue outlives the object; nothing runs once it is gone.
+    /// that came before it was set. The queue outlives the object.
     void setHandler(Executor& queue, Handler handler);
+    /// Takes no more requests and waits for the handler to end (unless it is itself that stops).
+    /// Other starts wait from now on until the object is gone.
+    void stop();
 
 private:
     struct State;
