@@ -2,6 +2,7 @@
 
 #include "platform/base/Describe.h"
 #include "platform/base/Identity.h"
+#include "platform/base/Process.h"
 #include "platform/base/Runtime.h"
 #include "platform/ui/Window.h"
 #include "platform/ui/qt/ApplicationImpl.h"
@@ -77,6 +78,18 @@ void Application::terminate(int status) {
 
 bool Application::openUrl(const std::string& url, const OpenUrlOptions& options) {
     return impl_->delegate && impl_->delegate->applicationOpenURLOptions(*this, url, options);
+}
+
+void Application::bringForward(const std::string& activationToken) {
+    Window* const window = impl_->visibleWindow();
+    if (!window)
+        return;
+    // There the toolkit looks for it, when it asks for the focus, and takes it away.
+    if (!activationToken.empty() && QGuiApplication::platformName() == QLatin1String("wayland"))
+        setEnvironmentVariable("XDG_ACTIVATION_TOKEN", activationToken);
+    window->makeKeyAndVisible();
+    if (!isActive())
+        QApplication::alert(window->impl().widget);
 }
 
 bool Application::isActive() const {

@@ -74,6 +74,10 @@ public:
     /// Hands a URL request to the delegate.
     bool openUrl(const std::string& url, const OpenUrlOptions& options);
 
+    /// Shows the visible window before all others and asks for the focus, by the right that the
+    /// desk handed to whoever asked for it ("" for none). A desk that keeps the focus where it is
+    /// shows that the window wants it.
+    void bringForward(const std::string& activationToken);
     bool isActive() const;
     /// Posts the matching notice when the state changes; the windows of the program call it.
     void setActive(bool active);

@@ -1,4 +1,5 @@
 #include "platform/ui/qt/RestorationFile.h"
+#include "platform/ui/qt/WindowImpl.h"
 #include "tests/support/TemporaryFolder.h"
 #include "tests/ui/UiFixture.h"
 
@@ -51,6 +52,20 @@ TEST_F(WindowTest, ItsSizeFollowsTheDeviceUnlessItIsGiven) {
     EXPECT_EQ(window().size(), (Size{320, 480}));
     window().resize({200, 100});
     EXPECT_EQ(window().size(), (Size{480, 320}));
+}
+
+TEST_F(WindowTest, BroughtForwardItIsNoLongerMinimised) {
+    QWidget& top = *window().impl().widget;
+    top.showMinimized();
+    settle();
+    ASSERT_TRUE(top.isMinimized());
+    application().bringForward("");
+    settle();
+    EXPECT_FALSE(top.isMinimized());
+    EXPECT_TRUE(top.isActiveWindow());
+    window().close();
+    application().bringForward("a token");
+    EXPECT_FALSE(window().isVisible()) << "whoever closed it has the last word";
 }
 
 TEST_F(WindowTest, AResizeIsAnnouncedWithTheOldTraitsAndEndsWithTheNewOnes) {

@@ -184,6 +184,7 @@ void Window::Impl::show() {
     if (!widget)
         return;
     if (visible) {
+        widget->setWindowState(widget->windowState() & ~Qt::WindowMinimized);
         widget->raise();
         widget->activateWindow();
         return;
