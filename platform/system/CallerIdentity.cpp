@@ -11,6 +11,7 @@ namespace platform {
 namespace {
 
 constexpr std::string_view openerName = "/tavrin-open";
+constexpr std::string_view testRunnerName = "/tavrin-test-runner";
 
 bool isSameFile(const struct stat& a, const struct stat& b) {
     return a.st_dev == b.st_dev && a.st_ino == b.st_ino;
@@ -38,10 +39,10 @@ bool runs(const PeerProcess::Executable& executable, const std::string& known) {
 
 KnownCallers KnownCallers::besideThisProgram() {
     const std::string own = executablePath();
-    KnownCallers callers;
-    if (!own.empty())
-        callers.opener = std::string(folderOf(own)).append(openerName);
-    return callers;
+    if (own.empty())
+        return {};
+    const std::string folder(folderOf(own));
+    return {std::string(folder).append(openerName), std::string(folder).append(testRunnerName)};
 }
 
 std::string executablePath() {

@@ -11,10 +11,12 @@ class PeerProcess;
 struct KnownCallers {
     /// The installed opener, which stands for the home screen; "" for none.
     std::string opener;
-    /// The runner of tests; "" for none, as in every installation.
+    /// The runner of tests; "" for none.
     std::string testRunner;
 
-    /// The opener beside this program.
+    /// "tavrin-open" and "tavrin-test-runner" beside this program; an installation has only the
+    /// first. Whoever could put the second there could as well have put another program in place
+    /// of this one.
     static KnownCallers besideThisProgram();
 };
 

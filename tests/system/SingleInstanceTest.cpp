@@ -137,6 +137,25 @@ TEST_F(Instances, ADeadInstanceLeavesNothingInTheWay) {
     EXPECT_EQ(hand({url}), "nobody\n") << "it ended";
 }
 
+TEST_F(Instances, WhileOneEndsTheNextWaits) {
+    givenInstance();
+    instance->stop();
+    EXPECT_EQ(hand({url}), "nobody\n") << "what it no longer does it does not promise";
+    Program next(peer("claim", {url}));
+    options.patience = std::chrono::milliseconds(50);
+    EXPECT_FALSE(SingleInstance::claim(options, {})) << "it has not closed its files yet";
+    instance.reset();
+    EXPECT_EQ(next.readLine(), "first");
+    EXPECT_TRUE(requests.empty());
+}
+
+TEST_F(Instances, WithNoPlaceForTheLockItStartsAllTheSame) {
+    options.folders.runtime.reset();
+    options.folders.state = home.write("state", "a file");
+    givenInstance();
+    EXPECT_EQ(hand({url}), "nobody\n");
+}
+
 TEST_F(Instances, OneThatDoesNotAnswerIsNamedAndNotDoubled) {
     Program first(peer("claim"));
     ASSERT_EQ(first.readLine(), "first");

@@ -1,7 +1,7 @@
 #include "platform/base/Text.h"
+#include "platform/system/BusConnection.h"
+#include "platform/system/DeskNotice.h"
 #include "tools/tavrin-open/Opener.h"
-
-#include <cstdio>
 
 namespace {
 
@@ -9,7 +9,7 @@ constexpr int notBrought = 1;
 constexpr int notPassedOn = 2;
 
 int fail(const platform::Error& error, int status) {
-    std::fprintf(stderr, "tavrin-open: %s\n", error.localizedDescription.value_or("").c_str());
+    platform::sayStartFailed("tavrin-open", error, platform::sessionBusAddress());
     return status;
 }
 

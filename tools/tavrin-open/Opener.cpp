@@ -4,17 +4,16 @@
 #include "platform/files/PathText.h"
 #include "platform/system/InstanceMessage.h"
 #include "platform/system/ProgramStart.h"
+#include "platform/system/UrlScheme.h"
 
 #include <algorithm>
 #include <poll.h>
-#include <strings.h>
 
 namespace opener {
 namespace {
 
 using namespace platform;
 
-constexpr std::string_view scheme = "tavrinapp:";
 constexpr std::string_view programName = "/tavrin";
 /// A cold machine with a slow disk starts a program within this.
 constexpr auto startPatience = std::chrono::seconds(30);
@@ -23,12 +22,6 @@ constexpr auto handOverPatience = std::chrono::seconds(5);
 constexpr int lookMilliseconds = 20;
 /// Longer texts are shown by their beginning.
 constexpr std::size_t shownLength = 80;
-
-/// In any letter case: which spelling is the right one the program decides.
-bool isOwnScheme(const std::string& url) {
-    return url.size() >= scheme.size() &&
-           ::strncasecmp(url.c_str(), scheme.data(), scheme.size()) == 0;
-}
 
 std::string shortened(const std::string& text) {
     return text.size() <= shownLength ? text : text.substr(0, shownLength) + "…";
@@ -78,7 +71,7 @@ Failure bringToStarting(const SingleInstance::Options& options, const OpenReques
 Result<OpenRequest> requestOf(const std::vector<std::string>& arguments) {
     OpenRequest request{arguments, {}, activationTokenOfThisProcess()};
     const auto wrong =
-        std::ranges::find_if(arguments, [](const auto& each) { return !isOwnScheme(each); });
+        std::ranges::find_if(arguments, [](const auto& each) { return !hasUrlScheme(each); });
     if (wrong != arguments.end())
         return makeErrorWithText(
             ErrorCode::invalidArgument,
