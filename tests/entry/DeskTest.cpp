@@ -120,6 +120,29 @@ TEST_F(Desk, ABusCallerIsHeardByItsOwnName) {
     EXPECT_THAT(nextLine(), HasSubstr("/busctl " + url));
 }
 
+TEST_F(Desk, InstalledItOpensTheAddressesOfItsScheme) {
+    if (test::run({{"/bin/sh", "-c", "command -v xdg-open update-desktop-database"}}).status != 0)
+        GTEST_SKIP() << "the packages xdg-utils and desktop-file-utils are not installed";
+    givenRuntimeFolder();
+    environment.emplace_back("DISPLAY=:99"); // asked for, though nothing is drawn there
+    fs::copy("/bin/true", bin + "/pelmora");
+    const auto install = [&](const std::string& more) {
+        return test::run({{INSTALLER, "--programs", bin, more}, environment});
+    };
+    EXPECT_EQ(install("--prefix").status, 2) << "where to?";
+    ASSERT_EQ(test::run({{INSTALLER, "--programs", bin}, environment}).status, 0);
+    const std::string entry = home / ".local/share/applications/com.pelmora.Tavrin.desktop";
+    EXPECT_EQ(test::run({{"desktop-file-validate", entry}}).output, "");
+    cold = std::make_unique<Program>(Program::Start{{"xdg-open", url}, environment});
+    const std::string line = nextLine();
+    ASSERT_THAT(line, StartsWith("launched "));
+    running = std::stoi(line.substr(9));
+    EXPECT_EQ(nextLine(), homeScreen + " " + url);
+    EXPECT_EQ(install("--uninstall").status, 0);
+    EXPECT_FALSE(fs::exists(entry));
+    EXPECT_TRUE(fs::is_empty(home / ".local/bin"));
+}
+
 TEST_F(Desk, TheOpenerSaysWhatStandsInTheWay) {
     givenRuntimeFolder();
     const auto says = [&](const Outcome& outcome, int status, const std::string& text) {
