@@ -193,7 +193,7 @@ void AlertController::Content::showStep(double shown) {
         card->impl().setScale(Theme::alertStartScale + (1 - Theme::alertStartScale) * shown);
         return;
     }
-    const double below = dim->frame().height - card->frame().y - Card::reach;
+    const double below = dim->frame().height - card->frame().y - card->ground().y;
     const Point away{0, std::round((1 - shown) * std::max(0.0, below))};
     for (const auto& each : {backdrop, card, cancelCard})
         if (each)

@@ -122,8 +122,11 @@ QPainterPath arrowPath(const QRectF& ground, ArrowDirection side, double at) {
 struct Card::Painting : View::Impl {
     explicit Painting(Look whichLook) : look(whichLook) {}
 
+    double shadowMargin() const { return look == Look::groundOnly ? 0 : reach; }
+
     void paintContent(QPainter& painter, const QRectF& bounds) override {
-        const QRectF ground = bounds.adjusted(reach, reach, -reach, -reach);
+        const double margin = shadowMargin();
+        const QRectF ground = bounds.adjusted(margin, margin, -margin, -margin);
         if (ground.isEmpty())
             return;
         if (look != Look::groundOnly) {
@@ -150,13 +153,16 @@ Card::Painting& Card::painting() const {
     return static_cast<Painting&>(impl());
 }
 
+double Card::margin() const {
+    return painting().shadowMargin();
+}
+
 void Card::setGround(Rect ground) {
-    setFrame(
-        {ground.x - reach, ground.y - reach, ground.width + 2 * reach, ground.height + 2 * reach});
+    setFrame(ground.inset(-margin(), -margin()));
 }
 
 Rect Card::ground() const {
-    return bounds().inset(reach, reach);
+    return bounds().inset(margin(), margin());
 }
 
 void Card::setArrow(ArrowDirection side, double at) {

@@ -6,7 +6,7 @@
 namespace platform {
 
 /// The white, rounded ground of an alert or a sheet, with its shadow and, for a popover, its arrow.
-/// The view is larger than what stands on it: by `reach` on every side, for the shadow.
+/// With a shadow the view is larger than what stands on it: by `reach` on every side.
 class Card : public View {
 public:
     static constexpr double reach = 48;
@@ -21,6 +21,9 @@ public:
     void setArrow(ArrowDirection side, double at);
 
 private:
+    /// Without a shadow nothing reaches over what stands beside the ground, nor takes its clicks.
+    double margin() const;
+
     struct Painting;
     Painting& painting() const;
 };

@@ -228,6 +228,16 @@ TEST_F(AlertTest, ASheetStandsAtTheBottomOfAPhoneWhateverItsAnchor) {
     EXPECT_THAT(answers, ElementsAre("Cancel")) << "a tap beside a sheet is the way out";
 }
 
+TEST_F(AlertTest, EveryRowOfASheetTakesItsPress) {
+    for (const std::string title : {"First", "Last", "Cancel"}) {
+        present(alert({action("First"), action("Last"), action("Cancel", ActionStyle::cancel)},
+                      AlertStyle::actionSheet));
+        tap(*button(title));
+        advance(280ms);
+        EXPECT_EQ(answers.back(), title);
+    }
+}
+
 TEST_F(AlertTest, APopoverPointsAtItsAnchorInsideTheTabletsWindow) {
     givenWindow(tabletSize, DeviceIdiom::tablet);
     auto anchor = std::make_shared<View>(Rect{960, 300, 44, 44});
