@@ -1,6 +1,7 @@
 #include "platform/launch/Alerts.h"
 
 #include "platform/base/ByteCount.h"
+#include "platform/base/Log.h"
 #include "platform/base/Text.h"
 #include "platform/ui/Application.h"
 #include "platform/ui/Canvas.h"
@@ -31,8 +32,10 @@ bool presentOverWindow(const std::shared_ptr<ViewController>& screen, bool anima
     const Application::Impl* const application = applicationImpl();
     Window* const window = application ? application->visibleWindow() : nullptr;
     const auto root = window ? window->rootViewController() : nullptr;
-    if (!root)
+    if (!root) {
+        platformLog(LogLevel::warning, "There is no window to show “%@” in", screen->title());
         return false;
+    }
     root->presentViewController(screen, animated);
     return true;
 }

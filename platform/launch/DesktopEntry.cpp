@@ -75,8 +75,8 @@ bool DesktopEntry::isFor(const std::vector<std::string>& desktops) const {
 }
 
 bool DesktopEntry::canRun() const {
-    return !hidden && exec && (tryExec.empty() || findProgram(tryExec)) &&
-           (!needsTerminal || terminalCommand());
+    return !hidden && exec && findProgram(exec->program()) &&
+           (tryExec.empty() || findProgram(tryExec)) && (!needsTerminal || terminalCommand());
 }
 
 ApplicationRecord recordOf(const DesktopEntry& entry) {

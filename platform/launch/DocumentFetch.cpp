@@ -13,9 +13,9 @@
 #include <QPointer>
 
 #include <algorithm>
+#include <atomic>
 #include <memory>
 #include <mutex>
-#include <optional>
 #include <utility>
 #include <vector>
 
@@ -89,7 +89,7 @@ public:
 private:
     void subscribe();
     void showAlert();
-    void showProgress(std::int64_t completed, std::int64_t total);
+    void showProgress(const std::shared_ptr<Progress>& progress);
     void forget();
     void arrived(const Result<Url>& document);
 
@@ -98,7 +98,7 @@ private:
     Timer alertDelay_;
     FileProgressSubscription::Token subscription_;
     std::unique_ptr<ProgressAlert> alert_;
-    std::optional<std::pair<std::int64_t, std::int64_t>> progress_;
+    std::shared_ptr<Progress> progress_;
 };
 
 /// Ends with the application, and gives up what is under way then.
@@ -135,16 +135,26 @@ void Fetch::begin() {
 void Fetch::subscribe() {
     if (!Platform::installed())
         return;
-    const auto tell = [reading = reading_, weak = weak_from_this()](const Progress& progress) {
-        reading->toMain(
-            [weak, completed = progress.completedUnitCount(), total = progress.totalUnitCount()] {
-                if (const auto fetch = weak.lock())
-                    fetch->showProgress(completed, total);
-            });
+    // A fast download reports far more often than anybody can look: one look at a time is enough.
+    const auto looking = std::make_shared<std::atomic<bool>>(false);
+    const auto look = [reading = reading_, weak = weak_from_this(),
+                       looking](const std::shared_ptr<Progress>& progress) {
+        if (looking->exchange(true))
+            return;
+        reading->toMain([weak, looking, progress] {
+            looking->store(false);
+            if (const auto fetch = weak.lock())
+                fetch->showProgress(progress);
+        });
     };
     subscription_ = Platform::current().fileProgress().addSubscriber(
-        request_.document, [tell](const std::shared_ptr<Progress>& progress) {
-            const Progress::ObserverId id = progress->addObserver(tell);
+        request_.document, [look](const std::shared_ptr<Progress>& progress) {
+            const Progress::ObserverId id =
+                progress->addObserver([look, weak = std::weak_ptr(progress)](const Progress&) {
+                    if (const auto observed = weak.lock())
+                        look(observed);
+                });
+            look(progress); // it may have begun before
             return [progress, id] { progress->removeObserver(id); };
         });
 }
@@ -156,14 +166,14 @@ void Fetch::showAlert() {
                                                      fetch->forget();
                                              });
     if (progress_)
-        alert_->setProgress(progress_->first, progress_->second);
+        showProgress(progress_);
     alert_->present();
 }
 
-void Fetch::showProgress(std::int64_t completed, std::int64_t total) {
-    progress_ = {completed, total};
+void Fetch::showProgress(const std::shared_ptr<Progress>& progress) {
+    progress_ = progress;
     if (alert_)
-        alert_->setProgress(completed, total);
+        alert_->setProgress(progress->completedUnitCount(), progress->totalUnitCount());
 }
 
 /// What was under way is given up with the last reference.

@@ -81,6 +81,7 @@ TEST_F(Applications, OnlyWhatCanRunAndIsMeantForThisDesktopIsOffered) {
     givenApplication("elsewhere", "E", takesText + "\nOnlyShowIn=Loud;");
     givenApplication("not-here", "N", takesText + "\nNotShowIn=Calm;");
     givenApplication("missing", "M", takesText + "\nTryExec=/nowhere/at-all");
+    givenApplication("gone", "G", "Exec=/nowhere/gone %f\nMimeType=text/plain;");
     givenApplication("nothing", "N", "MimeType=text/plain;");
     givenApplication("broken", "B", "Exec=true %y\nMimeType=text/plain;");
     givenApplication("link", "L", "Type=Link\n" + takesText);
@@ -94,6 +95,7 @@ TEST_F(Applications, OnlyWhatCanRunAndIsMeantForThisDesktopIsOffered) {
 
 TEST_F(Applications, ATerminalIsNeededForThoseThatWantOne) {
     set("PATH", house.home / "bin");
+    givenProgram("true");
     givenApplication("vi", "Vi", takesText + "\nTerminal=true");
     EXPECT_EQ(defaultFor("text/plain"), "");
     givenProgram("x-terminal-emulator");
@@ -138,15 +140,16 @@ TEST_F(Applications, WhatIsInstalledOrRemovedMeanwhileCounts) {
 
 TEST_F(Applications, ARecordSaysWhatTheEntrySays) {
     set("LC_ALL", "de_AT.UTF-8");
+    const std::string program = givenProgram("my viewer");
     givenApplication("org.example.Viewer", "Viewer",
-                     "Name[de]=Betrachter\nExec=\"/opt/a b/viewer\" %U\nMimeType=text/plain;");
-    givenApplication("batch", "Batch", "Exec=batch\nMimeType=text/html;");
+                     "Name[de]=Betrachter\nExec=\"" + program + "\" %U\nMimeType=text/plain;");
+    givenApplication("batch", "Batch", "Exec=true\nMimeType=text/html;");
     const ApplicationRecord record =
         recordOf(*ApplicationDatabase::shared().defaultFor("text/plain"));
     EXPECT_EQ(record.itemName, "Viewer");
     EXPECT_EQ(record.localizedName, "Betrachter");
     EXPECT_EQ(record.bundleIdentifier, "org.example.Viewer");
-    EXPECT_EQ(record.bundleExecutable, "/opt/a b/viewer");
+    EXPECT_EQ(record.bundleExecutable, program);
     EXPECT_EQ(record.bundleContainerURL, Url::file(house.home / "data/applications"));
     EXPECT_TRUE(record.supportsOpenInPlace);
     EXPECT_FALSE(

@@ -9,12 +9,23 @@ namespace test {
 
 using namespace platform;
 
+namespace {
+
+/// The machine's types, but none of its applications. Whoever has read them comes back to them.
+std::string typesAlone() {
+    static const TemporaryFolder folder;
+    static const bool linked = [] {
+        std::filesystem::create_symlink("/usr/share/mime", folder / "mime");
+        return true;
+    }();
+    return linked ? folder.path() : "";
+}
+
+} // namespace
+
 Desk::Desk() {
     house.home.makeFolder("bin");
-    // The machine's types, but none of its applications.
-    house.home.makeFolder("system");
-    std::filesystem::create_symlink("/usr/share/mime", house.home / "system/mime");
-    set("XDG_DATA_DIRS", house.home / "system");
+    set("XDG_DATA_DIRS", house.home / "system" + ":" + typesAlone());
     set("XDG_CONFIG_DIRS", house.home / "etc");
     set("XDG_CURRENT_DESKTOP", "Quiet:Calm");
     set("PATH", house.home / "bin" + ":/usr/bin:/bin");

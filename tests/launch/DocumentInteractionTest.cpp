@@ -62,6 +62,8 @@ protected:
         givenProgram("viewer");
         givenApplication("viewer", "Viewer", "Exec=" + exec + "\nMimeType=text/plain;");
     }
+    /// It is there, but the system cannot run it.
+    void givenInterpreterlessViewer() { house.home.write("bin/viewer", "#!/nowhere/shell\n"); }
     Url givenLetter() { return Url::file(house.givenFile("Letter.txt")); }
     /// One whose download goes on until the test says what becomes of it.
     Url givenSlowLetter() {
@@ -170,7 +172,7 @@ TEST_F(DocumentInteraction, WhatGoesWrongIsSaidWithItsCause) {
     house.advance(300ms);
     choose("OK");
     slow.arrived = true;
-    givenViewer("/nowhere/viewer %f");
+    givenInterpreterlessViewer();
     DocumentInteractionController::create(letter)->openWithDefaultApplication();
     ASSERT_TRUE(untilAlert("“Letter.txt” could not be opened"));
     EXPECT_THAT(alertMessage(), HasSubstr("“Viewer” could not be started."));
@@ -187,6 +189,7 @@ TEST_F(DocumentInteraction, TheMenuOffersWhatCanBeDoneWithTheDocument) {
     open();
     givenViewer();
     givenProgram("editor");
+    givenProgram("mail");
     givenApplication("editor", "Editor", "Exec=editor %u\nMimeType=text/plain;");
     givenApplication("mail", "Mail", "Exec=mail %u\nMimeType=x-scheme-handler/mailto;");
     givenList("config/mimeapps.list", "[Default Applications]\ntext/plain=viewer.desktop\n");
