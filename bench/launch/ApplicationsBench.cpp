@@ -49,9 +49,11 @@ struct Desk {
 void datesAlone(benchmark::State& state) {
     const Desk desk;
     const std::string folder = desk.home / "system/applications/";
-    for (auto _ : state)
-        for (const DirectoryEntry& each : *FileManager::entries(folder))
+    for (auto _ : state) {
+        const Result<std::vector<DirectoryEntry>> entries = FileManager::entries(folder);
+        for (const DirectoryEntry& each : *entries)
             benchmark::DoNotOptimize(FileManager::attributes(folder + each.name, FollowLinks::yes));
+    }
 }
 BENCHMARK(datesAlone)->Unit(benchmark::kMicrosecond);
 

@@ -62,7 +62,7 @@ struct ApplicationDatabase::State {
     Entry find(const std::string& id) const {
         for (const ApplicationLevel& level : levels)
             if (const auto found = level.entries.find(id); found != level.entries.end())
-                return found->second->canRun() ? found->second : nullptr;
+                return found->second;
         return nullptr;
     }
 
@@ -70,8 +70,8 @@ struct ApplicationDatabase::State {
     Entry chosen(const Names& type, const std::vector<Entry>& associated) const;
 };
 
-/// Who takes the type, the preferred first. What a list adds or removes concerns the applications
-/// of its own folder and of those that come later.
+/// Who takes the type, the preferred first, also those that cannot run (which takes looking). What
+/// a list adds or removes concerns the applications of its own folder and of those that come later.
 std::vector<Entry> ApplicationDatabase::State::associated(const Names& type) const {
     using enum MimeAppsList::Kind;
     std::vector<Entry> out;
@@ -101,7 +101,7 @@ Entry ApplicationDatabase::State::chosen(const Names& type,
     const auto firstOf = [&](const MimeAppsList& list) -> Entry {
         for (const std::string& id : list.applications(MimeAppsList::Kind::defaults, type))
             if (const auto found = std::ranges::find(associated, id, &DesktopEntry::id);
-                found != associated.end())
+                found != associated.end() && (*found)->canRun())
                 return *found;
         return nullptr;
     };
@@ -144,7 +144,7 @@ Entry ApplicationDatabase::defaultFor(std::string_view mimeType) {
         if (Entry entry = state.chosen(type, associated))
             return entry;
         for (const Entry& entry : associated) {
-            if (!entry->isFor(state.places.desktops))
+            if (!entry->isFor(state.places.desktops) || !entry->canRun())
                 continue;
             if (!isOurselves(*entry))
                 return entry;
@@ -162,7 +162,8 @@ std::vector<Entry> ApplicationDatabase::applicationsFor(std::string_view mimeTyp
     for (const Names& type : typesToTry(mimeType))
         for (const Entry& entry : state_->associated(type))
             if (!entry->noDisplay && entry->isFor(state_->places.desktops) &&
-                !isOurselves(*entry) && std::ranges::find(out, entry) == out.end())
+                !isOurselves(*entry) && std::ranges::find(out, entry) == out.end() &&
+                entry->canRun())
                 out.push_back(entry);
     return out;
 }

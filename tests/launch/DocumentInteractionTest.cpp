@@ -65,9 +65,10 @@ protected:
     /// It is there, but the system cannot run it.
     void givenInterpreterlessViewer() { house.home.write("bin/viewer", "#!/nowhere/shell\n"); }
     Url givenLetter() { return Url::file(house.givenFile("Letter.txt")); }
-    /// One whose download goes on until the test says what becomes of it.
+    /// One whose download goes on until the test says what becomes of it. Beside the store, which
+    /// would ask for it as well.
     Url givenSlowLetter() {
-        slow.promised = givenLetter();
+        slow.promised = Url::file(house.home.write("elsewhere/Letter.txt", "x"));
         FileCoordinator::setContentProvider(&slow);
         return slow.promised;
     }
