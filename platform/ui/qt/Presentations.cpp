@@ -255,7 +255,7 @@ void Presentations::place(const Presentation& presentation) const {
 
 std::shared_ptr<View> Presentations::lastCoveringHost() const {
     for (auto each = chain_.rbegin(); each != chain_.rend(); ++each)
-        if ((*each)->covers)
+        if (!(*each)->screen->impl().isOverlay)
             return (*each)->host;
     return nullptr;
 }
