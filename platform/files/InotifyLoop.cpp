@@ -4,6 +4,7 @@
 #include <cerrno>
 #include <poll.h>
 #include <pthread.h>
+#include <span>
 #include <sys/eventfd.h>
 #include <sys/inotify.h>
 #include <thread>
@@ -29,6 +30,40 @@ DirectoryChange::Kind kindOf(std::uint32_t mask) {
     if (mask & IN_MOVED_TO)
         return Kind::movedTo;
     return mask & IN_ATTRIB ? Kind::attributes : Kind::modified;
+}
+
+/// The longest event: a name of 255 bytes and its end.
+constexpr std::size_t longestEvent = sizeof(inotify_event) + 256;
+/// A rename is two events, which the kernel writes one after the other. A reader that is fast
+/// enough comes between them; the second one is there a moment later.
+constexpr int renameGap = 2; // milliseconds
+constexpr int mostRenameWaits = 8;
+
+/// Whether the last of the events may be the first half of a rename.
+bool endsInHalfARename(const char* events, std::size_t length) {
+    std::uint32_t last = 0;
+    for (std::size_t at = 0; at < length;) {
+        const auto* event = reinterpret_cast<const inotify_event*>(events + at);
+        last = event->mask;
+        at += sizeof(inotify_event) + event->len;
+    }
+    return (last & IN_MOVED_FROM) != 0;
+}
+
+/// Reads events, both halves of a rename together. Answers their bytes; 0 when there are none.
+std::size_t readEvents(int instance, std::span<char> buffer) {
+    std::size_t length = 0;
+    for (int waits = 0; buffer.size() - length >= longestEvent; ++waits) {
+        const ssize_t more = ::read(instance, buffer.data() + length, buffer.size() - length);
+        if (more <= 0)
+            break;
+        length += static_cast<std::size_t>(more);
+        pollfd next{instance, POLLIN, 0};
+        if (waits == mostRenameWaits || !endsInHalfARename(buffer.data(), length) ||
+            ::poll(&next, 1, renameGap) <= 0)
+            break;
+    }
+    return length;
 }
 
 /// The folder's own change of attributes arrives without a name; its watchers hear of entries only.
@@ -144,16 +179,16 @@ void InotifyLoop::wait(int instance) const {
 /// Hands on one buffer of events. Answers false when there are no more.
 bool InotifyLoop::readOnce(int instance) {
     alignas(inotify_event) std::array<char, 64 * 1024> buffer; // NOLINT: read() fills it
-    const ssize_t length = ::read(instance, buffer.data(), buffer.size());
-    if (length <= 0)
+    const std::size_t length = readEvents(instance, buffer);
+    if (length == 0)
         return false;
     std::vector<std::pair<std::shared_ptr<WatchRegistration>, std::vector<DirectoryChange>>> out;
     {
         const std::lock_guard lock(mutex_);
         Batch batch;
-        for (ssize_t at = 0; at < length;) {
+        for (std::size_t at = 0; at < length;) {
             const auto* event = reinterpret_cast<const inotify_event*>(buffer.data() + at);
-            at += static_cast<ssize_t>(sizeof(inotify_event) + event->len);
+            at += sizeof(inotify_event) + event->len;
             sort(*event, batch);
         }
         for (auto& [watch, changes] : batch) {
