@@ -1,4 +1,5 @@
 #include "platform/documents/model/FolderModel.h"
+#include "platform/documents/model/FolderReader.h"
 #include "tests/documents/StoreHouse.h"
 
 #include <gmock/gmock.h>
@@ -119,6 +120,19 @@ TEST_F(Folder, followsARenameOfAFileAndOfAPromise) {
     ASSERT_TRUE(untilShown({"D.txt", "E.pdf"}));
     EXPECT_EQ(model->idAt(0), file);
     EXPECT_EQ(model->idAt(1), promise);
+}
+
+TEST_F(Folder, aNoticeThatTheDiskHasOutrunDoesNotTakeTheItemAway) {
+    house.signIn();
+    FolderReader reader(house.url(), house.documents());
+    using Kind = DirectoryChange::Kind;
+    const auto changed = reader.resolve({{Kind::modified, "B.txt", false, 0}});
+    ASSERT_TRUE(changed);
+    EXPECT_TRUE(changed->facts.empty()) << "its renaming is still to be told, and keeps its row";
+    const auto gone = reader.resolve({{Kind::removed, "B.txt", false, 0}});
+    ASSERT_TRUE(gone);
+    ASSERT_EQ(gone->facts.size(), 1U);
+    EXPECT_FALSE(gone->facts[0].present);
 }
 
 TEST_F(Folder, readsAChangedFileAgain) {

@@ -137,7 +137,9 @@ public:
     explicit Notices(FolderReader& reader) : reader_(reader) {}
 
     void take(const DirectoryChange& change) {
-        const std::optional<std::string> shown = shownName(change.name);
+        using Kind = DirectoryChange::Kind;
+        const bool leaves = change.kind == Kind::removed || change.kind == Kind::movedFrom;
+        const std::optional<std::string> shown = shownName(change.name, leaves);
         if (change.kind == DirectoryChange::Kind::movedFrom && shown) {
             from_ = Half{change.cookie, *shown};
         } else if (change.kind == DirectoryChange::Kind::movedTo && shown && from_ &&
@@ -147,8 +149,16 @@ public:
         }
     }
 
+    /// A name that calls for a look at the disk.
+    struct Name {
+        std::string name;
+        /// Something was said to have left. Without that an item that is not there any more has
+        /// only been outrun: the notice that follows tells whether it went or got another name.
+        bool left = false;
+    };
+
     std::vector<EntryRenaming> renamings;
-    std::vector<std::string> names;
+    std::vector<Name> names;
 
 private:
     struct Half {
@@ -156,37 +166,41 @@ private:
         std::string name;
     };
 
-    void add(std::string name) {
-        if (seen_.insert(name).second)
-            names.push_back(std::move(name));
+    void add(const std::string& name, bool left) {
+        const auto [known, isNew] = places_.try_emplace(name, names.size());
+        if (isNew)
+            names.push_back({name, left});
+        else
+            names[known->second].left |= left;
     }
 
     /// The name under which the file's row stands, or stood.
-    std::optional<std::string> shownName(const std::string& file) {
+    std::optional<std::string> shownName(const std::string& file, bool leaves) {
         if (!isHidden(file)) {
-            add(file);
+            add(file, leaves);
             return file;
         }
         if (!hasSidecarForm(file))
             return std::nullopt;
-        add(file);
+        // A promise may end without leaving: its mark is what makes it one.
+        add(file, true);
         std::string document = plainNameOf(file);
         if (const auto known = reader_.shortened_.find(file); known != reader_.shortened_.end())
             document = known->second;
         if (const std::optional<std::string> now = reader_.promisedBy(file)) {
             if (*now != document) {
-                add(document);
+                add(document, true);
                 document = *now;
                 reader_.shortened_[file] = *now;
             }
         }
-        add(document);
+        add(document, true);
         return document;
     }
 
     FolderReader& reader_;
     std::optional<Half> from_;
-    std::unordered_set<std::string> seen_;
+    std::unordered_map<std::string, std::size_t> places_;
 };
 
 std::optional<EntryChanges> FolderReader::resolve(const std::vector<DirectoryChange>& changes) {
@@ -200,8 +214,9 @@ std::optional<EntryChanges> FolderReader::resolve(const std::vector<DirectoryCha
     }
     EntryChanges result{std::move(notices.renamings), {}};
     result.facts.reserve(notices.names.size());
-    for (const std::string& name : notices.names)
-        result.facts.push_back(factFor(name));
+    for (const Notices::Name& each : notices.names)
+        if (EntryFact fact = factFor(each.name); fact.present || each.left)
+            result.facts.push_back(std::move(fact));
     return result;
 }
 
