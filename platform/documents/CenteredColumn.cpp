@@ -13,7 +13,8 @@ constexpr double pictureGap = 16;
 constexpr double widestColumn = 440;
 constexpr double edge = 12;
 constexpr double boxPadding = 14;
-constexpr double smallestScale = 0.5;
+constexpr double smallestScale = 0.55;
+constexpr double scaleStep = 0.1;
 /// Of the free room, what stands above: a little less than half looks like the middle.
 constexpr double shareAbove = 0.44;
 
@@ -57,22 +58,19 @@ std::shared_ptr<Label> CenteredColumn::addBox(Color ground, double gapAbove) {
     return label;
 }
 
-double CenteredColumn::heightOf(const Line& line, double width) const {
+double CenteredColumn::heightOf(const Line& line, double width, double scale) const {
     if (!line.label)
         return std::max(Theme::minimumTarget, line.view->intrinsicContentSize().height);
-    return line.label->intrinsicHeightForWidth(width - 2 * line.padding) + 2 * line.padding;
+    measure_->setText(line.label->text());
+    measure_->setFont(Font::preferred(line.style).scaled(scale));
+    return measure_->intrinsicHeightForWidth(width - 2 * line.padding) + 2 * line.padding;
 }
 
-/// Sets the fonts to that scale.
-double CenteredColumn::textHeight(double width, double scale) const {
+double CenteredColumn::columnHeight(double width, double scale) const {
     double height = 0;
-    for (const Line& line : lines_) {
-        if (line.view->isHidden())
-            continue;
-        if (line.label)
-            line.label->setFont(Font::preferred(line.style).scaled(scale));
-        height += line.gapAbove + heightOf(line, width);
-    }
+    for (const Line& line : lines_)
+        if (!line.view->isHidden())
+            height += line.gapAbove + heightOf(line, width, scale);
     return height;
 }
 
@@ -91,10 +89,13 @@ void CenteredColumn::layoutSubviews() {
     const Size size = bounds().size();
     const double width = std::min(widestColumn, size.width - 2 * Theme::tabletMargin);
     const double room = size.height - 2 * edge;
-    double height = textHeight(width, 1);
+    double scale = 1;
+    double height = columnHeight(width, scale);
     const bool drawn = picture_ && pictureEdge + pictureGap + height <= room;
-    for (double scale = 0.9; height > room && scale >= smallestScale; scale -= 0.1)
-        height = textHeight(width, scale);
+    while (height > room && scale > smallestScale) {
+        scale -= scaleStep;
+        height = columnHeight(width, scale);
+    }
     if (drawn)
         height += pictureEdge + pictureGap;
     double y = edge + std::max(0.0, std::floor((room - height) * shareAbove));
@@ -110,7 +111,9 @@ void CenteredColumn::layoutSubviews() {
         if (line.view->isHidden())
             continue;
         y += line.gapAbove;
-        const double lineHeight = heightOf(line, width);
+        if (line.label)
+            line.label->setFont(Font::preferred(line.style).scaled(scale));
+        const double lineHeight = heightOf(line, width, scale);
         placeLine(line, {left, y, width, lineHeight});
         y += lineHeight;
     }

@@ -32,12 +32,14 @@ private:
         double padding = 0;
     };
     std::shared_ptr<Label> makeLabel(TextStyle style, Color color) const;
-    double heightOf(const Line& line, double width) const;
-    double textHeight(double width, double scale) const;
+    double heightOf(const Line& line, double width, double scale) const;
+    double columnHeight(double width, double scale) const;
     void placeLine(const Line& line, Rect frame) const;
 
     std::shared_ptr<View> picture_;
     std::vector<Line> lines_;
+    /// Stands in no window: a text in a font that is only tried calls for no layout.
+    std::shared_ptr<Label> measure_ = makeLabel(TextStyle::body, {});
 };
 
 } // namespace platform
