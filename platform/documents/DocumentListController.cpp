@@ -1,41 +1,11 @@
 #include "platform/documents/DocumentListController.h"
 
-#include "platform/base/Identity.h"
 #include "platform/cloud/CloudDocumentService.h"
-#include "platform/documents/DisplayName.h"
+#include "platform/documents/FolderPath.h"
 #include "platform/documents/ListScreen.h"
 #include "platform/documents/list/ListWidget.h"
-#include "platform/files/FileManager.h"
-#include "platform/ui/Theme.h"
 
 namespace platform {
-namespace {
-
-std::string titleFor(const Url& folder, const CloudDocumentService& documents) {
-    if (documents.shelfroot() == folder)
-        return std::string(applicationName);
-    if (documents.isDocumentsContainer(folder))
-        if (const auto container = documents.containerForItemAtURL(folder))
-            return displayName((*container)->localizedName());
-    return displayName(folder.lastPathComponent());
-}
-
-bool isFolder(const Url& url) {
-    bool directory = false;
-    return FileManager::exists(url.path(), &directory) && directory;
-}
-
-/// The folders from below `top` down to `folder`, which lies inside it.
-std::vector<Url> foldersBetween(const Url& top, const Url& folder) {
-    std::vector<Url> folders;
-    for (std::optional<Url> each = folder; each && *each != top;
-         each = each->deletingLastPathComponent())
-        folders.insert(folders.begin(), each->markedAsDirectory(true));
-    return folders;
-}
-
-} // namespace
-
 DocumentListController::DocumentListController(std::unique_ptr<Impl> impl)
     : impl_(std::move(impl)) {
     impl_->self = this;
@@ -53,31 +23,17 @@ std::shared_ptr<DocumentListController> DocumentListController::createForURL(con
     const Url place = folder.standardized().markedAsDirectory(true);
     std::shared_ptr<DocumentListController> controller(
         new DocumentListController(std::make_unique<Impl>(place, services)));
-    controller->setTitle(titleFor(place, services.documents));
+    controller->setTitle(folderTitle(place, services.documents));
     return controller;
 }
 
 std::optional<std::vector<std::shared_ptr<DocumentListController>>>
 DocumentListController::listControllerHierarchyForURL(const Url& folder) {
-    const CloudDocumentService& documents = DocumentServices::current().documents;
-    const std::optional<Url> root = documents.shelfroot();
-    Url wanted = folder.standardized();
-    if (!root || !documents.isInShelfroot(wanted) || !isFolder(wanted))
+    const auto path = folderPathFromRoot(folder, DocumentServices::current().documents);
+    if (!path)
         return std::nullopt;
-    std::vector<std::shared_ptr<DocumentListController>> lists{create()};
-    if (wanted == *root)
-        return lists;
-    const auto container = documents.containerForItemAtURL(wanted);
-    if (!container || !(*container)->documentsURL())
-        return std::nullopt;
-    const Url& top = *(*container)->documentsURL();
-    // A container's own folder is shown as its documents.
-    if (top.isInside(wanted))
-        wanted = top;
-    if (!wanted.isInside(top))
-        return std::nullopt;
-    lists.push_back(createForURL(top));
-    for (const Url& each : foldersBetween(top, wanted))
+    std::vector<std::shared_ptr<DocumentListController>> lists;
+    for (const Url& each : *path)
         lists.push_back(createForURL(each));
     return lists;
 }

@@ -31,6 +31,7 @@ public:
 
     void loadView() override;
     void viewDidLoad() override;
+    void viewDidLayoutSubviews() override;
 
     struct Impl;
 

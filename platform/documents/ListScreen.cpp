@@ -14,9 +14,6 @@
 namespace platform {
 namespace {
 
-/// How often an empty list looks whether the store knows all of the cloud by now.
-constexpr Duration listingCheckTime = std::chrono::seconds(1);
-
 std::shared_ptr<SearchPill> makePill(DocumentListController::Impl& screen,
                                      const std::weak_ptr<bool>& alive) {
     return std::make_shared<SearchPill>([&screen, alive] {
@@ -55,17 +52,23 @@ void DocumentListController::Impl::makeView() {
     list = std::make_shared<ListView>(model, *this);
     list->setBackgroundColor(Theme::page);
     list->setHeader(makePill(*this, alive_), SearchPill::heightWithMargins());
-    list->widget().setChangeHandlers([this] { rowsChanged(); }, [this] { updatePage(); });
+    list->widget().setChangeHandlers([this] { rowsChanged(); }, [this] { page_->update(); });
     rows().setEditing(editing, false);
     rows().selection = early_;
-    if (model->state() == ModelState::loading)
-        loading_ = services.mainQueue.timer(Theme::loadingDelay, [this] {
-            showsLoading_ = true;
-            updatePage();
-        });
-    updatePage();
+    page_ = std::make_unique<FolderPage>(services, model, list, emptyPage());
+    page_->update();
     if (model->state() == ModelState::ready)
         itemsChanged();
+}
+
+StatusPage::Content DocumentListController::Impl::emptyPage() const {
+    const bool isRoot = services.documents.shelfroot() == model->folder();
+    return {StatusPage::Drawing::emptyFolder,
+            localized("No documents here"),
+            isRoot ? localized("What applications keep in the cloud appears here.")
+                   : localized("Documents that are added to this folder, here or on another "
+                               "device, appear here."),
+            {}};
 }
 
 void DocumentListController::Impl::willAppear() {
@@ -98,7 +101,7 @@ void DocumentListController::Impl::setEditing(bool value, bool animated) {
 
 void DocumentListController::Impl::rowsChanged() {
     followArrivals();
-    updatePage();
+    page_->update();
     itemsChanged();
 }
 
@@ -224,56 +227,6 @@ bool DocumentListController::Impl::leaveEditing() {
             return true;
         }
     return false;
-}
-
-// What stands in place of rows
-
-void DocumentListController::Impl::updatePage() {
-    if (!list)
-        return;
-    const bool listing =
-        model->state() == ModelState::ready && model->count() == 0 && storeIsStillListing();
-    if (model->state() != ModelState::loading) {
-        loading_.cancel();
-        showsLoading_ = false;
-    }
-    list->setShowsPlaceholders(showsLoading_ || listing);
-    if (listing)
-        listingCheck_ = services.mainQueue.timer(listingCheckTime, [this] { updatePage(); });
-    list->setPage(listing ? std::nullopt : pageContent(), [this] { model->read(); });
-}
-
-/// An empty folder is not known to be empty before the cloud has been looked through once.
-bool DocumentListController::Impl::storeIsStillListing() const {
-    const std::optional<CloudStatus> status = services.cloud.status();
-    return status && !status->listed && !services.accounts.problem();
-}
-
-std::optional<StatusPage::Content> DocumentListController::Impl::pageContent() const {
-    if (model->state() == ModelState::failed)
-        return failurePage(*model->error());
-    if (model->state() == ModelState::ready && model->count() == 0)
-        return emptyPage();
-    return std::nullopt;
-}
-
-StatusPage::Content DocumentListController::Impl::emptyPage() const {
-    const bool isRoot = services.documents.shelfroot() == model->folder();
-    return {StatusPage::Drawing::emptyFolder,
-            localized("No documents here"),
-            isRoot ? localized("What applications keep in the cloud appears here.")
-                   : localized("Documents that are added to this folder, here or on another "
-                               "device, appear here."),
-            {}};
-}
-
-StatusPage::Content DocumentListController::Impl::failurePage(const Error& error) const {
-    const bool gone = error.is(ErrorCode::noSuchItem);
-    std::string cause = error.localizedDescription.value_or(std::string());
-    return {StatusPage::Drawing::problem,
-            gone ? localized("This folder is no longer here")
-                 : localized("This folder cannot be shown"),
-            std::move(cause), localized("Try Again")};
 }
 
 } // namespace platform

@@ -1,8 +1,8 @@
 #pragma once
 
-#include "platform/base/MainQueue.h"
 #include "platform/documents/DocumentListController.h"
 #include "platform/documents/DocumentServices.h"
+#include "platform/documents/FolderPage.h"
 #include "platform/documents/list/ListClient.h"
 #include "platform/documents/list/ListView.h"
 #include "platform/documents/list/RowArrivals.h"
@@ -28,7 +28,6 @@ struct DocumentListController::Impl final : ListClient {
     void setEditing(bool value, bool animated);
     void repaint();
     RowSelection& selection();
-    void updatePage();
     void openSearch();
     bool leaveEditing();
     /// The delegate hears of it once a turn of the loop.
@@ -59,19 +58,14 @@ private:
     ListState& rows() const;
     void rowsChanged();
     void followArrivals();
-    std::optional<StatusPage::Content> pageContent() const;
     StatusPage::Content emptyPage() const;
-    StatusPage::Content failurePage(const Error& error) const;
-    bool storeIsStillListing() const;
     void performAction(int action, const Url& url, Rect from, std::function<void()> done);
 
     /// What was selected before the view was loaded, which takes it over.
     RowSelection early_;
     RowArrivals arrivals_;
-    /// A short wait before the screen admits that it is loading.
-    Timer loading_;
-    bool showsLoading_ = false;
-    Timer listingCheck_;
+    /// None before the view is loaded.
+    std::unique_ptr<FolderPage> page_;
     bool reportPending_ = false;
     std::shared_ptr<bool> alive_ = std::make_shared<bool>(true);
 };

@@ -3,9 +3,12 @@
 #include "platform/base/Text.h"
 #include "platform/documents/DocumentPickerUnavailableViewController.h"
 #include "platform/documents/DocumentSearchController.h"
+#include "platform/documents/DocumentTargetSelectionController.h"
 #include "platform/documents/ListScreen.h"
 #include "platform/documents/PlatformPreviewController.h"
+#include "platform/documents/list/ListView.h"
 #include "platform/documents/list/ListWidget.h"
+#include "platform/documents/targets/TargetScreen.h"
 #include "platform/ui/Controls.h"
 #include "tests/documents/SampleDocuments.h"
 #include "tests/documents/ScreenHouse.h"
@@ -179,6 +182,54 @@ void previews() {
     preview(scene, "Archive.zip", "unknown-200");
 }
 
+/// The chooser for those items, over a list.
+std::shared_ptr<NavigationController> choose(Scene& scene, const std::vector<Url>& items) {
+    scene.list();
+    const auto chooser = DocumentTargetSelectionController::create(items);
+    scene.navigation->presentViewController(chooser, false);
+    for (int i = 0; i < 10; ++i) {
+        scene.advance(50ms);
+        scene.waitBriefly();
+    }
+    return std::static_pointer_cast<NavigationController>(chooser->childViewControllers().front());
+}
+
+void choosers() {
+    for (const bool rightToLeft : {false, true}) {
+        Scene scene({360, 640}, rightToLeft);
+        const std::string kind = rightToLeft ? "-rtl" : "-phone";
+        const auto stack = choose(
+            scene, {scene.url("Budget 2026.ods"), scene.url("Holiday").markedAsDirectory(true)});
+        scene.save("target-here" + kind);
+        ListWidget& rows = static_cast<TargetScreen&>(*stack->topViewController()).list().widget();
+        rows.state().activate(2); // "Work"
+        for (int i = 0; i < 10; ++i) {
+            scene.advance(50ms);
+            scene.waitBriefly();
+        }
+        scene.save("target-possible" + kind);
+        stack->topViewController()->toolbarItems().front()->perform();
+        scene.save("target-new-folder" + kind);
+    }
+    {
+        Scene scene({360, 640}, false, 2);
+        choose(scene, {scene.url("Budget 2026.ods")});
+        scene.save("target-here-200");
+    }
+    {
+        Scene scene({1024, 768});
+        const auto stack = choose(scene, {scene.url("Work/Minutes 1.txt")});
+        scene.save("target-tablet");
+        while (stack->popViewController(false)) {
+        }
+        for (int i = 0; i < 10; ++i) {
+            scene.advance(50ms);
+            scene.waitBriefly();
+        }
+        scene.save("target-root-tablet");
+    }
+}
+
 void others() {
     {
         Scene scene({360, 640});
@@ -233,6 +284,7 @@ int main(int argc, char** argv) {
     loadLocalizedTexts("en_US");
     lists();
     previews();
+    choosers();
     others();
     return 0;
 }

@@ -44,8 +44,8 @@ TEST_F(Names, findsPromisesFoldersAndFilesWhateverTheirLetterCaseAndAccents) {
     house.givenFile("Trips/Old PLANS/x.txt");
     house.givenFile(".hidden plan");
     EXPECT_THAT(find("plan"), ElementsAre("plan b.md", "Plan.pdf", "Old PLANS"));
-    EXPECT_THAT(places, ElementsAre("Notebook", "Documents › Trips › Réunion",
-                                    "Documents › Trips"));
+    EXPECT_THAT(places,
+                ElementsAre("Notebook", "Documents › Trips › Réunion", "Documents › Trips"));
     EXPECT_THAT(find("RE\u0301UNION"), ElementsAre("Réunion"));
     EXPECT_THAT(find("no such name"), IsEmpty());
 }
@@ -129,7 +129,8 @@ struct Watching : test::ListDelegate {
                                 navigation->presentedViewController()) != nullptr);
     }
     void documentListControllerDidSelectContainerWithViewController(
-        DocumentListController& list, const std::shared_ptr<DocumentListController>& next) override {
+        DocumentListController& list,
+        const std::shared_ptr<DocumentListController>& next) override {
         note();
         ListDelegate::documentListControllerDidSelectContainerWithViewController(list, next);
     }

@@ -62,7 +62,8 @@ public:
             return result;
         }
         const ListState& list = listState();
-        result.focusable = true;
+        result.disabled = !list.allows(*at);
+        result.focusable = !result.disabled;
         result.focused = list.hasFocus && list.current == row_;
         result.selectable = list.editing;
         result.selected = list.editing && list.selection.contains(row_);
@@ -77,7 +78,8 @@ public:
     }
 
     QStringList actionNames() const override {
-        if (!isValid())
+        const std::optional<std::size_t> at = index();
+        if (!at || !listState().allows(*at))
             return {};
         QStringList names{pressAction()};
         if (listState().editing || listState().client->listActions() == 0)
@@ -90,7 +92,7 @@ public:
 
     void doAction(const QString& name) override {
         const std::optional<std::size_t> at = index();
-        if (!at)
+        if (!at || !listState().allows(*at))
             return;
         ListState& list = listState();
         list.reveal(*at, false);

@@ -13,6 +13,9 @@ public:
     virtual ~ListClient() = default;
     /// The row was tapped, or Enter pressed on it, outside edit mode.
     virtual void listDidOpenRow(std::size_t index) = 0;
+    /// Whether anything can be done with the row; one that is not allowed is dimmed and only shows
+    /// that it is there.
+    virtual bool listAllowsRow(std::size_t /*index*/) const { return true; }
     /// The bit set of row actions that are offered; 0 for none.
     virtual unsigned listActions() const = 0;
     /// An action was chosen. `from` is where, in the list's coordinates. `done` ends the mark on

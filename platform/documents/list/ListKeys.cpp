@@ -44,15 +44,19 @@ bool ListKeys::moveCurrent(const QKeyEvent& event) {
     const std::size_t last = state_.model.count() - 1;
     const std::size_t page = pageStep();
     std::size_t to = 0;
+    // Where to look for a row that is allowed, should that one not be.
+    bool forward = true;
     switch (event.key()) {
     case Qt::Key_Down:
         to = at ? std::min(last, *at + 1) : state_.firstWholeInView();
         break;
     case Qt::Key_Up:
         to = at ? *at - std::min<std::size_t>(*at, 1) : state_.firstWholeInView();
+        forward = false;
         break;
     case Qt::Key_PageDown:
         to = std::min(last, at.value_or(0) + page);
+        forward = false;
         break;
     case Qt::Key_PageUp:
         to = at.value_or(0) - std::min(at.value_or(0), page);
@@ -61,13 +65,15 @@ bool ListKeys::moveCurrent(const QKeyEvent& event) {
         break;
     case Qt::Key_End:
         to = last;
+        forward = false;
         break;
     default:
         return false;
     }
     if (event.modifiers() & (Qt::AltModifier | Qt::MetaModifier))
         return false;
-    moveTo(to, event.modifiers().testFlag(Qt::ShiftModifier));
+    if (const auto allowed = state_.nextAllowed(to, forward))
+        moveTo(*allowed, event.modifiers().testFlag(Qt::ShiftModifier));
     return true;
 }
 
@@ -152,7 +158,8 @@ bool ListKeys::find(const QString& typed) {
     const std::size_t from = at ? *at + (typed_.size() == 1 || again ? 1 : 0) : 0;
     for (std::size_t i = 0; i < count; ++i) {
         const std::size_t index = (from + i) % count;
-        if (!shownName(state_.model.entryAt(index).title()).startsWith(wanted, Qt::CaseInsensitive))
+        if (!state_.allows(index) ||
+            !shownName(state_.model.entryAt(index).title()).startsWith(wanted, Qt::CaseInsensitive))
             continue;
         state_.setCurrent(index);
         state_.reveal(index, false);

@@ -54,7 +54,7 @@ void ListPointer::press(Point point, bool finger, Qt::KeyboardModifiers modifier
     MainQueue& queue = Runtime::current().mainQueue;
     if (finger_ && !state_.editing)
         longPress_ = queue.timer(longPressTime, [this] { longPress(); });
-    if (!row_ || hit_.part != ListHit::Part::row)
+    if (!row_ || hit_.part != ListHit::Part::row || !state_.allows(hit_.index))
         return;
     mark_ = queue.timer(finger_ ? markTime : Duration::zero(), [this] {
         state_.pressed = row_;
@@ -136,6 +136,8 @@ void ListPointer::tap() {
         state_.swipe.close();
         return;
     }
+    if (!state_.allows(*index))
+        return;
     state_.setCurrent(*index);
     if (hit_.part == ListHit::Part::more) {
         state_.askForActions(*index, state_.moreRect(*index));

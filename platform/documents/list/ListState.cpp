@@ -95,7 +95,8 @@ RowLook ListState::lookOf(std::size_t index) const {
     const RowId row = model.idAt(index);
     RowLook look;
     look.selected = editing && selection.contains(row);
-    look.hovered = hovered == row;
+    look.dimmed = !allows(index);
+    look.hovered = hovered == row && !look.dimmed;
     look.pressed = pressed == row || pending == row;
     look.focused = hasFocus && current == row && showsKeyboardFocus();
     look.more = client->listActions() != 0 &&
@@ -124,6 +125,22 @@ std::optional<std::size_t> ListState::indexOf(const std::optional<RowId>& row) c
     return row ? model.indexOf(*row) : std::nullopt;
 }
 
+std::optional<std::size_t> ListState::nextAllowed(std::size_t index, bool forward) const {
+    while (index < model.count() && !allows(index)) {
+        if (!forward && index == 0)
+            return std::nullopt;
+        forward ? ++index : --index;
+    }
+    return index < model.count() ? std::optional(index) : std::nullopt;
+}
+
+std::optional<std::size_t> ListState::allowedAround(std::size_t index) const {
+    if (model.count() == 0)
+        return std::nullopt;
+    const auto after = nextAllowed(index, true);
+    return after ? after : nextAllowed(std::min(index, model.count() - 1), false);
+}
+
 void ListState::reveal(std::size_t index, bool animated) {
     const double top = spans.top(index);
     const double bottom = top + spans.height(index);
@@ -146,6 +163,8 @@ void ListState::setCurrent(std::size_t index) {
 }
 
 void ListState::activate(std::size_t index) {
+    if (!allows(index))
+        return;
     if (editing)
         toggleSelected(index);
     else

@@ -44,6 +44,11 @@ public:
     RowLook lookOf(std::size_t index) const;
     /// Where "more" of the row is, or would be.
     Rect moreRect(std::size_t index);
+    bool allows(std::size_t index) const { return client->listAllowsRow(index); }
+    /// The first row that is allowed from `index` on, that way; none when there is none.
+    std::optional<std::size_t> nextAllowed(std::size_t index, bool forward) const;
+    /// The allowed row at `index`, else the nearest after it, else the nearest before.
+    std::optional<std::size_t> allowedAround(std::size_t index) const;
     /// The index of the row, when it is still there.
     std::optional<std::size_t> indexOf(const std::optional<RowId>& row) const;
 

@@ -160,8 +160,8 @@ void ListWidget::keepCurrent() {
     if (!state_.current || state_.model.contains(*state_.current))
         return;
     state_.current.reset();
-    if (state_.model.count() > 0)
-        state_.current = state_.model.idAt(std::min(currentIndex_, state_.model.count() - 1));
+    if (const auto next = state_.allowedAround(currentIndex_))
+        state_.current = state_.model.idAt(*next);
 }
 
 void ListWidget::rowContentDidChange(const std::vector<RowId>& rows) {
@@ -273,7 +273,8 @@ void ListWidget::contextMenuEvent(QContextMenuEvent* event) {
 void ListWidget::focusInEvent(QFocusEvent* event) {
     state_.hasFocus = true;
     if (!state_.current && state_.model.count() > 0)
-        state_.current = state_.model.idAt(state_.firstWholeInView());
+        if (const auto first = state_.allowedAround(state_.firstWholeInView()))
+            state_.current = state_.model.idAt(*first);
     const auto index = state_.indexOf(state_.current);
     const bool byKey =
         event->reason() == Qt::TabFocusReason || event->reason() == Qt::BacktabFocusReason;

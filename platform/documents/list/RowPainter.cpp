@@ -17,6 +17,8 @@ constexpr Color pressedFill = Color::hex(0xE9ECF1);
 constexpr Color placeholderFill = Color::hex(0xECEEF2);
 constexpr double frameCorner = 8;
 constexpr double containerCorner = 11;
+/// Quieter than the rows that can be opened, and still to be read.
+constexpr double dimmedAlpha = 0.45;
 /// Beside drawn-in actions a narrower second line would say nothing.
 constexpr double leastDetailsWidth = 96;
 
@@ -36,9 +38,11 @@ public:
         paintBackground();
         if (look_.editing > 0)
             paintCircle();
+        painter_.setOpacity(look_.dimmed ? dimmedAlpha : 1);
         paintIcon();
         paintTexts();
         paintBadge();
+        painter_.setOpacity(1);
         if (geometry_.chevron.width > 0)
             paintEnd(SystemImage::chevron, geometry_.chevron, 16, 1 - look_.editing);
         if (geometry_.more.width > 0)
@@ -184,7 +188,7 @@ RowParts partsOf(const RowContent& content, const RowLook& look, double width, d
     parts.iconEdge = rowIconEdge(content.kind);
     parts.badge = (content.promised || look.progress) && !look.aside;
     // The end of the row stays where it is while edit mode comes and goes.
-    parts.chevron = !isDocument(content.kind) && look.editing < 1 && !look.aside;
+    parts.chevron = !isDocument(content.kind) && look.editing < 1 && !look.aside && !look.dimmed;
     parts.more = look.more && look.editing < 1 && !look.aside;
     parts.editing = look.editing;
     return parts;

@@ -21,6 +21,8 @@ struct RowLook {
     /// The keyboard's row, to be seen.
     bool focused = false;
     bool more = false;
+    /// Nothing can be done with it.
+    bool dimmed = false;
     /// Made narrower by the actions that were drawn in beside it.
     bool aside = false;
     double editing = 0;

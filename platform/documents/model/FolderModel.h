@@ -26,6 +26,9 @@ public:
     /// The folder is shown again: what gave no notice meanwhile is looked up.
     void refreshShown();
     std::optional<std::size_t> indexOf(const Url& item) const;
+    /// An item of that name is in the folder.
+    bool contains(std::string_view name) const { return table_.find(name) != nullptr; }
+    using RowModel::contains;
 
     ModelState state() const override { return state_; }
     const std::optional<Error>& error() const override { return error_; }
