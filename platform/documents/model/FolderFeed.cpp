@@ -105,6 +105,9 @@ struct FolderFeed::State : std::enable_shared_from_this<FolderFeed::State> {
                         return;
                     }
             });
+        // It may have come back before the watch began.
+        if (identityNow())
+            readAll();
     }
 
     void followDependencies() {
