@@ -61,6 +61,10 @@ const char* textKey(ErrorCode code) {
     case ErrorCode::databaseFromLaterVersion:
         return "The store was used by a later version of this program. Update the program to open "
                "it.";
+    case ErrorCode::changedRemotely:
+        return "“%1$@” was changed on another device. Both versions are kept.";
+    case ErrorCode::nameRefused:
+        return "The Pelmora server cannot store an item named “%1$@”. Choose a different name.";
     case ErrorCode::databaseUnusable:
         return "The store's records cannot be opened.";
     }

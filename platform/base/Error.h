@@ -39,6 +39,10 @@ enum class ErrorCode {
     quotaExceeded = 4358,
     databaseFromLaterVersion = 4359,
     databaseUnusable = 4360,
+    /// The version on the server is not the one that the change was made for.
+    changedRemotely = 4361,
+    /// The server cannot hold an item of that name.
+    nameRefused = 4362,
 };
 
 /// What went wrong: a domain and a code to branch on, and words for the user. A value.

@@ -37,6 +37,26 @@ struct RemoteListing {
     std::vector<RefusedRow> refused;
 };
 
+/// What a change of a remote is bound to. A remote that cannot check it itself makes the change in
+/// steps that lose nothing (see engine notes in docs) and checks what it displaced.
+struct RemoteCondition {
+    /// The version that must stand at the path; none asks that the name is free.
+    std::optional<std::string> etag;
+    static RemoteCondition nameFree() { return {}; }
+    static RemoteCondition version(std::string etag) { return {std::move(etag)}; }
+};
+
+/// A content that goes up: where its bytes come from, and what belongs to it.
+struct RemoteUpload {
+    std::uint64_t size = 0;
+    Date modified;
+    /// As in the attribute user.xdg.tags.
+    std::string tags;
+    /// Fills the buffer from `offset` and answers how many bytes it took; 0 is the end. An error
+    /// (changedWhileRead above all) ends the upload, and nothing of it may be seen at the path.
+    std::function<Result<std::size_t>(std::uint64_t offset, std::span<std::byte> buffer)> read;
+};
+
 /// The far side of an account: a tree of folders and files that others change as well. Paths are
 /// relative to its root, without a leading slash ("" is the root). Calls block and may come from
 /// several threads at once; each can be cancelled (userCancelled).
@@ -58,6 +78,20 @@ public:
     /// when it did not stay the same, and then the pieces are worth nothing.
     virtual Result<RemoteEntry> read(const std::string& path, const Sink& sink,
                                      CancelFlag& cancel) = 0;
+    /// Changes. Each is whole or not at all as seen by others, and answers the item read back after
+    /// it. An error leaves open whether the change was applied, unless it is one of: fileExists (the
+    /// name is taken), changedRemotely (the condition did not hold), noSuchItem, writeNoPermission,
+    /// nameRefused, quotaExceeded, outOfSpace, readOnlyVolume; these say that it was not.
+    virtual Result<RemoteEntry> write(const std::string& path, const RemoteUpload& upload,
+                                      const RemoteCondition& condition, CancelFlag& cancel) = 0;
+    virtual Result<RemoteEntry> makeFolder(const std::string& path, CancelFlag& cancel) = 0;
+    /// Never replaces. `etag` is the version to move ("" for any, and for folders).
+    virtual Result<RemoteEntry> move(const std::string& from, const std::string& to,
+                                     const std::string& etag, CancelFlag& cancel) = 0;
+    /// Takes the item out of the tree, recoverably for a time. A file only in the given version; a
+    /// folder only when it is empty (folderNotEmpty otherwise).
+    [[nodiscard]] virtual Failure remove(const std::string& path, ItemKind kind,
+                                         const std::string& etag, CancelFlag& cancel) = 0;
     /// Bytes that may still be stored; none where the remote does not tell.
     virtual Result<std::optional<std::uint64_t>> freeBytes(CancelFlag& cancel) = 0;
 };
