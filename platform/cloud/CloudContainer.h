@@ -18,8 +18,9 @@ enum class FolderLevels { none = 0, any = 1, one = 2 };
 
 struct ContainerDocumentType {
     std::string name;
-    /// Type identifiers of the contents that the type takes.
-    std::vector<Value> contentTypes;
+    /// A list of the type identifiers of the contents that the type takes; any other kind of value
+    /// when the container's description is malformed there.
+    Value contentTypes;
 };
 
 /// An application library at the top of the store. An immutable snapshot of its rules.

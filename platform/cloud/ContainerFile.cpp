@@ -104,10 +104,8 @@ Failure readTypes(const Json& object, ContainerDescription& description) {
         ContainerDocumentType documentType;
         if (const auto name = type.find("name"); name != type.end() && name->is_string())
             documentType.name = name->get<std::string>();
-        if (const auto contents = type.find("contentTypes");
-            contents != type.end() && contents->is_array())
-            for (const Json& content : *contents)
-                documentType.contentTypes.push_back(valueOf(content));
+        if (const auto contents = type.find("contentTypes"); contents != type.end())
+            documentType.contentTypes = valueOf(*contents);
         description.documentTypes.push_back(std::move(documentType));
     }
     return std::nullopt;

@@ -23,6 +23,10 @@ struct RemoteEntry {
     std::optional<Date> created;
     /// Changes with every change of the item; equal means the same version.
     std::string etag;
+    /// The version is so young that another one of the same etag could follow it. A remote whose
+    /// etags are never shared says no; one that says yes gives the version another etag once it is
+    /// old enough.
+    bool young = false;
     /// The same for the item's whole life, wherever it moves; "" when the remote has none.
     std::string remoteId;
     SharedRole role = SharedRole::none;
@@ -38,7 +42,7 @@ struct RemoteListing {
 };
 
 /// What a change of a remote is bound to. A remote that cannot check it itself makes the change in
-/// steps that lose nothing (see engine notes in docs) and checks what it displaced.
+/// steps that lose nothing, and checks what it displaced; see docs/store.md.
 struct RemoteCondition {
     /// The version that must stand at the path; none asks that the name is free.
     std::optional<std::string> etag;
@@ -92,8 +96,14 @@ public:
     /// folder only when it is empty (folderNotEmpty otherwise).
     [[nodiscard]] virtual Failure remove(const std::string& path, ItemKind kind,
                                          const std::string& etag, CancelFlag& cancel) = 0;
+    /// What was answered so far survives a loss of power of the far side, as far as that can be
+    /// asked for. Asked once for many changes, before they count as agreed on.
+    [[nodiscard]] virtual Failure sync(CancelFlag& cancel) = 0;
     /// Bytes that may still be stored; none where the remote does not tell.
     virtual Result<std::optional<std::uint64_t>> freeBytes(CancelFlag& cancel) = 0;
+    /// The directory of this machine that holds the items, where the kernel's notices tell of every
+    /// change in it, whoever makes it; none where changes are found by asking alone.
+    virtual std::optional<std::string> watchableFolder() const { return std::nullopt; }
 };
 
 struct AccountRecord;

@@ -47,15 +47,43 @@ public:
         times[0].tv_nsec = UTIME_OMIT;
         times[1].tv_sec = modified.wholeSeconds();
         times[1].tv_nsec = modified.nanoseconds - modified.wholeSeconds() * 1'000'000'000;
-        if (futimens(file_.get(), times) != 0 || fsync(file_.get()) != 0)
-            return failed(path_);
-        return std::nullopt;
+        return futimens(file_.get(), times) == 0 ? Failure{} : failed(path_);
     }
+
+    Failure sync() override { return fsync(file_.get()) == 0 ? Failure{} : failed(path_); }
 
 private:
     FileDescriptor file_;
     std::string path_;
     off_t written_ = 0;
+};
+
+class RealOpenContent final : public OpenContent {
+public:
+    RealOpenContent(FileDescriptor file, std::string path)
+        : file_(std::move(file)), path_(std::move(path)) {}
+
+    Result<FileAttributes> attributes() override {
+        return FileManager::attributes("/proc/self/fd/" + std::to_string(file_.get()),
+                                       FollowLinks::yes);
+    }
+
+    Result<std::size_t> read(std::uint64_t offset, std::span<std::byte> buffer) override {
+        for (;;) {
+            const ssize_t got =
+                pread(file_.get(), buffer.data(), buffer.size(), static_cast<off_t>(offset));
+            if (got >= 0)
+                return static_cast<std::size_t>(got);
+            if (errno != EINTR)
+                return failed(path_, false);
+        }
+    }
+
+    Failure sync() override { return fsync(file_.get()) == 0 ? Failure{} : failed(path_); }
+
+private:
+    FileDescriptor file_;
+    std::string path_;
 };
 
 /// Puts the mark on the open file: as an attribute, or as content where the disk has none.
@@ -106,8 +134,29 @@ public:
         return FileManager::moveItem(Url::file(from), Url::file(to));
     }
 
+    Failure exchange(const std::string& a, const std::string& b) override {
+        return FileManager::exchangeItems(Url::file(a), Url::file(b));
+    }
+
     Failure removeFile(const std::string& path) override {
         return unlink(path.c_str()) == 0 || errno == ENOENT ? Failure{} : failed(path);
+    }
+
+    Failure removeFolder(const std::string& path) override {
+        return rmdir(path.c_str()) == 0 || errno == ENOENT ? Failure{} : failed(path);
+    }
+
+    Result<std::unique_ptr<OpenContent>> openContent(const std::string& path) override {
+        FileDescriptor file(open(path.c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_CLOEXEC));
+        if (!file)
+            return failed(path, false);
+        auto content = std::make_unique<RealOpenContent>(std::move(file), path);
+        const Result<FileAttributes> attributes = content->attributes();
+        if (!attributes)
+            return attributes.error();
+        if (attributes->kind != FileKind::file)
+            return makeError(ErrorCode::invalidArgument, Url::file(path).lastPathComponent());
+        return std::unique_ptr<OpenContent>(std::move(content));
     }
 
     Result<std::unique_ptr<StagedFile>> stage(const std::string& path,
@@ -134,6 +183,10 @@ public:
     Failure syncFolder(const std::string& path) override { return syncWith(path, &fsync); }
 
     Failure syncAll(const std::string& path) override { return syncWith(path, &syncfs); }
+
+    Result<std::uint64_t> freeBytes(const std::string& path) override {
+        return FileManager::freeBytes(path);
+    }
 
 private:
     static Failure syncWith(const std::string& path, int (*sync)(int)) {

@@ -207,6 +207,8 @@ Result<RemoteEntry> Transfers::stage(Transfer& transfer, const std::string& remo
         return makeError(ErrorCode::changedWhileRead, version->name);
     if (Failure failure = (*file)->finish(version->modified, version->tags))
         return *failure;
+    if (Failure failure = (*file)->sync())
+        return *failure;
     hash = content.finish();
     return version;
 }

@@ -102,7 +102,8 @@ TEST_F(Documents, FindsTheContainerOfAnItemAndItsRules) {
     givenRemote("Music/.container.json",
                 R"({"identifier": "com.example.music", "names": {"": "Tunes"},
                     "documents": "Documents", "folderLevels": "one",
-                    "documentTypes": [{"contentTypes": ["public.audio", 7]}]})");
+                    "documentTypes": [{"contentTypes": ["public.audio", 7]},
+                                      {"contentTypes": "public.audio"}]})");
     givenRemote("Music/Documents/a.wav", "a");
     givenRemote("Broken/.container.json", R"({"identifier": 12)");
     givenRemote("Bare/.container.json", R"({"documents": null})");
@@ -117,7 +118,8 @@ TEST_F(Documents, FindsTheContainerOfAnItemAndItsRules) {
     EXPECT_EQ(music->localizedName(), "Tunes");
     EXPECT_EQ(music->documentsURL(), url("Music/Documents"));
     EXPECT_EQ(music->supportedFolderLevels(), static_cast<int>(FolderLevels::one));
-    EXPECT_EQ(music->documentTypes().at(0).contentTypes.at(1).integer(), 7);
+    EXPECT_EQ(music->documentTypes().at(0).contentTypes.list()->at(1).integer(), 7);
+    EXPECT_EQ(*music->documentTypes().at(1).contentTypes.text(), "public.audio") << "as it is";
     EXPECT_FALSE((*documents().containerForItemAtURL(url("Bare")))->documentsURL());
     EXPECT_TRUE(documents().isDocumentsContainer(url("Music/Documents")));
     EXPECT_FALSE(documents().isDocumentsContainer(url("Music")));
