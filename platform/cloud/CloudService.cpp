@@ -22,7 +22,7 @@ struct CloudService::State final : CloudAccountService, ContentProvider, CloudDa
         if (!parts.disk)
             parts.disk = makeRealStoreFileSystem();
         if (!parts.remotes)
-            parts.remotes = standardRemotes();
+            parts.remotes = standardRemotes(parts.clock);
     }
 
     // CloudAccountService

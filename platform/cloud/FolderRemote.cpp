@@ -2,6 +2,8 @@
 
 #include "platform/base/Text.h"
 #include "platform/cloud/AccountFile.h"
+#include "platform/cloud/FolderVersion.h"
+#include "platform/cloud/SyncTimes.h"
 #include "platform/cloud/Tokens.h"
 #include "platform/files/FileDescriptor.h"
 
@@ -18,22 +20,6 @@ constexpr std::size_t pieceSize = 1024 * 1024;
 constexpr int listingTries = 3;
 constexpr std::uint64_t largestMark = 256;
 constexpr const char* sharedAttribute = "user.pelmora.shared";
-
-std::string hexOf(std::int64_t number) {
-    return hexText(static_cast<std::uint64_t>(number));
-}
-
-std::string identityText(const FileAttributes& attributes) {
-    // Not the device: its number differs from mount to mount.
-    return hexText(attributes.identity.inode) + '-' + hexOf(attributes.identity.birthNanoseconds);
-}
-
-std::string versionText(const FileAttributes& attributes) {
-    if (attributes.kind == FileKind::directory)
-        return identityText(attributes);
-    return hexText(attributes.size) + '-' + hexOf(attributes.modified.nanoseconds) + '-' +
-           hexOf(attributes.changed.nanoseconds) + '-' + identityText(attributes);
-}
 
 bool sameFolderState(const FileAttributes& a, const FileAttributes& b) {
     return a.identity == b.identity && a.modified == b.modified && a.changed == b.changed;
@@ -55,12 +41,22 @@ bool meansAway(const Error& error) {
 
 } // namespace
 
-RemoteFactory standardRemotes() {
-    return [](const AccountRecord& account) -> std::unique_ptr<Remote> {
+RemoteFactory standardRemotes(Clock& clock) {
+    return [&clock](const AccountRecord& account) -> std::unique_ptr<Remote> {
         if (account.kind == folderAccountKind)
-            return std::make_unique<FolderRemote>(account.address);
+            return std::make_unique<FolderRemote>(account.address, clock);
         return nullptr;
     };
+}
+
+FolderRemote::FolderRemote(std::string root, Clock& clock)
+    : root_(std::move(root)),
+      clock_(clock),
+      trash_(root_ + '/' + std::string(remoteServiceFolder), clock) {
+}
+
+std::string FolderRemote::versionOf(const FileAttributes& attributes) const {
+    return versionText(attributes, clock_.now());
 }
 
 Error FolderRemote::away() const {
@@ -104,10 +100,11 @@ Result<std::string> FolderRemote::connect(CancelFlag& cancel) {
         mark = hexText(randomBytes(16));
         if (FileManager::createDirectory(Url::file(folder), true) ||
             FileManager::writeAtomically(markFile, mark))
-            mark = "unmarked " + identityText(*root);
+            mark = "unmarked " + versionOf(*root);
     } else {
         return content.error();
     }
+    trash_.expire();
     const std::lock_guard lock(mutex_);
     identity_ = root->identity;
     return mark;
@@ -186,7 +183,9 @@ std::optional<RemoteEntry> FolderRemote::entryOf(const std::string& path, std::s
     entry.modified = attributes.modified;
     if (attributes.identity.birthNanoseconds != 0)
         entry.created = attributes.created;
-    entry.etag = versionText(attributes);
+    const Date now = clock_.now();
+    entry.etag = versionText(attributes, now);
+    entry.young = entry.kind == ItemKind::file && isYoung(attributes.modified, now);
     entry.remoteId = identityText(attributes);
     if (llistxattr(path.c_str(), nullptr, 0) > 0) { // one call for the many without any
         entry.role = roleOf(extendedAttribute(path, sharedAttribute, FollowLinks::no));
@@ -223,7 +222,8 @@ Result<RemoteEntry> FolderRemote::read(const std::string& path, const Sink& sink
         return translated(posixError(errno, Url::file(full), false));
     const Error changed = makeError(ErrorCode::changedWhileRead, before->name);
     const Result<FileAttributes> opened = attributesOfOpen(file.get());
-    if (!opened || versionText(*opened) != before->etag || before->kind != ItemKind::file)
+    // A version may have grown up since: then the next try sees it so from the start.
+    if (!opened || versionOf(*opened) != before->etag || before->kind != ItemKind::file)
         return changed;
     posix_fadvise(file.get(), 0, 0, POSIX_FADV_SEQUENTIAL);
     std::vector<std::byte> piece(std::min<std::uint64_t>(pieceSize, before->size + 1));
@@ -245,13 +245,13 @@ Result<RemoteEntry> FolderRemote::read(const std::string& path, const Sink& sink
             return *failure;
     }
     const Result<FileAttributes> after = attributesOfOpen(file.get());
-    const Result<RemoteEntry> standing = entry(path, cancel);
+    const Result<FileAttributes> standing = FileManager::attributes(full, FollowLinks::no);
     if (!standing && !standing.error().is(ErrorCode::noSuchItem))
-        return standing.error();
-    if (total != before->size || !after || versionText(*after) != before->etag || !standing ||
-        standing->etag != before->etag)
+        return translated(standing.error());
+    if (total != before->size || !after || !sameVersion(*after, *opened) || !standing ||
+        !sameVersion(*standing, *opened))
         return changed;
-    return *standing;
+    return before; // also when it has grown up meanwhile: it was read while it was young
 }
 
 Result<std::optional<std::uint64_t>> FolderRemote::freeBytes(CancelFlag& cancel) {

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "platform/base/Clock.h"
 #include "platform/base/Result.h"
 #include "platform/cloud/StateRecords.h"
 #include "platform/files/ContentProvider.h"
@@ -110,7 +111,7 @@ struct AccountRecord;
 /// Makes the remote of an account; empty for a kind that this version does not know. Does not
 /// touch the remote: that is for connect().
 using RemoteFactory = std::function<std::unique_ptr<Remote>(const AccountRecord& account)>;
-RemoteFactory standardRemotes();
+RemoteFactory standardRemotes(Clock& clock);
 
 /// Files and folders of a remote that serve the store and are no items of it.
 inline constexpr std::string_view remoteServiceFolder = ".pelmora";

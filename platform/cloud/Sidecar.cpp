@@ -1,6 +1,7 @@
 #include "platform/cloud/Sidecar.h"
 
 #include "platform/cloud/ContentHash.h"
+#include "platform/cloud/SyncNames.h"
 #include "platform/cloud/Tokens.h"
 #include "platform/files/FileManager.h"
 
@@ -22,15 +23,6 @@ constexpr std::size_t keptBytes = 200;
 /// A mark with a whole name in it is the longest.
 constexpr std::size_t longestMark = 512;
 constexpr std::string_view version = "1";
-
-std::string_view cutAtCharacter(std::string_view name, std::size_t limit) {
-    if (name.size() <= limit)
-        return name;
-    std::size_t end = limit;
-    while (end > 0 && (static_cast<unsigned char>(name[end]) & 0xC0) == 0x80)
-        --end;
-    return name.substr(0, end == 0 ? limit : end);
-}
 
 /// The word at the head of `text`, which loses it and the blank behind.
 std::string_view takeWord(std::string_view& text) {

@@ -54,8 +54,8 @@ public:
     [[nodiscard]] virtual Failure setMark(const std::string& path, const std::string& mark) = 0;
     /// Never replaces: fileExists when something stands at `to`.
     [[nodiscard]] virtual Failure rename(const std::string& from, const std::string& to) = 0;
-    /// Swaps two files at once: there is no moment at which either name has nothing. noSuchItem when
-    /// one of them is gone; unsupportedOperation where the disk cannot do it.
+    /// Swaps two files at once: there is no moment at which either name has nothing. noSuchItem
+    /// when one of them is gone; unsupportedOperation where the disk cannot do it.
     [[nodiscard]] virtual Failure exchange(const std::string& a, const std::string& b) = 0;
     /// A file or a link; success when it is gone already.
     [[nodiscard]] virtual Failure removeFile(const std::string& path) = 0;

@@ -11,17 +11,10 @@ using namespace std::chrono_literals;
 namespace {
 
 /// A remote that lets a test do something in the middle of a content.
-class InterruptedRemote final : public Remote {
+class InterruptedRemote final : public test::ForwardingRemote {
 public:
     InterruptedRemote(std::unique_ptr<Remote> real, std::function<void()> middle)
-        : real_(std::move(real)), middle_(std::move(middle)) {}
-    Result<std::string> connect(CancelFlag& cancel) override { return real_->connect(cancel); }
-    Result<RemoteListing> list(const std::string& path, CancelFlag& cancel) override {
-        return real_->list(path, cancel);
-    }
-    Result<RemoteEntry> entry(const std::string& path, CancelFlag& cancel) override {
-        return real_->entry(path, cancel);
-    }
+        : ForwardingRemote(std::move(real)), middle_(std::move(middle)) {}
     Result<RemoteEntry> read(const std::string& path, const Sink& sink,
                              CancelFlag& cancel) override {
         return real_->read(
@@ -32,12 +25,8 @@ public:
             },
             cancel);
     }
-    Result<std::optional<std::uint64_t>> freeBytes(CancelFlag& cancel) override {
-        return real_->freeBytes(cancel);
-    }
 
 private:
-    std::unique_ptr<Remote> real_;
     std::function<void()> middle_;
 };
 

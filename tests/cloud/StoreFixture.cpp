@@ -38,8 +38,20 @@ public:
     Failure rename(const std::string& from, const std::string& to) override {
         return run("rename", [&] { return real_->rename(from, to); });
     }
+    Failure exchange(const std::string& a, const std::string& b) override {
+        return run("exchange", [&] { return real_->exchange(a, b); });
+    }
     Failure removeFile(const std::string& path) override {
         return run("remove", [&] { return real_->removeFile(path); });
+    }
+    Failure removeFolder(const std::string& path) override {
+        return run("remove", [&] { return real_->removeFolder(path); });
+    }
+    Result<std::unique_ptr<OpenContent>> openContent(const std::string& path) override {
+        return real_->openContent(path);
+    }
+    Result<std::uint64_t> freeBytes(const std::string& path) override {
+        return real_->freeBytes(path);
     }
     Result<std::unique_ptr<StagedFile>> stage(const std::string& path,
                                               std::uint64_t size) override {
@@ -71,6 +83,9 @@ private:
         }
         Failure finish(Date modified, const std::string& tags) override {
             return owner_.run("finish", [&] { return real_->finish(modified, tags); });
+        }
+        Failure sync() override {
+            return owner_.run("sync", [&] { return real_->sync(); });
         }
 
     private:

@@ -19,6 +19,54 @@
 
 namespace test {
 
+/// Hands everything on to another remote; a test changes what it is about.
+class ForwardingRemote : public platform::Remote {
+public:
+    explicit ForwardingRemote(std::unique_ptr<platform::Remote> real) : real_(std::move(real)) {}
+    platform::Result<std::string> connect(platform::CancelFlag& cancel) override {
+        return real_->connect(cancel);
+    }
+    platform::Result<platform::RemoteListing> list(const std::string& path,
+                                                   platform::CancelFlag& cancel) override {
+        return real_->list(path, cancel);
+    }
+    platform::Result<platform::RemoteEntry> entry(const std::string& path,
+                                                  platform::CancelFlag& cancel) override {
+        return real_->entry(path, cancel);
+    }
+    platform::Result<platform::RemoteEntry> read(const std::string& path, const Sink& sink,
+                                                 platform::CancelFlag& cancel) override {
+        return real_->read(path, sink, cancel);
+    }
+    platform::Result<platform::RemoteEntry> write(const std::string& path,
+                                                  const platform::RemoteUpload& upload,
+                                                  const platform::RemoteCondition& condition,
+                                                  platform::CancelFlag& cancel) override {
+        return real_->write(path, upload, condition, cancel);
+    }
+    platform::Result<platform::RemoteEntry> makeFolder(const std::string& path,
+                                                       platform::CancelFlag& cancel) override {
+        return real_->makeFolder(path, cancel);
+    }
+    platform::Result<platform::RemoteEntry> move(const std::string& from, const std::string& to,
+                                                 const std::string& etag,
+                                                 platform::CancelFlag& cancel) override {
+        return real_->move(from, to, etag, cancel);
+    }
+    platform::Failure remove(const std::string& path, platform::ItemKind kind,
+                             const std::string& etag, platform::CancelFlag& cancel) override {
+        return real_->remove(path, kind, etag, cancel);
+    }
+    platform::Failure sync(platform::CancelFlag& cancel) override { return real_->sync(cancel); }
+    platform::Result<std::optional<std::uint64_t>>
+    freeBytes(platform::CancelFlag& cancel) override {
+        return real_->freeBytes(cancel);
+    }
+
+protected:
+    std::unique_ptr<platform::Remote> real_;
+};
+
 /// A real remote folder and a real store, and words for what is done to both.
 struct StoreFixture : ::testing::Test {
     TemporaryFolder home;
@@ -31,7 +79,7 @@ struct StoreFixture : ::testing::Test {
 
     std::unique_ptr<platform::StoreFileSystem> disk = platform::makeRealStoreFileSystem();
     std::unique_ptr<platform::Remote> remote =
-        std::make_unique<platform::FolderRemote>(home / "remote");
+        std::make_unique<platform::FolderRemote>(home / "remote", clock);
     std::unique_ptr<platform::WorkQueue> queue;
     std::optional<platform::OpenedStore> store;
     std::optional<platform::StoreContext> context;
