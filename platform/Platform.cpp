@@ -189,6 +189,10 @@ CloudDocumentService& Platform::documents() {
     return state_->cloud->documents();
 }
 
+KeyValueCloudStore& Platform::keyValueStore() {
+    return state_->cloud->keyValues();
+}
+
 CloudDatabase& Platform::privateDatabase(std::string_view /*containerIdentifier*/) {
     // An account has one limit, whichever container asks.
     return state_->cloud->database();

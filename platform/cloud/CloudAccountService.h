@@ -39,9 +39,9 @@ public:
     /// The current account's token; none when nobody is signed in. Safe from any thread.
     virtual std::optional<IdentityToken> identityToken() const = 0;
     virtual std::optional<AccountSummary> account() const = 0;
-    /// What is wrong, and what to do about it, in the user's language: nobody is signed in, a damaged
-    /// account file, an unknown kind, a store that another program has; also a remote that is away,
-    /// with which an account stays usable. None when all is well. Safe from any thread.
+    /// What is wrong, and what to do about it, in the user's language: nobody is signed in, a
+    /// damaged account file, an unknown kind, a store that another program has; also a remote that
+    /// is away, with which an account stays usable. None when all is well. Safe from any thread.
     virtual std::optional<std::string> problem() const = 0;
 };
 

@@ -54,6 +54,25 @@ public:
     /// Tag names; empty when the item has none.
     virtual std::vector<std::string> tags(const Url& url) const = 0;
 
+    // Changes: blocking, from any thread but a queue that somebody here waits for. The first two do
+    // not coordinate: whoever calls them does. Items outside the store are treated as plain files.
+
+    /// Moves a document, a promise (with its sidecar) or a folder. Never replaces: fileExists when
+    /// something stands, or is promised, at `to`.
+    [[nodiscard]] virtual Failure moveItem(const Url& source, const Url& to) = 0;
+    /// Deletes a document, a promise, or a folder with all in it. Local content goes to the store's
+    /// kept folder; see docs/store.md.
+    [[nodiscard]] virtual Failure removeItem(const Url& item) = 0;
+    /// Leaves of the document on this device but a promise. Refused with notUploadedYet while the
+    /// account is not known to have the content, byte for byte, and when the account cannot be
+    /// asked. Success when it is a promise already. Coordinates the change itself.
+    [[nodiscard]] virtual Failure evictItem(const Url& item) = 0;
+    /// Deletes a library here and on the account, recoverably on both; coordinates the change
+    /// itself. Nothing is changed when the account cannot be read. Another error tells that a part
+    /// is still on the account.
+    [[nodiscard]] virtual Failure
+    deleteAllContentsOnClientAndServer(const CloudContainer& container) = 0;
+
     /// Security-scoped access, for stores that need it; answers whether it was granted.
     virtual bool startAccessing(const Url& /*url*/) { return false; }
     virtual void stopAccessing(const Url& /*url*/) {}

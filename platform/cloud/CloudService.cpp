@@ -4,6 +4,7 @@
 #include "platform/base/NotificationCenter.h"
 #include "platform/base/Text.h"
 #include "platform/cloud/AccountMonitor.h"
+#include "platform/cloud/KeyValueCloudStore.h"
 #include "platform/cloud/StoreDocuments.h"
 #include "platform/cloud/StoreEngine.h"
 #include "platform/cloud/StoreFileSystem.h"
@@ -17,8 +18,12 @@ std::optional<IdentityToken> IdentityToken::deserialized(const Bytes& bytes) {
 }
 
 /// The engine changes with the account; whoever works with it holds it as long as that takes.
-struct CloudService::State final : CloudAccountService, ContentProvider, CloudDatabase {
-    explicit State(Parts given) : parts(std::move(given)), documents(slot) {
+struct CloudService::State final : CloudAccountService,
+                                   ContentProvider,
+                                   CloudDatabase,
+                                   KeyValueCloudStore {
+    explicit State(Parts given)
+        : parts(std::move(given)), documents(slot, [this] { return current(); }) {
         if (!parts.disk)
             parts.disk = makeRealStoreFileSystem();
         if (!parts.remotes)
@@ -53,8 +58,28 @@ struct CloudService::State final : CloudAccountService, ContentProvider, CloudDa
         return held ? held->makeLocal(item, cancel) : Failure(makeError(ErrorCode::noAccount));
     }
     Failure moveItem(const Url& from, const Url& to) override {
+        return documents.moveItem(from, to);
+    }
+
+    // KeyValueCloudStore
+    Value value(std::string_view key) const override {
         const std::shared_ptr<StoreEngine> held = current();
-        return held ? held->moveItem(from, to) : FileManager::moveItem(from, to);
+        return held ? held->values().value(key) : Value();
+    }
+    void setValue(std::string_view key, Value value) override {
+        const std::shared_ptr<StoreEngine> held = current();
+        if (!held) {
+            platformLog(LogLevel::warning, "cloud: “%@” is not kept: nobody is signed in", key);
+            return;
+        }
+        if (const Failure failure = held->values().setValue(key, std::move(value)))
+            platformLog(LogLevel::error, "cloud: cannot keep “%@” on the disk: %@", key, *failure);
+        held->exchangeValues();
+    }
+    void tellOfValues() {
+        parts.main.async([&notifications = parts.notifications] {
+            notifications.post(keyValueStoreDidChangeExternallyNotification);
+        });
     }
 
     // CloudDatabase
@@ -99,8 +124,10 @@ struct CloudService::State final : CloudAccountService, ContentProvider, CloudDa
             platformLog(LogLevel::warning, "cloud: no account: %@", *unsupported);
             return;
         }
-        const StoreEngine::Services services{parts.clock,   parts.watcher, parts.progress,
-                                             parts.folders, *parts.disk,   slot};
+        const StoreEngine::Services services{
+            parts.clock, parts.watcher, parts.progress, parts.folders, *parts.disk, slot, [this] {
+                tellOfValues();
+            }};
         auto next = std::make_shared<StoreEngine>(services, *now.account, std::move(remote));
         next->open(parts.readOnly);
         const std::lock_guard lock(mutex);
@@ -123,6 +150,7 @@ CloudService::CloudService(Parts parts) : state_(std::make_unique<State>(std::mo
         state.parts.folders, state.parts.main, state.parts.watcher, [&state] {
             state.follow(state.monitor->reading());
             state.parts.notifications.post(cloudIdentityDidChangeNotification);
+            state.tellOfValues(); // those of another account
         });
     state.follow(state.monitor->reading());
 }
@@ -141,6 +169,10 @@ CloudDocumentService& CloudService::documents() {
 }
 
 ContentProvider& CloudService::contents() {
+    return *state_;
+}
+
+KeyValueCloudStore& CloudService::keyValues() {
     return *state_;
 }
 

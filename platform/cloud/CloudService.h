@@ -18,6 +18,7 @@ class Clock;
 class ContentProvider;
 class DirectoryWatcher;
 class FileProgressSubscription;
+class KeyValueCloudStore;
 class MainQueue;
 class NotificationCenter;
 class Remote;
@@ -68,6 +69,8 @@ public:
     CloudDocumentService& documents();
     /// For the file coordinator. Safe from any thread.
     ContentProvider& contents();
+    /// Safe from any thread.
+    KeyValueCloudStore& keyValues();
     /// For questions of quota.
     CloudDatabase& database();
 

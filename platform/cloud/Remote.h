@@ -84,9 +84,10 @@ public:
     virtual Result<RemoteEntry> read(const std::string& path, const Sink& sink,
                                      CancelFlag& cancel) = 0;
     /// Changes. Each is whole or not at all as seen by others, and answers the item read back after
-    /// it. An error leaves open whether the change was applied, unless it is one of: fileExists (the
-    /// name is taken), changedRemotely (the condition did not hold), noSuchItem, writeNoPermission,
-    /// nameRefused, quotaExceeded, outOfSpace, readOnlyVolume; these say that it was not.
+    /// it. An error leaves open whether the change was applied, unless it is one of: fileExists
+    /// (the name is taken), changedRemotely (the condition did not hold), noSuchItem,
+    /// writeNoPermission, nameRefused, quotaExceeded, outOfSpace, readOnlyVolume; these say that it
+    /// was not.
     virtual Result<RemoteEntry> write(const std::string& path, const RemoteUpload& upload,
                                       const RemoteCondition& condition, CancelFlag& cancel) = 0;
     virtual Result<RemoteEntry> makeFolder(const std::string& path, CancelFlag& cancel) = 0;

@@ -174,6 +174,37 @@ void StateDatabase::removeLocal(ItemId item) {
     handles_->prepared("DELETE FROM local WHERE item = ?1").with(item).run();
 }
 
+// Of the item as the user sees it: its folder and its parts.
+#define SHOWN_TREE                                                                                 \
+    "WITH RECURSIVE tree(id) AS (SELECT ?1 UNION"                                                  \
+    " SELECT item.id FROM item JOIN tree ON item.parent = tree.id) "
+
+void StateDatabase::forgetLocalTree(ItemId item) {
+    // The tree is told by the places that it is about to lose.
+    handles_->prepared("CREATE TEMP TABLE IF NOT EXISTS gone(id INTEGER PRIMARY KEY)").with().run();
+    handles_->prepared("DELETE FROM gone").with().run();
+    handles_->prepared("INSERT INTO gone " SHOWN_TREE "SELECT id FROM tree").with(item).run();
+    handles_->prepared("DELETE FROM local WHERE item IN (SELECT id FROM gone)").with().run();
+    handles_
+        ->prepared("UPDATE item SET parent = NULL, name = NULL, folded = NULL"
+                   " WHERE id IN (SELECT id FROM gone)")
+        .with()
+        .run();
+    handles_
+        ->prepared("DELETE FROM item WHERE id IN (SELECT id FROM gone)"
+                   " AND id NOT IN (SELECT item FROM remote) AND id NOT IN (SELECT item FROM base)")
+        .with()
+        .run();
+}
+
+void StateDatabase::removeItem(ItemId item) {
+    handles_->prepared("DELETE FROM item WHERE id = ?1").with(item).run();
+}
+
+void StateDatabase::removeRemote(ItemId item) {
+    handles_->prepared("DELETE FROM remote WHERE item = ?1").with(item).run();
+}
+
 void StateDatabase::putBase(ItemId item, const BaseRow& row) {
     std::optional<Bytes> hash;
     if (!row.hash.empty())

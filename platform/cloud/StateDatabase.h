@@ -74,6 +74,12 @@ public:
     void setRemoteGeneration(ItemId item, std::int64_t generation);
     void putLocal(ItemId item, const LocalRow& row);
     void removeLocal(ItemId item);
+    /// The item and everything in it is not on the disk any more. What neither the remote nor a
+    /// base knows is forgotten altogether.
+    void forgetLocalTree(ItemId item);
+    void removeRemote(ItemId item);
+    /// Forgets an item in which nobody's place is, with all that was known of it.
+    void removeItem(ItemId item);
     void putBase(ItemId item, const BaseRow& row);
     /// A folder's listing number. A row of the remote whose generation equals it is there; one less
     /// is missing since one whole listing, two less since two. The number moves on only when

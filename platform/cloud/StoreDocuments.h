@@ -3,12 +3,20 @@
 #include "platform/cloud/CloudDocumentService.h"
 #include "platform/cloud/StoreView.h"
 
+#include <functional>
+#include <memory>
+
 namespace platform {
 
-/// Answers from the disk, from memory and, for promises alone, from the state database.
+class StoreEngine;
+
+/// Answers from the disk, from memory and, for promises alone, from the state database; changes are
+/// the engine's.
 class StoreDocuments final : public CloudDocumentService {
 public:
-    explicit StoreDocuments(const StoreViewSlot& slot) : slot_(slot) {}
+    using CurrentEngine = std::function<std::shared_ptr<StoreEngine>()>;
+    StoreDocuments(const StoreViewSlot& slot, CurrentEngine engine)
+        : slot_(slot), engine_(std::move(engine)) {}
 
     std::optional<Url> shelfroot() const override;
     bool isInShelfroot(const Url& url) const override;
@@ -34,11 +42,18 @@ public:
 
     std::vector<std::string> tags(const Url& url) const override;
 
+    [[nodiscard]] Failure moveItem(const Url& source, const Url& to) override;
+    [[nodiscard]] Failure removeItem(const Url& item) override;
+    [[nodiscard]] Failure evictItem(const Url& item) override;
+    [[nodiscard]] Failure
+    deleteAllContentsOnClientAndServer(const CloudContainer& container) override;
+
 private:
     /// The mark of the promise for the document at `path`, when nothing stands there.
     std::optional<FoundSidecar> promiseFor(const StoreView& view, std::string_view path) const;
 
     const StoreViewSlot& slot_;
+    const CurrentEngine engine_;
 };
 
 } // namespace platform

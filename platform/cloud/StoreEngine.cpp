@@ -5,7 +5,6 @@
 #include "platform/base/Text.h"
 #include "platform/cloud/AttributeReading.h"
 #include "platform/cloud/StoreFileSystem.h"
-#include "platform/cloud/StoreMoves.h"
 
 #include <cstdlib>
 #include <functional>
@@ -36,9 +35,12 @@ StoreEngine::StoreEngine(const Services& services, const AccountRecord& account,
       account_(account),
       layout_(StoreLayout::of(services.folders, account)),
       remote_(std::move(remote)),
+      values_(layout_.values(), services.disk, services.clock, services.valuesChanged),
       backoff_(seedOf(account)),
       queue_(std::make_unique<WorkQueue>(queueLabel(".cloud"), WorkPriority::userInitiated)),
-      listing_(std::make_unique<WorkQueue>(queueLabel(".cloud.listing"), WorkPriority::standard)) {
+      listing_(std::make_unique<WorkQueue>(queueLabel(".cloud.listing"), WorkPriority::standard)),
+      exchanging_(
+          std::make_unique<WorkQueue>(queueLabel(".cloud.values"), WorkPriority::standard)) {
     view_.containers = std::make_shared<const ContainerSet>();
     view_.roles = std::make_shared<const SharedRoles>();
 }
@@ -57,14 +59,21 @@ void StoreEngine::stop() {
     }
     if (transfers)
         transfers->stop(); // while the queue that their last steps need has the store
+    {
+        std::unique_lock lock(mutex_);
+        unused_.wait(lock, [this] { return uses_ == 0; });
+    }
     listing_->sync([] {});
     queue_->sync([this] {
+        valuesWatch_.reset();
         rootWatch_.reset();
         containerWatches_.clear();
+        values_.close();
         context_.reset();
         view_.reader.reset(); // the last connection to close puts the database in order
         store_.reset();
     });
+    exchanging_->sync([] {});
 }
 
 void StoreEngine::open(bool readOnly) {
@@ -139,6 +148,7 @@ void StoreEngine::begin(OpenedStore store) {
     openForReading();
     readRoles();
     publish();
+    values_.open();
     {
         auto transfers = std::make_shared<Transfers>(
             *context_, services_.progress, account_.rateLimit.value_or(0), [this](ItemId) {
@@ -280,28 +290,7 @@ Failure StoreEngine::makeLocal(const Url& item, CancelFlag& cancel) {
 }
 
 Failure StoreEngine::fetch(Transfers& transfers, const Url& item, CancelFlag& cancel) {
-    if (Failure failure = connect())
-        return failure;
-    Failure failure = transfers.fetch(item, cancel);
-    if (!failure || !failure->is(ErrorCode::serverNotAvailable))
-        return failure;
-    // A disk that was away and came back is the same by its mark alone.
-    connected_ = false;
-    if (Failure away = connect())
-        return away;
-    return transfers.fetch(item, cancel);
-}
-
-Failure StoreEngine::moveItem(const Url& from, const Url& to) {
-    Failure failure;
-    queue_->sync([&] {
-        failure = context_ ? StoreMoves(*context_).move(from, to) : Failure(notOpen());
-        if (!failure) {
-            readRoles();
-            publish();
-        }
-    });
-    return failure;
+    return withRemote([&] { return transfers.fetch(item, cancel); });
 }
 
 } // namespace platform

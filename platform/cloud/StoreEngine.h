@@ -2,6 +2,8 @@
 
 #include "platform/cloud/AccountFile.h"
 #include "platform/cloud/Backoff.h"
+#include "platform/cloud/CloudContainer.h"
+#include "platform/cloud/KeyValueSync.h"
 #include "platform/cloud/Remote.h"
 #include "platform/cloud/StoreContext.h"
 #include "platform/cloud/StoreView.h"
@@ -9,6 +11,7 @@
 #include "platform/files/DirectoryWatcher.h"
 
 #include <atomic>
+#include <condition_variable>
 #include <functional>
 #include <map>
 #include <memory>
@@ -32,6 +35,8 @@ public:
         const Folders& folders;
         StoreFileSystem& disk;
         StoreViewSlot& slot;
+        /// Called on a thread of the engine's when another device set values.
+        std::function<void()> valuesChanged;
     };
     using Done = std::function<void(const Failure& failure)>;
 
@@ -58,6 +63,15 @@ public:
 
     [[nodiscard]] Failure makeLocal(const Url& item, CancelFlag& cancel);
     [[nodiscard]] Failure moveItem(const Url& from, const Url& to);
+    /// The three as CloudDocumentService has them, for items of this store.
+    [[nodiscard]] Failure removeItem(const Url& item);
+    [[nodiscard]] Failure evictItem(const Url& item);
+    [[nodiscard]] Failure deleteContainer(const CloudContainer& container);
+
+    KeyValueSync& values() { return values_; }
+    /// Brings the values and the remote's together, soon.
+    void exchangeValues();
+
     /// Brings in what is new in the folder, or everywhere. `done` is called on a thread of the
     /// engine's.
     void refresh(const std::optional<Url>& folder, Done done);
@@ -77,6 +91,13 @@ private:
     /// queue.
     Failure connect();
 
+    /// Keeps the store open until it is dropped; none when it is not open for changes.
+    std::shared_ptr<void> use();
+    /// Runs the work with a remote that has proved to be there; once more when it had gone away.
+    Failure withRemote(const std::function<Failure()>& work);
+    void watchValues();
+    void changedByUser();
+
     // On the listing queue.
     Failure followRemote();
     Failure list(const std::vector<ItemId>& folders, bool everything);
@@ -95,9 +116,13 @@ private:
     std::unique_ptr<Remote> remote_;
     CancelFlag cancel_;
 
+    KeyValueSync values_;
+
     mutable std::mutex mutex_;
-    std::optional<std::string> problem_; // guarded by mutex_, as are the next six
-    std::optional<std::string> notice_;  // what had to be done at the start
+    std::condition_variable unused_;
+    int uses_ = 0; // guarded by mutex_, as are the next seven
+    std::optional<std::string> problem_;
+    std::optional<std::string> notice_; // what had to be done at the start
     std::shared_ptr<Transfers> transfers_;
     Clock::AlarmId retry_ = 0;
     bool usable_ = false;
@@ -110,12 +135,14 @@ private:
     StoreView view_;
     DirectoryWatcher::Token rootWatch_;
     std::map<std::string, DirectoryWatcher::Token> containerWatches_;
+    DirectoryWatcher::Token valuesWatch_;
 
     std::mutex connecting_;
     std::atomic<bool> connected_{false};
 
     std::unique_ptr<WorkQueue> queue_;
     std::unique_ptr<WorkQueue> listing_;
+    std::unique_ptr<WorkQueue> exchanging_; // of values
 };
 
 } // namespace platform

@@ -88,7 +88,11 @@ Failure StoreEngine::followRemote() {
     Failure failure = connect();
     if (!failure) {
         std::vector<ItemId> unfinished;
-        queue_->sync([&] { unfinished = context_->database.unfinishedScans(Side::remote); });
+        queue_->sync([&] {
+            unfinished = context_->database.unfinishedScans(Side::remote);
+            watchValues();
+        });
+        exchangeValues();
         if (!unfinished.empty())
             failure = list(unfinished, false);
     }

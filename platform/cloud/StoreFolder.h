@@ -26,6 +26,7 @@ struct StoreLayout {
     std::string database() const { return folder + "/state.db"; }
     std::string staging() const { return folder + "/staging"; }
     std::string kept() const { return folder + "/kept"; }
+    std::string values() const { return folder + "/keyvalue.json"; }
     std::string lock() const { return folder + "/lock"; }
 };
 

@@ -3,6 +3,7 @@
 #include "platform/base/Log.h"
 #include "platform/cloud/ContentHash.h"
 #include "platform/cloud/ContentPlacing.h"
+#include "platform/cloud/Eviction.h"
 #include "platform/cloud/StoreFileSystem.h"
 #include "platform/cloud/Tokens.h"
 #include "platform/files/PathText.h"
@@ -216,7 +217,10 @@ Result<RemoteEntry> Transfers::stage(Transfer& transfer, const std::string& remo
 void Transfers::recover(StoreContext& context) {
     ContentPlacing placing(context);
     for (const OpRow& op : context.database.operations())
-        placing.resume(op);
+        if (Eviction::owns(op))
+            Eviction::resume(context, op);
+        else
+            placing.resume(op);
     const Result<std::vector<DirectoryEntry>> left = context.disk.entries(context.layout.staging());
     if (!left)
         return;

@@ -9,7 +9,8 @@ namespace platform {
 /// Values as JSON that a person can read and that reads back as the same value: what JSON has no
 /// word for is an object with one key, "$bytes", "$date" (nanoseconds since 1970), "$url", "$text"
 /// (text that is not UTF-8, in hexadecimal), "$real" (a number that is not finite) or "$map" (a
-/// map whose keys could be taken for one of these). For sources of this folder only.
+/// map whose keys could be taken for one of these). For sources of the platform only: it shows the
+/// library.
 nlohmann::json jsonFromValue(const Value& value);
 /// None for what is none of our forms. Nested deeper than any sensible setting, it is cut off.
 Value valueFromJson(const nlohmann::json& json);

@@ -1,0 +1,22 @@
+#pragma once
+
+#include "platform/cloud/StoreContext.h"
+
+namespace platform {
+
+/// Where local content goes that was replaced or deleted: `kept/MOMENT/PATH`, and
+/// `kept/MOMENT only here/PATH` for what the remote is not known to have. See docs/store.md.
+class KeptFolder {
+public:
+    explicit KeptFolder(const StoreContext& context) : context_(context) {}
+
+    /// Moves the item there. Answers its path there; after an error it is where it was.
+    Result<std::string> take(const std::string& relative, bool onlyHere);
+
+private:
+    Failure makeFolders(const std::string& relative);
+
+    const StoreContext& context_;
+};
+
+} // namespace platform
