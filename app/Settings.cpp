@@ -16,7 +16,9 @@ platform::PreferencesDomain domain() {
             platform::PreferencesHost::any, Settings::_appContainerPath()};
 }
 
-platform::PreferencesStore& store() { return platform::Platform::current().preferences(); }
+platform::PreferencesStore& store() {
+    return platform::Platform::current().preferences();
+}
 
 } // namespace
 
@@ -34,8 +36,9 @@ const std::string& Settings::_appContainerPath() {
 bool Settings::boolPrefForKey(std::string_view key, bool withDefault) {
     store().synchronize(domain());
     const platform::Value stored = store().value(domain(), key);
-    const bool answer =
-        stored.isNone() ? withDefault : stored.boolean().value_or(stored.integer().value_or(0) != 0);
+    const bool answer = stored.isNone()
+                            ? withDefault
+                            : stored.boolean().value_or(stored.integer().value_or(0) != 0);
     VXLOG(vxDebug, "%@ = %@", key, answer);
     return answer;
 }
@@ -46,9 +49,13 @@ void Settings::setBoolPref(bool value, std::string_view key) {
         VXLOG(vxError, "Failed to write prefs");
 }
 
-bool Settings::gridMode() { return boolPrefForKey(gridModeKey, false); }
+bool Settings::gridMode() {
+    return boolPrefForKey(gridModeKey, false);
+}
 
-void Settings::setGridMode(bool value) { setBoolPref(value, gridModeKey); }
+void Settings::setGridMode(bool value) {
+    setBoolPref(value, gridModeKey);
+}
 
 void Settings::setQuickLaunch(bool value) {
     VXLOG(vxDebug, "set QuickLaunch = %@", value);

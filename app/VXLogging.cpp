@@ -115,13 +115,13 @@ VXJotClient::VXJotClient()
     : logLevel_(defaultThreshold),
       logQueue_(std::make_shared<platform::WorkQueue>(
           std::string(platform::applicationIdentifierLowercase) + ".logging",
-          platform::WorkPriority::utility, -15)) {}
+          platform::WorkPriority::utility, -15)) {
+}
 
 std::shared_ptr<VXJotClient> VXJotClient::create() {
     std::shared_ptr<VXJotClient> client(new VXJotClient());
     client->logQueue_->sync([&client] {
-        client->jotClient_ =
-            Platform::current().jot().open({}, platform::applicationIdentifier, 0);
+        client->jotClient_ = Platform::current().jot().open({}, platform::applicationIdentifier, 0);
         client->_setLogLevelFromDefaults();
     });
     return client;
@@ -179,13 +179,21 @@ void VXJotClient::setLogLevel(int level) {
     logQueue_->sync([this] { applyFilter(); });
 }
 
-int VXJotClient::logLevelForJot() const { return std::min(logLevel(), highestServiceLevel); }
+int VXJotClient::logLevelForJot() const {
+    return std::min(logLevel(), highestServiceLevel);
+}
 
-void VXJotClient::performLoggingBlock(platform::Job job) { logQueue_->async(std::move(job)); }
+void VXJotClient::performLoggingBlock(platform::Job job) {
+    logQueue_->async(std::move(job));
+}
 
-void VXSetLogLevel(int level) { VXJotClient::JotClient()->setLogLevel(level); }
+void VXSetLogLevel(int level) {
+    VXJotClient::JotClient()->setLogLevel(level);
+}
 
-int VXJotLogLevel() { return VXJotClient::JotClient()->logLevelForJot(); }
+int VXJotLogLevel() {
+    return VXJotClient::JotClient()->logLevelForJot();
+}
 
 void VXLogv(const char* file, const char* function, unsigned line, const char* category, int level,
             std::shared_ptr<const VXExtras> extras, std::string_view format,
@@ -212,14 +220,13 @@ void _TavrinLogTest() {
 }
 
 void connectPlatformLog() {
-    platform::setLogSink(
-        {[](int level) { return VXShouldLog(level); },
-         [](int level, std::string message, const std::source_location& where) {
-             const std::array<platform::FormatArgument, 1> arguments{
-                 platform::makeFormatArgument(message)};
-             VXLogv(where.file_name(), where.function_name(), where.line(), "VX", level, nullptr,
-                    "%@", arguments);
-         }});
+    platform::setLogSink({[](int level) { return VXShouldLog(level); },
+                          [](int level, std::string message, const std::source_location& where) {
+                              const std::array<platform::FormatArgument, 1> arguments{
+                                  platform::makeFormatArgument(message)};
+                              VXLogv(where.file_name(), where.function_name(), where.line(), "VX",
+                                     level, nullptr, "%@", arguments);
+                          }});
 }
 
 } // namespace tavrin

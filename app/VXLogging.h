@@ -76,7 +76,7 @@ void VXLogv(const char* file, const char* function, unsigned line, const char* c
             std::shared_ptr<const VXExtras> extras, std::string_view format,
             std::span<const platform::FormatArgument> arguments);
 
-template <class... Args>
+template<class... Args>
 void VXLog(const char* file, const char* function, unsigned line, const char* category, int level,
            std::type_identity_t<platform::FormatString<Args...>> format, const Args&... args) {
     const std::array<platform::FormatArgument, sizeof...(Args)> arguments{

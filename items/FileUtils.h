@@ -33,6 +33,16 @@ public:
     static bool isFile(const platform::Url& url);
     static bool isDir(const platform::Url& url);
 
+    /// Makes the folder and missing ones above it.
+    [[nodiscard]] static platform::Failure mkdir(const platform::Url& folder);
+    /// Deletes the item, a folder with its contents.
+    [[nodiscard]] static platform::Failure remove(const platform::Url& item);
+    /// Moves or renames to the full new location. Never overwrites: a taken name becomes the first
+    /// free numbered one. unsupportedOperation for a file onto a folder and the other way round.
+    [[nodiscard]] static platform::Failure move(const platform::Url& source,
+                                                const platform::Url& to);
+    /// Drops the local copy and keeps the document in the cloud. A failure is only logged.
+    static void evictDocument(const platform::Url& document);
     /// A free name in the folder of `taken`, whose own name is in use.
     static platform::Url generateUniquePath(const platform::Url& taken);
     /// "Report 2.pdf" for "Report.pdf"; none when the name itself is free.

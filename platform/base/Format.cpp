@@ -24,7 +24,7 @@ void appendInteger(std::string& out, Integer number, int base) {
 }
 
 void appendArgument(std::string& out, char conversion, const FormatArgument& argument) {
-    if (!placeholderAccepts(conversion, argument.kind) || conversion == '@') {
+    if (!placeholderAccepts(conversion, argument.kind) || conversion == '@' || conversion == 's') {
         argument.describe(out, argument.object);
         return;
     }

@@ -52,7 +52,7 @@ FormatArgument makeFormatArgument(const T& value) {
 
 /// One placeholder of a format string.
 struct Placeholder {
-    /// '@', 'd', 'u', 'x', 'f' or 'g'; '%' for "%%"; 0 for text that is no placeholder.
+    /// '@', 's', 'd', 'u', 'x', 'f' or 'g'; '%' for "%%"; 0 for text that is no placeholder.
     char conversion = 0;
     /// 1-based position of "%2$@"; 0 when the placeholder takes the next argument.
     std::size_t position = 0;
@@ -60,8 +60,8 @@ struct Placeholder {
     std::size_t length = 0;
 };
 
-/// Reads the placeholder at the head of `text` (which starts with "%"). Understood: "%@", "%d",
-/// "%i", "%u", "%x", "%f", "%g", "%%", with "l" length marks and "1$" positions.
+/// Reads the placeholder at the head of `text` (which starts with "%"). Understood: "%@", "%s",
+/// "%d", "%i", "%u", "%x", "%f", "%g", "%%", with "l" length marks and "1$" positions.
 constexpr Placeholder parsePlaceholder(std::string_view text) {
     std::size_t i = 1;
     std::size_t number = 0;
@@ -79,7 +79,7 @@ constexpr Placeholder parsePlaceholder(std::string_view text) {
     if (i >= text.size())
         return {};
     const char conversion = text[i] == 'i' ? 'd' : text[i];
-    if (std::string_view("@duxfg%").find(conversion) == std::string_view::npos)
+    if (std::string_view("@sduxfg%").find(conversion) == std::string_view::npos)
         return {};
     return {conversion, position, i + 1};
 }
@@ -88,6 +88,8 @@ constexpr bool placeholderAccepts(char conversion, ArgumentKind kind) {
     switch (conversion) {
     case '@':
         return true;
+    case 's':
+        return kind == ArgumentKind::object;
     case 'd':
     case 'u':
     case 'x':

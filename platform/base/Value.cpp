@@ -2,6 +2,7 @@
 
 #include "platform/base/Describe.h"
 
+#include <array>
 #include <type_traits>
 
 namespace platform {
@@ -48,6 +49,13 @@ bool Value::operator==(const Value& other) const {
     if (const Map* mine = map())
         return other.map() && *mine == *other.map();
     return data_ == other.data_;
+}
+
+std::string_view Value::kindName() const {
+    static constexpr std::array<std::string_view, 10> names = {
+        "None", "Boolean", "Integer", "Number", "Text", "Bytes", "Date", "URL", "List", "Map"};
+    static_assert(names.size() == std::variant_size_v<decltype(data_)>);
+    return names[data_.index()];
 }
 
 void Value::describeTo(std::string& out) const {

@@ -59,6 +59,8 @@ public:
     const Map* map() const;
 
     bool operator==(const Value& other) const;
+    /// "None", "Boolean", "Integer", …: for messages about a value of the wrong kind.
+    std::string_view kindName() const;
     void describeTo(std::string& out) const;
 
 private:

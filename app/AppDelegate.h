@@ -1,0 +1,37 @@
+#pragma once
+
+#include "platform/ui/Application.h"
+#include "platform/ui/Window.h"
+
+#include <memory>
+#include <string>
+
+namespace tavrin {
+
+class NavController;
+
+/// The application's delegate: makes the window, and is the entry of the URL scheme "tavrinapp".
+/// Lives for the whole process. Main thread.
+class AppDelegate : public platform::ApplicationDelegate {
+public:
+    /// Starts the network watcher, then makes the window and its root screen.
+    bool applicationWillFinishLaunchingWithOptions(platform::Application& application,
+                                                   const platform::LaunchOptions& options) override;
+    /// Shows the store item that the URL names. Answers whether its list stack was built; only the
+    /// home screen and the test runner may ask.
+    bool applicationOpenURLOptions(platform::Application& application, const std::string& url,
+                                   const platform::OpenUrlOptions& options) override;
+    /// State is kept only while an account is signed in.
+    bool applicationShouldSaveApplicationState(platform::Application& application) override;
+    bool applicationShouldRestoreApplicationState(platform::Application& application) override;
+    platform::Window* mainWindow() const override { return rootWindow_.get(); }
+
+    const std::unique_ptr<platform::Window>& rootWindow() const { return rootWindow_; }
+
+private:
+    std::shared_ptr<NavController> rootScreen() const;
+
+    std::unique_ptr<platform::Window> rootWindow_;
+};
+
+} // namespace tavrin

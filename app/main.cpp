@@ -1,0 +1,23 @@
+#include "app/AppDelegate.h"
+#include "app/VXLogging.h"
+#include "items/FileUtils.h"
+#include "platform/Platform.h"
+#include "platform/base/Text.h"
+
+int main(int argc, char** argv) {
+    platform::loadLocalizedTexts(platform::systemLanguage());
+    platform::Platform services;
+    tavrin::connectPlatformLog();
+    const std::string program = argc > 0 ? argv[0] : "";
+    VXLOG(tavrin::vxInfo, "Running %s", program);
+    VXLOG(tavrin::vxInfo, "Built (main) on Jul 31 2015 @ 15:43:04");
+    tavrin::FileUtils::logFileAttributes(program);
+    int status = 0;
+    {
+        platform::Application application(argc, argv);
+        status = application.run(std::make_shared<tavrin::AppDelegate>());
+    }
+    // What is still to be logged is logged while its services are there.
+    tavrin::VXJotClient::JotClient()->logQueue()->sync([] {});
+    return status;
+}

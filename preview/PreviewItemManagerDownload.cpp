@@ -1,0 +1,198 @@
+#include "app/VXLogging.h"
+#include "items/FileUtils.h"
+#include "platform/Platform.h"
+#include "platform/base/MainOwned.h"
+#include "platform/base/Text.h"
+#include "platform/cloud/CloudDocumentService.h"
+#include "platform/ui/AlertController.h"
+#include "preview/PreviewDownloadViewController.h"
+#include "preview/PreviewItemManager.h"
+#include "services/NetworkIndicator.h"
+#include "services/NetworkWatcher.h"
+
+namespace tavrin {
+namespace {
+
+using platform::ErrorCode;
+using platform::Failure;
+using platform::FileCoordinator;
+using platform::ReadingOptions;
+using platform::Url;
+
+constexpr const char* indicatorKey = "PreviewDownload";
+
+bool hasCode(const platform::Error& error, ErrorCode code) {
+    return error.code == static_cast<int>(code); // whatever the domain
+}
+
+NetworkIndicator& indicator() {
+    return *NetworkIndicator::sharedNetworkIndicator();
+}
+
+void evictPartialCopy(const std::optional<Url>& url) {
+    if (!url)
+        return;
+    if (const Failure failure = platform::Platform::current().documents().evictItem(*url))
+        VXLOG(vxInfo, "Failed to evict %@: %@", *url, *failure);
+    else
+        VXLOG(vxDebug, "Evicted %@", *url);
+}
+
+} // namespace
+
+void PreviewItemManager::startDownload() {
+    startDownloading([weak = weak_from_this()](const std::optional<Url>& oldUrl,
+                                               const std::optional<Url>& newUrl,
+                                               const Failure& error) {
+        if (error)
+            VXLOG(vxError, "Error downloading %@: %@", oldUrl, *error);
+        else
+            VXLOG(vxInfo, "Showing preview of URL %@", newUrl);
+        const auto self = weak.lock();
+        if (!self)
+            return;
+        if (const auto screen = self->downloadViewController())
+            screen->setDownloading(false);
+        if (error)
+            self->showDownloadError(error);
+        else
+            self->setItem(std::make_shared<VXItem>(newUrl), true);
+    });
+}
+
+void PreviewItemManager::startDownloading(DownloadCompletion completion) {
+    VXLOG(vxDebug, "Dispatching download...");
+    // The job holds its queue, not the manager: a manager that goes away ends the read instead of
+    // waiting for it.
+    downloadQueue_->async(
+        [queue = downloadQueue_, weak = weak_from_this(), completion = std::move(completion)] {
+            startDownloadingNow(weak, completion);
+        });
+}
+
+std::shared_ptr<FileCoordinator> PreviewItemManager::replaceDownloadCoordinator() {
+    cancelDownload();
+    auto coordinator = std::make_shared<FileCoordinator>(
+        std::weak_ptr<platform::FilePresenter>(shared_from_this()));
+    const std::lock_guard lock(lock_);
+    downloadFC_ = coordinator;
+    return coordinator;
+}
+
+/// One download on its queue. Holds the manager only for moments, so that its destruction can
+/// cancel the blocking read.
+struct PreviewItemManager::Download {
+    std::weak_ptr<PreviewItemManager> manager;
+    DownloadCompletion completion;
+    std::shared_ptr<FileCoordinator> coordinator;
+    std::optional<Url> url;
+
+    bool begin() {
+        const auto self = platform::lockForMain(manager);
+        if (!self)
+            return false;
+        VXLOG(vxDebug, "Download queue: changing FilePresenter");
+        coordinator = self->replaceDownloadCoordinator();
+        url = self->itemResolvedUrl();
+        if (!url)
+            return false;
+        if (FileUtils::exists(*url)) {
+            VXLOG(vxDebug, "Dispatching download -- although file is already local");
+        } else {
+            VXLOG(vxInfo, "Dispatching download of %@", *url);
+            indicator().show(indicatorKey);
+        }
+        const platform::MainOwned screen(self->downloadViewController());
+        if (screen)
+            screen->registerForProgress();
+        return true;
+    }
+
+    void succeed(const Url& readUrl) const {
+        auto self = platform::lockForMain(manager);
+        const std::optional<Url> current = self ? self->itemResolvedUrl() : url;
+        VXLOG(vxDebug, "coordinateReadingItemAtURL finished, old URL %@, new URL %@", current,
+              readUrl);
+        indicator().hide(indicatorKey);
+        // Strong: the result is not lost to an owner that lets go between here and the main queue.
+        platform::Platform::current().mainQueue().async(
+            [held = self.get(), download = *this, readUrl] {
+                if (held)
+                    held->finishDownload(download, readUrl, std::nullopt);
+                else
+                    download.completion(download.url, readUrl, std::nullopt);
+            });
+    }
+
+    void fail(const platform::Error& error) const {
+        if (const auto self = platform::lockForMain(manager)) {
+            const platform::MainOwned screen(self->downloadViewController());
+            if (screen)
+                screen->unregisterProgress();
+        }
+        indicator().hide(indicatorKey);
+        if (hasCode(error, ErrorCode::userCancelled)) {
+            VXLOG(vxDebug, "coordinateReadingItemAtURL was cancelled, URL %@", url);
+            evictPartialCopy(url);
+        } else {
+            VXLOG(vxError, "coordinateReadingItemAtURL failed, URL %@: %@", url, error);
+        }
+        platform::Platform::current().mainQueue().async([download = *this, error] {
+            if (const auto self = download.manager.lock())
+                self->finishDownload(download, std::nullopt, error);
+            else
+                download.completion(download.url, std::nullopt, error);
+        });
+    }
+};
+
+void PreviewItemManager::startDownloadingNow(const std::weak_ptr<PreviewItemManager>& manager,
+                                             DownloadCompletion completion) {
+    Download download{manager, std::move(completion), nullptr, std::nullopt};
+    if (!download.begin())
+        return;
+    const Failure failure = download.coordinator->coordinateReading(
+        *download.url, ReadingOptions::withoutChanges | ReadingOptions::resolvesSymbolicLink,
+        [&download](const Url& readUrl) { download.succeed(readUrl); });
+    if (failure)
+        download.fail(*failure);
+}
+
+void PreviewItemManager::finishDownload(const Download& download, const std::optional<Url>& newUrl,
+                                        const Failure& error) {
+    download.completion(itemResolvedUrl(), newUrl, error);
+    const std::lock_guard lock(lock_);
+    if (downloadFC_ == download.coordinator) // a newer download keeps its own
+        downloadFC_.reset();
+}
+
+void PreviewItemManager::cancelDownload() {
+    if (const auto coordinator = downloadFC())
+        coordinator->cancel();
+    indicator().hide(indicatorKey);
+}
+
+std::shared_ptr<FileCoordinator> PreviewItemManager::downloadFC() const {
+    const std::lock_guard lock(lock_);
+    return downloadFC_;
+}
+
+void PreviewItemManager::showDownloadError(const Failure& error) {
+    if (!error || hasCode(*error, ErrorCode::userCancelled))
+        return;
+    std::string message = error->localizedDescription.value_or("");
+    if (hasCode(*error, ErrorCode::serverNotAvailable) &&
+        !NetworkWatcher::sharedNetworkWatcher()->isConnected())
+        message = platform::localized(
+            "Unable to download file. You are no longer connected to the Internet.");
+    const auto navigation = navigationController();
+    const Screen top = navigation ? navigation->topViewController() : nullptr;
+    if (!top)
+        return;
+    auto alert = platform::AlertController::create("", message, platform::AlertStyle::alert);
+    alert->addAction(
+        platform::AlertAction::make(platform::localized("OK"), platform::ActionStyle::standard));
+    top->presentViewController(alert, true);
+}
+
+} // namespace tavrin

@@ -1,0 +1,140 @@
+#include "app/VXLogging.h"
+#include "platform/Platform.h"
+#include "preview/GlimpseItemController.h"
+#include "preview/PreviewDetailsViewController.h"
+#include "preview/PreviewItemManager.h"
+
+namespace tavrin {
+namespace {
+
+using platform::FileCoordinator;
+using platform::Url;
+
+/// Notices of change that come within this time are merged into one refresh.
+constexpr auto mergeTime = std::chrono::seconds(1);
+
+platform::MainQueue& mainQueue() {
+    return platform::Platform::current().mainQueue();
+}
+
+void reloadVisiblePreview() {
+    const auto& preview = GlimpseItemController::defaultController();
+    if (preview->isVisible())
+        preview->refreshCurrentPreviewItem();
+}
+
+} // namespace
+
+void PreviewItemManager::registerAsFilePresenter() {
+    const std::lock_guard lock(registrationLock_);
+    if (filePresenterRegistered_)
+        return;
+    FileCoordinator::addFilePresenter(shared_from_this());
+    filePresenterRegistered_ = true;
+}
+
+void PreviewItemManager::unregisterAsFilePresenter() {
+    const std::lock_guard lock(registrationLock_);
+    if (!filePresenterRegistered_)
+        return;
+    FileCoordinator::removeFilePresenter(shared_from_this());
+    filePresenterRegistered_ = false;
+}
+
+bool PreviewItemManager::filePresenterRegistered() const {
+    const std::lock_guard lock(registrationLock_);
+    return filePresenterRegistered_;
+}
+
+bool PreviewItemManager::refreshPending() const {
+    const std::lock_guard lock(lock_);
+    return refreshPending_;
+}
+
+std::optional<Url> PreviewItemManager::presentedItemURL() const {
+    return itemUrl();
+}
+
+std::shared_ptr<platform::Executor> PreviewItemManager::presentedItemOperationQueue() const {
+    return fcQueue_;
+}
+
+bool PreviewItemManager::takeRefreshTurn() {
+    const std::lock_guard lock(lock_);
+    return !std::exchange(refreshPending_, true);
+}
+
+void PreviewItemManager::finishRefreshTurn() {
+    const std::lock_guard lock(lock_);
+    refreshPending_ = false;
+}
+
+void PreviewItemManager::presentedItemDidChange() {
+    VXLOG(vxInfo, "%@ changed", itemUrl());
+    if (!takeRefreshTurn())
+        return;
+    mainQueue().after(mergeTime, [weak = weak_from_this()] {
+        const auto self = weak.lock();
+        if (!self)
+            return;
+        if (const std::optional<Url> url = self->itemUrl())
+            self->refreshItem(*url);
+        self->finishRefreshTurn();
+    });
+}
+
+void PreviewItemManager::refreshItem(const Url& url) {
+    const auto fresh = std::make_shared<VXItem>(url);
+    const std::optional<platform::Date> date = fresh->contentModificationDate();
+    VXLOG(vxDebug, "%@: %@ vs %@", fresh->url(), modifiedDate_, date);
+    const bool newer = modifiedDate_ && date && *modifiedDate_ < *date;
+    modifiedDate_ = date;
+    const ItemPointer current = item();
+    const auto details = detailsViewController();
+    const bool arrived = current && !current->isDownloaded() && fresh->isDownloaded();
+    const bool rebuild = arrived && (!details || details->view()->isHidden());
+    setItem(fresh, rebuild);
+    VXLOG(vxInfo, "Refreshing %@", itemUrl());
+    if (newer)
+        reloadVisiblePreview();
+    if (const auto shown = detailsViewController())
+        shown->refreshItem();
+}
+
+void PreviewItemManager::presentedItemDidMoveToURL(const Url& newUrl) {
+    VXLOG(vxInfo, "presentedItemDidMoveToURL: %@ changed to %@", itemUrl(), newUrl);
+    mainQueue().async([weak = weak_from_this(), newUrl] {
+        if (const auto self = weak.lock())
+            self->refreshItem(newUrl);
+    });
+}
+
+void PreviewItemManager::accommodatePresentedItemDeletionWithCompletionHandler(
+    DeletionHandler handler) {
+    VXLOG(vxInfo, "%@ accommodate deletion", itemUrl());
+    handler(std::nullopt);
+    unregisterAsFilePresenter();
+    mainQueue().async([self = shared_from_this()] { self->popScreen(); });
+}
+
+void PreviewItemManager::popScreen() {
+    if (const auto navigation = navigationController())
+        navigation->popViewController(true);
+}
+
+void PreviewItemManager::accommodatePresentedSubitemDeletionAtURL(const Url& part,
+                                                                  DeletionHandler handler) {
+    VXLOG(vxInfo, "%@ accommodate subitem deletion at %@", itemUrl(), part);
+    handler(std::nullopt);
+    unregisterAsFilePresenter();
+    mainQueue().after(mergeTime, [weak = weak_from_this()] {
+        const auto self = weak.lock();
+        if (!self)
+            return;
+        VXLOG(vxInfo, "Refreshing %@", self->itemUrl());
+        reloadVisiblePreview();
+        self->finishRefreshTurn();
+    });
+}
+
+} // namespace tavrin

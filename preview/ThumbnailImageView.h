@@ -1,0 +1,32 @@
+#pragma once
+
+#include "items/VXItem.h"
+#include "platform/ui/Controls.h"
+#include "preview/PieProgressIndicatorView.h"
+
+#include <memory>
+
+namespace tavrin {
+
+/// An item's thumbnail, or its type's icon, with a small progress pie in its corner. Main thread.
+class ThumbnailImageView : public platform::View {
+public:
+    explicit ThumbnailImageView(platform::Rect frame = {});
+
+    const std::shared_ptr<VXItem>& item() const { return item_; }
+    void setItem(const std::shared_ptr<VXItem>& item);
+    void showGenericImage();
+    /// Shows the pie, empty, or hides it.
+    void showProgress(bool shown);
+    void updateProgress(double fraction);
+
+    const std::shared_ptr<platform::ImageView>& thumbnailView() const { return thumbnailView_; }
+    const std::shared_ptr<PieProgressIndicatorView>& progressView() const { return progressView_; }
+
+private:
+    std::shared_ptr<VXItem> item_;
+    std::shared_ptr<platform::ImageView> thumbnailView_;
+    std::shared_ptr<PieProgressIndicatorView> progressView_;
+};
+
+} // namespace tavrin
