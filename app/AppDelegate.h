@@ -24,9 +24,9 @@ public:
     /// State is kept only while an account is signed in.
     bool applicationShouldSaveApplicationState(platform::Application& application) override;
     bool applicationShouldRestoreApplicationState(platform::Application& application) override;
-    platform::Window* mainWindow() const override { return rootWindow_.get(); }
-
-    const std::unique_ptr<platform::Window>& rootWindow() const { return rootWindow_; }
+    platform::Window* mainWindow() const override { return rootWindow(); }
+    /// None before the launch.
+    platform::Window* rootWindow() const { return rootWindow_.get(); }
 
 private:
     std::shared_ptr<NavController> rootScreen() const;

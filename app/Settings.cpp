@@ -43,8 +43,8 @@ bool Settings::boolPrefForKey(std::string_view key, bool withDefault) {
     return answer;
 }
 
-void Settings::setBoolPref(bool value, std::string_view key) {
-    store().setValue(domain(), key, value);
+void Settings::setBoolPref(bool value, std::string_view forKey) {
+    store().setValue(domain(), forKey, value);
     if (!store().synchronize(domain()))
         VXLOG(vxError, "Failed to write prefs");
 }

@@ -22,7 +22,7 @@ public:
     /// Computed once a process.
     static const std::string& _appContainerPath();
     static bool boolPrefForKey(std::string_view key, bool withDefault);
-    static void setBoolPref(bool value, std::string_view key);
+    static void setBoolPref(bool value, std::string_view forKey);
 
     static bool gridMode();
     static void setGridMode(bool value);
