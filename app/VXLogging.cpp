@@ -87,12 +87,12 @@ void fillRecord(platform::JotRecord& record, const Message& message) {
 }
 
 void sendMessage(const Message& message) {
-    // At the very end of the process the console is all that is left.
-    if (Platform::installed()) {
+    if (const std::shared_ptr<VXJotClient>& client = VXJotClient::JotClient();
+        client->isConnected()) {
         platform::JotService& jot = Platform::current().jot();
         if (const std::unique_ptr<platform::JotRecord> record = jot.createRecord()) {
             fillRecord(*record, message);
-            jot.send(VXJotClient::JotClient()->jotClient(), *record);
+            jot.send(client->jotClient(), *record);
         }
     }
     platform::writeConsoleLine(message.text);
@@ -100,14 +100,15 @@ void sendMessage(const Message& message) {
 
 } // namespace
 
-std::atomic<int> detail::sharedThreshold{INT_MAX};
+std::atomic<const VXJotClient*> detail::sharedClient{nullptr};
 
 const std::shared_ptr<VXJotClient>& VXJotClient::JotClient() {
-    static const std::shared_ptr<VXJotClient> client = [] {
+    // Never destroyed: other threads may log until the process has ended.
+    static const std::shared_ptr<VXJotClient>& client = *new std::shared_ptr<VXJotClient>([] {
         std::shared_ptr<VXJotClient> made = create();
-        detail::sharedThreshold.store(made->logLevel(), std::memory_order_relaxed);
+        detail::sharedClient.store(made.get(), std::memory_order_release);
         return made;
-    }();
+    }());
     return client;
 }
 
@@ -128,19 +129,30 @@ std::shared_ptr<VXJotClient> VXJotClient::create() {
 }
 
 VXJotClient::~VXJotClient() {
+    close();
+}
+
+void VXJotClient::close() {
     logQueue_->sync([this] {
-        if (Platform::installed())
+        if (isConnected())
             Platform::current().jot().close(jotClient_);
+        jotClient_ = 0;
     });
+}
+
+bool VXJotClient::isConnected() const {
+    return jotClient_ != 0 && Platform::installed();
 }
 
 void VXJotClient::_setLogLevelFromDefaults() {
     static std::once_flag registered;
-    static platform::NotifyService::Token token;
+    static auto& token = *new platform::NotifyService::Token(); // kept to the end of the process
     std::call_once(registered, [this] {
-        token = Platform::current().notify().observe(
-            platform::managedSettingsChangedNotice, *logQueue_,
-            [self = shared_from_this()] { self->_setLogLevelFromDefaults(); });
+        token = Platform::current().notify().observe(platform::managedSettingsChangedNotice,
+                                                     *logQueue_, [self = shared_from_this()] {
+                                                         if (self->isConnected())
+                                                             self->_setLogLevelFromDefaults();
+                                                     });
     });
     platform::StandardPreferences& preferences = Platform::current().standardPreferences();
     preferences.synchronize();
@@ -149,8 +161,8 @@ void VXJotClient::_setLogLevelFromDefaults() {
     if (Platform::current().markerExists(markerFile))
         level = unthrottledThreshold;
     else if (preferred >= lowestPreference)
-        level = static_cast<int>(std::min<std::int64_t>(preferred, INT_MAX - 1));
-    storeLevel(level);
+        level = static_cast<int>(std::min<std::int64_t>(preferred, INT_MAX));
+    logLevel_.store(level, std::memory_order_relaxed);
     applyFilter();
     if (level < unthrottledThreshold) {
         platform::setEnvironmentVariable(quotaVariable, std::nullopt);
@@ -161,21 +173,15 @@ void VXJotClient::_setLogLevelFromDefaults() {
     platform::OperationQueue::global().async([] { VXLOG(vxDebug, "Unthrottling logging"); });
 }
 
-void VXJotClient::storeLevel(int level) {
-    logLevel_.store(level, std::memory_order_relaxed);
-    const int known = detail::sharedThreshold.load(std::memory_order_relaxed);
-    // While the shared client is in the making nobody may ask for it; its maker stores the value.
-    if (known != INT_MAX && JotClient().get() == this)
-        detail::sharedThreshold.store(level, std::memory_order_relaxed);
-}
-
 void VXJotClient::applyFilter() {
+    if (!isConnected())
+        return;
     const auto levels = static_cast<std::uint32_t>(std::max(logLevelForJot(), -1) + 1);
     Platform::current().jot().setFilter(jotClient_, (1U << levels) - 1);
 }
 
 void VXJotClient::setLogLevel(int level) {
-    storeLevel(level);
+    logLevel_.store(level, std::memory_order_relaxed);
     logQueue_->sync([this] { applyFilter(); });
 }
 

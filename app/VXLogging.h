@@ -4,13 +4,14 @@
 #include "platform/base/WorkQueue.h"
 #include "platform/system/JotService.h"
 
+#include <array>
 #include <atomic>
-#include <functional>
 #include <map>
 #include <memory>
 #include <span>
 #include <string>
 #include <string_view>
+#include <type_traits>
 
 namespace tavrin {
 
@@ -24,7 +25,8 @@ using VXExtras = std::map<std::string, std::string>;
 /// records are built, sent and echoed to the console. Shared; safe from any thread.
 class VXJotClient : public std::enable_shared_from_this<VXJotClient> {
 public:
-    /// The shared client; the first call makes it. Nothing inside that may log synchronously.
+    /// The shared client; the first call makes it, and it stays to the end of the process. Nothing
+    /// inside its making may log synchronously.
     static const std::shared_ptr<VXJotClient>& JotClient();
     /// Opens the connection and evaluates the threshold, on the new client's queue.
     static std::shared_ptr<VXJotClient> create();
@@ -39,6 +41,11 @@ public:
     /// logLevel(), at most 7.
     int logLevelForJot() const;
     void performLoggingBlock(platform::Job job);
+    /// Closes the connection after what was logged so far. Later messages reach the console alone,
+    /// so that nothing uses the platform's services while they go away.
+    void close();
+    /// On logQueue(): there is a connection, and a service behind it.
+    bool isConnected() const;
 
     platform::JotHandle jotClient() const { return jotClient_; }
     void setJotClient(platform::JotHandle handle) { jotClient_ = handle; }
@@ -48,7 +55,6 @@ public:
 private:
     VXJotClient();
     void _setLogLevelFromDefaults();
-    void storeLevel(int level);
     void applyFilter();
 
     platform::JotHandle jotClient_ = 0; // used on logQueue_ only
@@ -57,17 +63,16 @@ private:
 };
 
 namespace detail {
-/// The shared client's threshold once there is one; before that a value that lets everything on to
-/// the client, so that a dropped message costs one comparison.
-extern std::atomic<int> sharedThreshold;
+/// The shared client once there is one, so that a dropped message costs one comparison.
+extern std::atomic<const VXJotClient*> sharedClient;
 } // namespace detail
 
 void VXSetLogLevel(int level);
 int VXJotLogLevel();
 
 inline bool VXShouldLog(int level) {
-    return detail::sharedThreshold.load(std::memory_order_relaxed) >= level &&
-           VXJotClient::JotClient()->logLevel() >= level;
+    const VXJotClient* const client = detail::sharedClient.load(std::memory_order_acquire);
+    return (client ? client : VXJotClient::JotClient().get())->logLevel() >= level;
 }
 
 /// Formats on the calling thread and hands the record to the log queue. `file`, `function` and

@@ -17,7 +17,7 @@ int main(int argc, char** argv) {
         platform::Application application(argc, argv);
         status = application.run(std::make_shared<tavrin::AppDelegate>());
     }
-    // What is still to be logged is logged while its services are there.
-    tavrin::VXJotClient::JotClient()->logQueue()->sync([] {});
+    // The services go away before the threads that may still log.
+    tavrin::VXJotClient::JotClient()->close();
     return status;
 }
