@@ -6,7 +6,9 @@
 namespace tavrin {
 
 const std::shared_ptr<NetworkIndicator>& NetworkIndicator::sharedNetworkIndicator() {
-    static const auto indicator = std::make_shared<NetworkIndicator>();
+    // Never destroyed: a download may hide its activity while the process ends.
+    static const auto& indicator =
+        *new std::shared_ptr<NetworkIndicator>(std::make_shared<NetworkIndicator>());
     return indicator;
 }
 

@@ -23,7 +23,9 @@ NetworkWatcher::~NetworkWatcher() {
 }
 
 const std::shared_ptr<NetworkWatcher>& NetworkWatcher::sharedNetworkWatcher() {
-    static const auto watcher = std::make_shared<NetworkWatcher>();
+    // Never destroyed: what it detaches from may be gone by the end of the process.
+    static const auto& watcher =
+        *new std::shared_ptr<NetworkWatcher>(std::make_shared<NetworkWatcher>());
     return watcher;
 }
 

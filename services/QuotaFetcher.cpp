@@ -3,6 +3,7 @@
 #include "app/VXLogging.h"
 #include "platform/Platform.h"
 #include "platform/base/Identity.h"
+#include "platform/base/MainOwned.h"
 #include "platform/cloud/QuotaOperation.h"
 #include "platform/ui/Application.h"
 #include "services/NetworkWatcher.h"
@@ -22,7 +23,7 @@ QuotaFetcher::QuotaFetcher()
 std::shared_ptr<QuotaFetcher> QuotaFetcher::create() {
     std::shared_ptr<QuotaFetcher> fetcher(new QuotaFetcher());
     platform::NotificationCenter& center = platform::Platform::current().notifications();
-    QuotaFetcher* const self = fetcher.get(); // its observations end with it
+    QuotaFetcher* const self = fetcher.get(); // its observations end with it, on the main thread
     fetcher->becameActive_ =
         center.observe(platform::applicationDidBecomeActiveNotification,
                        [self](const auto& notice) { self->didBecomeActiveNotification(notice); });
@@ -42,7 +43,7 @@ void QuotaFetcher::runWithInterval(double seconds) {
     timer_->schedule(platform::Duration::zero(),
                      platform::Duration(static_cast<std::int64_t>(interval)), pollingLeeway);
     timer_->setHandler([weak = weak_from_this()] {
-        if (const auto self = weak.lock())
+        if (const auto self = platform::lockForMain(weak))
             self->performFetch();
     });
     timer_->resume();

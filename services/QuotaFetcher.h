@@ -1,7 +1,6 @@
 #pragma once
 
 #include "platform/base/NotificationCenter.h"
-#include "platform/base/Result.h"
 #include "platform/base/TimerSource.h"
 #include "platform/base/WorkQueue.h"
 
@@ -23,7 +22,8 @@ public:
 
 /// Polls the free bytes of the account while the application is active and online, and hands each
 /// new value to its delegate on the main thread. While it may not fetch the ticks go on and do
-/// nothing; becoming active does not poll, the next tick does.
+/// nothing; becoming active does not poll, the next tick does. Made and released on the main
+/// thread.
 class QuotaFetcher : public std::enable_shared_from_this<QuotaFetcher> {
 public:
     static std::shared_ptr<QuotaFetcher> create();
