@@ -1,4 +1,4 @@
-#include "items/FileTags.h"
+#include "items/ColorBlending.h"
 
 #include <algorithm>
 #include <cmath>
@@ -37,7 +37,7 @@ double blended(CompositingFilter filter, double below, double above) {
     case CompositingFilter::lighten:
         return std::max(above, below);
     default:
-        return below; // the other modes are accepted and change nothing
+        return below;
     }
 }
 

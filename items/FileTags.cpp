@@ -1,6 +1,7 @@
 #include "items/FileTags.h"
 
 #include "app/VXLogging.h"
+#include "items/ColorBlending.h"
 #include "platform/Platform.h"
 #include "platform/cloud/KeyValueCloudStore.h"
 #include "platform/ui/Canvas.h"
@@ -23,15 +24,15 @@ FileTags::ColorMap colorsByTag;    // guarded by tablesMutex
 std::vector<std::string> tagNames; // guarded by tablesMutex
 
 void setUpOnce() {
-    // Registered for as long as the process lives, so never taken down.
-    static const platform::Observation& observation = *new platform::Observation([] {
-        return platform::Platform::current().notifications().observe(
+    static std::once_flag once;
+    std::call_once(once, [] {
+        // Registered for as long as the process lives, so never taken down.
+        static auto& observation = *new platform::Observation();
+        observation = platform::Platform::current().notifications().observe(
             platform::keyValueStoreDidChangeExternallyNotification,
             [](const auto&) { FileTags::_tagColorsDidChange(); });
-    }());
-    static std::once_flag firstRead;
-    if (observation)
-        std::call_once(firstRead, FileTags::_tagColorsDidChange);
+        FileTags::_tagColorsDidChange();
+    });
 }
 
 const Value* entryOf(const Value::Map& map, std::string_view key) {

@@ -5,7 +5,6 @@
 #include "platform/ui/Image.h"
 
 #include <array>
-#include <cstddef>
 #include <map>
 #include <optional>
 #include <string>
@@ -37,28 +36,5 @@ public:
                                        platform::Size imageSize, double blipHeight,
                                        platform::Point offset);
 };
-
-enum class CompositingFilter {
-    normal,
-    sourceOver,
-    multiply,
-    screen,
-    overlay,
-    darken,
-    lighten,
-    colorDodge,
-    colorBurn,
-    plusLighter,
-    plusDarker,
-};
-
-/// `under` with `top` painted over it.
-platform::Color _colorBlendedWithColor(const platform::Color& under,
-                                       const std::optional<platform::Color>& top);
-/// The blend in the given mode; a mode that is not known, or a clear `top`, leaves `under` as it
-/// is.
-platform::Color _colorBlendedWithColor(const platform::Color& under,
-                                       const std::optional<platform::Color>& top,
-                                       std::optional<CompositingFilter> compositingFilter);
 
 } // namespace tavrin
