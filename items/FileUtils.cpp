@@ -10,6 +10,7 @@ namespace tavrin {
 namespace {
 
 using platform::FileManager;
+using platform::Platform;
 using platform::Url;
 
 } // namespace
@@ -18,7 +19,7 @@ platform::Value FileUtils::getResourceValue(platform::ResourceKey key,
                                             const std::optional<Url>& url) {
     if (!url)
         return {};
-    const platform::CloudDocumentService& documents = platform::Platform::current().documents();
+    const platform::CloudDocumentService& documents = Platform::current().documents();
     const platform::ResourceKeys one(&key, 1);
     if (const auto promised = documents.promisedItemAttributes(*url, one))
         if (const platform::Value& value = (*promised)[key]; !value.isNone())
@@ -29,6 +30,11 @@ platform::Value FileUtils::getResourceValue(platform::ResourceKey key,
 
 bool FileUtils::exists(const Url& url) {
     return FileManager::exists(url.path());
+}
+
+bool FileUtils::isTaken(const Url& url) {
+    // A link that leads nowhere holds its name as well.
+    return Platform::current().documents().physicalURL(url).has_value();
 }
 
 bool FileUtils::isFile(const Url& url) {
@@ -45,14 +51,14 @@ std::optional<std::string>
 FileUtils::stringByUniquingPathInsideDirectory(std::string_view folder,
                                                std::string_view forBasename) {
     const Url base = Url::file(folder, true);
-    if (!exists(base.appending(forBasename)))
+    if (!isTaken(base.appending(forBasename)))
         return std::nullopt;
     const std::string_view extension = platform::pathExtensionOf(forBasename);
     const std::string ending = extension.empty() ? "" : "." + std::string(extension);
     const std::string_view stem = platform::stemOf(forBasename);
     for (std::uint64_t number = 2;; ++number) {
         std::string candidate = platform::format("%@ %d%@", stem, number, ending);
-        if (!exists(base.appending(candidate)))
+        if (!isTaken(base.appending(candidate)))
             return candidate;
     }
 }
@@ -69,7 +75,7 @@ Url FileUtils::generateUniquePath(const Url& taken) {
 
 std::optional<Url> FileUtils::docDir() {
     const std::optional<Url> container =
-        platform::Platform::current().dataContainerURL(platform::applicationIdentifier);
+        Platform::current().dataContainerURL(platform::applicationIdentifier);
     return container ? std::optional(container->appending("Documents", true)) : std::nullopt;
 }
 
@@ -79,9 +85,10 @@ void FileUtils::logFileAttributes(std::string_view path) {
         VXLOG(vxError, "Cannot get attributes of %@: %@", path, found.error().localizedDescription);
         return;
     }
-    const platform::Date now = platform::Platform::current().clock().now();
-    VXLOG(vxDebug, "Date Created: %@ (%lf seconds ago)", found->created,
-          now.secondsSince(found->created));
+    const platform::Date now = Platform::current().clock().now();
+    if (found->created != platform::Date()) // some file systems do not know it
+        VXLOG(vxDebug, "Date Created: %@ (%lf seconds ago)", found->created,
+              now.secondsSince(found->created));
     VXLOG(vxDebug, "Date Modified: %@ (%lf seconds ago)", found->modified,
           now.secondsSince(found->modified));
     VXLOG(vxDebug, "Size: %@ bytes", found->size);

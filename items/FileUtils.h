@@ -43,6 +43,9 @@ public:
                                                 const platform::Url& to);
     /// Drops the local copy and keeps the document in the cloud. A failure is only logged.
     static void evictDocument(const platform::Url& document);
+    /// Something stands at the URL, or a document that is not on the device is promised there: a
+    /// name that nothing else may get.
+    static bool isTaken(const platform::Url& url);
     /// A free name in the folder of `taken`, whose own name is in use.
     static platform::Url generateUniquePath(const platform::Url& taken);
     /// "Report 2.pdf" for "Report.pdf"; none when the name itself is free.
@@ -62,7 +65,7 @@ public:
     static std::optional<std::string> containerIdForURL(const platform::Url& url);
     /// Fills what it is given on success: the container, and the path components from its documents
     /// folder down to the item (left untouched at the container's top and above).
-    static platform::Failure
+    [[nodiscard]] static platform::Failure
     containerAndRelativePathforURL(const platform::Url& url,
                                    std::shared_ptr<const platform::CloudContainer>* container,
                                    std::vector<std::string>* relativePathComponents);

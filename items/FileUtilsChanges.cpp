@@ -11,12 +11,9 @@ namespace {
 using platform::Failure;
 using platform::FileCoordinator;
 using platform::FileManager;
+using platform::Platform;
 using platform::Url;
 using platform::WritingOptions;
-
-platform::CloudDocumentService& documents() {
-    return platform::Platform::current().documents();
-}
 
 /// Error 3328 for a file onto a folder or a folder onto a file; none when the kinds agree or either
 /// side is not there.
@@ -41,7 +38,7 @@ Failure coordinatedMove(const Url& source, const Url& destination) {
             coordinator.itemAtURLWillMoveToURL(from, to);
             VXLOG(vxDebug, "Moving src2:  '%@'", from);
             VXLOG(vxDebug, "Moving dest2: '%@'", to);
-            moving = documents().moveItem(from, to);
+            moving = Platform::current().documents().moveItem(from, to);
             if (moving) {
                 VXLOG(vxWarning, "Dossa Move failed: %@", *moving);
                 return;
@@ -78,7 +75,7 @@ Failure FileUtils::remove(const Url& item) {
     Failure removing;
     Failure result = coordinator.coordinateWriting(
         item, WritingOptions::forDeleting, [&removing](const Url& url) {
-            removing = documents().removeItem(url);
+            removing = Platform::current().documents().removeItem(url);
             if (removing)
                 VXLOG(vxError, "failed to delete item:'%@': %@", url, *removing);
             else
@@ -102,7 +99,7 @@ Failure FileUtils::move(const Url& source, const Url& to) {
     if (Failure clash = kindsClash(source, to))
         return clash;
     Url destination = to;
-    if (exists(to)) {
+    if (isTaken(to)) {
         destination = generateUniquePath(to);
         VXLOG(vxDebug, "Avail  dest1: '%@'", destination);
     }
@@ -113,7 +110,7 @@ Failure FileUtils::move(const Url& source, const Url& to) {
 }
 
 void FileUtils::evictDocument(const Url& document) {
-    if (const Failure failure = documents().evictItem(document))
+    if (const Failure failure = Platform::current().documents().evictItem(document))
         VXLOG(vxWarning, "Evict error: %@", *failure);
 }
 

@@ -10,6 +10,7 @@
 namespace tavrin {
 namespace {
 
+using platform::Platform;
 using platform::TypeRegistry;
 using platform::Url;
 
@@ -17,10 +18,6 @@ using ContainerPointer = std::shared_ptr<const platform::CloudContainer>;
 
 /// A blank, a black right-pointing small triangle, a blank.
 constexpr std::string_view locationSeparator = " \u25B8 ";
-
-platform::CloudDocumentService& documents() {
-    return platform::Platform::current().documents();
-}
 
 /// Characters that no name may hold: what cannot be written (U+FFFE, U+FFFF and their kin, lone
 /// surrogates), broken UTF-8, controls (C0, DEL, C1) and line ends (also U+2028 and U+2029).
@@ -99,15 +96,10 @@ std::optional<platform::Value::List> contentTypesOf(const platform::CloudContain
     return found;
 }
 
-std::vector<std::string_view> components(std::string_view path) {
-    std::vector<std::string_view> found;
-    while (!path.empty()) {
-        const std::size_t end = std::min(path.find('/'), path.size());
-        if (end > 0)
-            found.push_back(path.substr(0, end));
-        path.remove_prefix(std::min(end + 1, path.size()));
-    }
-    return found;
+/// The path below the directory of all cloud documents; none outside it.
+std::optional<Url> relativeToShelfroot(const Url& url) {
+    const auto path = Platform::current().documents().pathRelativeToShelfroot(url);
+    return path ? std::optional(Url::file(*path)) : std::nullopt;
 }
 
 } // namespace
@@ -143,7 +135,7 @@ bool FileUtils::isValidExtensionForContainer(const Url& url) {
     const std::optional<std::string> type = typeOfExtension(url);
     if (!type)
         return true;
-    const auto container = documents().containerForItemAtURL(url);
+    const auto container = Platform::current().documents().containerForItemAtURL(url);
     if (!container || !*container)
         return false;
     if ((*container)->identifier() == platform::defaultContainerIdentifier)
@@ -162,14 +154,15 @@ bool FileUtils::isValidExtensionForContainer(const Url& url) {
 }
 
 std::optional<std::string> FileUtils::containerIdForURL(const Url& url) {
-    const auto container = documents().containerForItemAtURL(url);
+    const auto container = Platform::current().documents().containerForItemAtURL(url);
     return container && *container ? std::optional((*container)->identifier()) : std::nullopt;
 }
 
 platform::Failure
 FileUtils::containerAndRelativePathforURL(const Url& url, ContainerPointer* container,
                                           std::vector<std::string>* relativePathComponents) {
-    const platform::Result<ContainerPointer> found = documents().containerForItemAtURL(url);
+    const platform::Result<ContainerPointer> found =
+        Platform::current().documents().containerForItemAtURL(url);
     if (!found)
         return found.error();
     if (!*found)
@@ -178,12 +171,12 @@ FileUtils::containerAndRelativePathforURL(const Url& url, ContainerPointer* cont
         *container = *found;
     if (!relativePathComponents || !(*found)->documentsURL())
         return std::nullopt;
-    const auto itemPath = documents().pathRelativeToShelfroot(url);
-    const auto documentsPath = documents().pathRelativeToShelfroot(*(*found)->documentsURL());
+    const auto itemPath = relativeToShelfroot(url);
+    const auto documentsPath = relativeToShelfroot(*(*found)->documentsURL());
     if (!itemPath || !documentsPath)
         return std::nullopt;
-    const std::vector<std::string_view> item = components(*itemPath);
-    const std::size_t depth = components(*documentsPath).size();
+    const std::vector<std::string_view> item = itemPath->pathComponents();
+    const std::size_t depth = documentsPath->pathComponents().size();
     if (item.size() > depth)
         relativePathComponents->assign(item.begin() + static_cast<std::ptrdiff_t>(depth),
                                        item.end());
@@ -197,7 +190,7 @@ std::optional<std::string> FileUtils::displayableLocationForURL(const Url& url) 
         return std::nullopt;
     std::string text;
     if (!container->isDefault()) {
-        text += documents().localizedNameForDefaultContainer();
+        text += Platform::current().documents().localizedNameForDefaultContainer();
         text += locationSeparator;
     }
     text += container->localizedName();

@@ -4,19 +4,14 @@
 #include "platform/cloud/CloudDocumentService.h"
 
 namespace tavrin {
-namespace {
 
-platform::CloudDocumentService& documents() {
-    return platform::Platform::current().documents();
-}
-
-} // namespace
+using platform::Platform;
 
 std::optional<platform::Url> tavrin_URLByResolvingBookmark(const platform::Url& url) {
-    if (!documents().isExternalDocumentReference(url))
+    if (!Platform::current().documents().isExternalDocumentReference(url))
         return std::nullopt;
     const platform::Result<platform::Url> target =
-        documents().resolveExternalDocumentReference(url);
+        Platform::current().documents().resolveExternalDocumentReference(url);
     if (!target)
         return std::nullopt;
     if (std::optional<platform::Url> promised = tavrin_URLByResolvingPromise(*target))
@@ -25,9 +20,10 @@ std::optional<platform::Url> tavrin_URLByResolvingBookmark(const platform::Url& 
 }
 
 std::optional<platform::Url> tavrin_URLByResolvingPromise(const platform::Url& url) {
-    if (!documents().isPromiseAtURL(url))
+    if (!Platform::current().documents().isPromiseAtURL(url))
         return std::nullopt;
-    const std::optional<platform::Url> logical = documents().logicalURLOfPromise(url);
+    const std::optional<platform::Url> logical =
+        Platform::current().documents().logicalURLOfPromise(url);
     if (!logical)
         return std::nullopt;
     return logical->withPhysicalUrl(url);
@@ -38,11 +34,11 @@ bool wantsDefaultMediaPlayer(const platform::Url& /*url*/) {
 }
 
 bool dossa_isDocumentsContainer(const platform::Url& url) {
-    return documents().isDocumentsContainer(url);
+    return Platform::current().documents().isDocumentsContainer(url);
 }
 
 bool dossa_isInShelfroot(const platform::Url& url) {
-    return documents().isInShelfroot(url);
+    return Platform::current().documents().isInShelfroot(url);
 }
 
 } // namespace tavrin

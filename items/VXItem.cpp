@@ -16,13 +16,10 @@
 namespace tavrin {
 namespace {
 
+using platform::Platform;
 using platform::ResourceKey;
 using platform::Url;
 using platform::Value;
-
-platform::CloudDocumentService& documents() {
-    return platform::Platform::current().documents();
-}
 
 /// The attributes of a snapshot, in the order in which they are asked for.
 platform::ResourceKeys itemResourceKeys() {
@@ -60,10 +57,11 @@ bool isText(const Value& value, std::string_view text) {
 /// Access that a store may grant for as long as the object lives.
 class ScopedAccess {
 public:
-    explicit ScopedAccess(const Url& url) : url_(url), granted_(documents().startAccessing(url)) {}
+    explicit ScopedAccess(const Url& url)
+        : url_(url), granted_(Platform::current().documents().startAccessing(url)) {}
     ~ScopedAccess() {
         if (granted_)
-            documents().stopAccessing(url_);
+            Platform::current().documents().stopAccessing(url_);
     }
     ScopedAccess(const ScopedAccess&) = delete;
     ScopedAccess& operator=(const ScopedAccess&) = delete;
@@ -121,7 +119,7 @@ void VXItem::cacheValues() {
     isBookmark_ = target.has_value();
     const Url resolved = target.value_or(*url_);
     resolvedUrl_ = resolved;
-    promiseUrl_ = documents().physicalURL(resolved);
+    promiseUrl_ = Platform::current().documents().physicalURL(resolved);
 
     const ScopedAccess access(resolved);
     platform::FileCoordinator coordinator;
@@ -131,17 +129,18 @@ void VXItem::cacheValues() {
         [this, &resolved](const Url& read) {
             readAttributes(read);
             canPreview_ = platform::PlatformPreviewController::canPreview(resolved);
-            if (std::vector<std::string> names = documents().tags(resolved); !names.empty())
+            if (std::vector<std::string> names = Platform::current().documents().tags(resolved);
+                !names.empty())
                 tags_ = std::move(names);
         });
 }
 
 void VXItem::readAttributes(const Url& read) {
     platform::Result<platform::ResourceValues> values =
-        documents().promisedItemAttributes(read, itemResourceKeys());
+        Platform::current().documents().promisedItemAttributes(read, itemResourceKeys());
     if (!values) {
         VXLOG(vxWarning, "promisedItemResourceValuesForKeys failed on %@", read);
-        values = documents().plainAttributes(read, itemResourceKeys());
+        values = Platform::current().documents().plainAttributes(read, itemResourceKeys());
     }
     if (values)
         takeAttributes(read, *values);
@@ -168,10 +167,11 @@ void VXItem::takeAttributes(const Url& read, const platform::ResourceValues& val
     isDirectory_ = isTrue(values[ResourceKey::isDirectory]) && !isPackage_;
     hasHiddenExtension_ = isTrue(values[ResourceKey::hasHiddenExtension]);
 
-    isContainer_ = documents().isDocumentsContainer(read);
+    isContainer_ = Platform::current().documents().isDocumentsContainer(read);
     if (isContainer_) {
         renameable_ = false;
-        if (const auto container = documents().containerForItemAtURL(read); container && *container)
+        if (const auto container = Platform::current().documents().containerForItemAtURL(read);
+            container && *container)
             localizedName_ = (*container)->localizedName();
     } else {
         renameable_ =
