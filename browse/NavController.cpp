@@ -12,6 +12,8 @@
 #include "platform/ui/Application.h"
 #include "preview/PreviewItemManager.h"
 
+#include <utility>
+
 namespace tavrin {
 namespace {
 
@@ -84,6 +86,7 @@ void NavController::showPlaceholder() {
     VXLOG(vxWarning, "Pelmora is not enabled");
     if (const auto placeholder = platform::makeScreenByClassName(placeholderClass)) {
         setViewControllers({placeholder}, false);
+        endPreview();
     } else {
         VXLOG(vxError, "Creating the placeholder screen (%@) failed", placeholderClass);
         Platform::current().mainQueue().async([weak = weak_from_this()] {
@@ -108,6 +111,9 @@ void NavController::handleAccountChanges() {
     }
     VXLOG(vxInfo, "Pelmora Token Changed, enabled=%@, reinitializing view", current ? "YES" : "NO");
     savePelmoraToken(current);
+    // What is presented asks about documents of the account that was there before.
+    if (presentedViewController())
+        dismissViewController(false);
     setupInitialViewController();
 }
 
@@ -137,12 +143,19 @@ NavController::ListPointer NavController::getTopDocumentListController() const {
 }
 
 std::shared_ptr<PreviewItemManager> NavController::startItemManager(int previewMode) {
-    if (itemManager_)
-        itemManager_->unregisterAsFilePresenter();
+    // A transition that still runs ends now: ending later, the list that it brings to the top would
+    // take the new coordinator away.
+    setViewControllers(viewControllers(), false);
+    endPreview();
     itemManager_ = PreviewItemManager::create();
     itemManager_->setMode(previewMode);
     itemManager_->setNavigationController(self());
     return itemManager_;
+}
+
+void NavController::endPreview() {
+    if (const auto ended = std::exchange(itemManager_, nullptr))
+        ended->unregisterAsFilePresenter();
 }
 
 void NavController::showPreview(const std::shared_ptr<VXItem>& item, int previewMode) {
@@ -158,9 +171,10 @@ void NavController::logContainerURL() const {
 
 void NavController::encodeRestorableStateWithCoder(platform::RestorationCoder& coder) {
     NavigationController::encodeRestorableStateWithCoder(coder);
-    if (!itemManager_ || !itemManager_->item() || !itemManager_->item()->url())
+    const std::shared_ptr<VXItem> item = itemManager_ ? itemManager_->item() : nullptr;
+    if (!item || !item->url())
         return;
-    coder[restoredUrlKey] = *itemManager_->item()->url();
+    coder[restoredUrlKey] = *item->url();
     coder[restoredModeKey] = itemManager_->mode();
 }
 
@@ -181,9 +195,7 @@ void NavController::navigationControllerDidShowViewController(platform::Navigati
     auto* list = dynamic_cast<List*>(&screen);
     if (!list)
         return;
-    if (itemManager_)
-        itemManager_->unregisterAsFilePresenter();
-    itemManager_.reset();
+    endPreview();
     if (editMode_)
         editMode_ = list->isEditing();
     updateStatusUI(list);

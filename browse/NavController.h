@@ -143,12 +143,13 @@ private:
     void showStoreRoot();
     void showPlaceholder();
     std::shared_ptr<PreviewItemManager> startItemManager(int previewMode);
+    void endPreview();
+    /// Takes the search screen away; answers whether there was one.
+    bool leaveSearch();
     /// The tapped folder of a search's results; answers whether that was dealt with.
     bool leaveSearchForFolder(const ListPointer& next);
     platform::BarButtonItem::Pointer makeEditButton(std::string_view title,
                                                     void (NavController::*action)());
-    FilenamePrompt::Text createFolder(const platform::Url& folder, const std::string& name,
-                                      const std::optional<Urls>& itemsToMove, bool& dismiss);
     void presentPrompt(std::shared_ptr<FilenamePrompt> prompt);
     static void deleteEntry(const platform::Url& url, DeletionTally& tally);
     static void deleteContainer(const platform::Url& url, DeletionTally& tally);

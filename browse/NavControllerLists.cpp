@@ -63,10 +63,16 @@ void NavController::documentListControllerDidSelectContainerWithViewController(
     pushViewController(next, true);
 }
 
-bool NavController::leaveSearchForFolder(const ListPointer& next) {
+bool NavController::leaveSearch() {
     if (!std::dynamic_pointer_cast<platform::DocumentSearchController>(presentedViewController()))
         return false;
     dismissViewController(true);
+    return true;
+}
+
+bool NavController::leaveSearchForFolder(const ListPointer& next) {
+    if (!leaveSearch())
+        return false;
     const auto lists = List::listControllerHierarchyForURL(next->presentedURL());
     if (!lists) {
         VXLOG(vxError, "Search folder tap: Couldn't build DLC stack for %@.", next->presentedURL());
@@ -158,6 +164,8 @@ bool NavController::showURLPreview(const std::optional<Url>& url, int previewMod
         VXLOG(vxError, "Couldn't build DLC stack for %@. Not previewing", *folder);
         return false;
     }
+    // It would cover what is shown now.
+    leaveSearch();
     std::vector<std::shared_ptr<ViewController>> stack(lists->begin(), lists->end());
     const std::shared_ptr<PreviewItemManager> manager = startItemManager(previewMode);
     if (const auto screen = manager->prepareToPreviewItem(std::make_shared<VXItem>(*url))) {
