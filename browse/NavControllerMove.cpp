@@ -2,8 +2,9 @@
 #include "browse/NavController.h"
 #include "items/FileUtils.h"
 #include "items/UIUtils.h"
+#include "platform/Platform.h"
 #include "platform/base/Text.h"
-#include "platform/cloud/CloudContainer.h"
+#include "platform/cloud/CloudDocumentService.h"
 #include "platform/files/FileManager.h"
 
 namespace tavrin {
@@ -34,6 +35,18 @@ std::optional<bool> isDirectoryEntry(const Url& folder, const platform::Director
     return attributes->kind == platform::FileKind::directory;
 }
 
+/// Makes the folder that a prompt asked for; the words for what stands in its way.
+FilenamePrompt::Text makeNewFolder(const Url& folder) {
+    // A document that is only promised has its name as well.
+    if (FileUtils::exists(folder) || platform::Platform::current().documents().isPromised(folder)) {
+        VXLOG(vxInfo, "Item exists at path: %@", folder.path());
+        return UIUtils::bestMessage(
+            platform::makeError(platform::ErrorCode::fileExists, folder.lastPathComponent()));
+    }
+    const platform::Failure failure = FileUtils::mkdir(folder);
+    return failure ? FilenamePrompt::Text(UIUtils::bestMessage(failure)) : std::nullopt;
+}
+
 } // namespace
 
 void NavController::showMoveTargetForSelectedItems() {
@@ -61,9 +74,10 @@ void NavController::showMoveTargetForItems(const Urls& items, const Url& inFolde
 
 bool NavController::containerHasSubfolders(const Url& url) {
     std::shared_ptr<const platform::CloudContainer> container;
-    if (FileUtils::containerAndRelativePathforURL(url, &container, nullptr) || !container ||
-        !container->documentsURL())
+    if (FileUtils::containerAndRelativePathforURL(url, &container, nullptr) || !container)
         return true;
+    if (!container->documentsURL())
+        return false;
     const Url& folder = *container->documentsURL();
     bool found = false;
     const platform::Failure failure =
@@ -79,9 +93,11 @@ bool NavController::containerHasSubfolders(const Url& url) {
 
 void NavController::documentTargetSelectionControllerDidSelectItemAtURL(
     platform::DocumentTargetSelectionController& chooser, const Url& folder) {
+    // Copies: what is given belongs to the chooser, which may end with its dismissal.
     const Urls items = chooser.itemsToMove();
+    const Url target = folder;
     dismissViewController(true);
-    moveItemsToDirectoryAndShowErrors(items, folder);
+    moveItemsToDirectoryAndShowErrors(items, target);
 }
 
 std::vector<Error> NavController::moveItemsToDirectory(const Urls& items, const Url& toDirectory) {
@@ -120,17 +136,11 @@ void NavController::showNewFolderPromptDuringMove(const std::optional<Url>& fold
             if (!name || name->empty())
                 return std::nullopt;
             const Url made = folder.appending(*name, true);
-            if (FileUtils::exists(made)) {
-                VXLOG(vxInfo, "Item exists at path: %@", made.path());
-                return UIUtils::bestMessage(
-                    platform::makeError(platform::ErrorCode::fileExists, *name));
-            }
-            if (const platform::Failure failure = FileUtils::mkdir(made))
-                return UIUtils::bestMessage(failure);
-            dismiss = true;
-            if (!itemsToMove || weak.expired())
-                return std::nullopt;
-            const std::vector<Error> errors = moveItemsToDirectory(*itemsToMove, made);
+            if (FilenamePrompt::Text trouble = makeNewFolder(made))
+                return trouble;
+            std::vector<Error> errors;
+            if (itemsToMove && !weak.expired())
+                errors = moveItemsToDirectory(*itemsToMove, made);
             dismiss = errors.empty();
             if (errors.empty())
                 return std::nullopt;
