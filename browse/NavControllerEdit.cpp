@@ -8,6 +8,7 @@
 #include "platform/ui/Controls.h"
 
 #include <algorithm>
+#include <utility>
 
 namespace tavrin {
 namespace {
@@ -128,7 +129,7 @@ BarButtonItem::Pointer NavController::makeEditButton(std::string_view title,
 }
 
 void NavController::configureToolbar(List& list) {
-    barButtonNewFolder_.reset();
+    const BarButtonItem::Pointer formerNewFolder = std::exchange(barButtonNewFolder_, nullptr);
     barButtonMoveItem_.reset();
     barButtonDeleteItem_.reset();
     if (!editMode_) {
@@ -140,6 +141,9 @@ void NavController::configureToolbar(List& list) {
     }
     barButtonNewFolder_ =
         makeEditButton(localized("New Folder"), &NavController::promtForNewFolderAndCreate);
+    // The list has come back to the top in edit mode: the button is as it was.
+    if (formerNewFolder)
+        barButtonNewFolder_->setEnabled(formerNewFolder->isEnabled());
     barButtonMoveItem_ =
         makeEditButton(localized("Move"), &NavController::showMoveTargetForSelectedItems);
     barButtonDeleteItem_ =
