@@ -4,26 +4,20 @@
 #include "items/FileUtils.h"
 #include "items/UrlExtensions.h"
 #include "platform/base/Text.h"
+#include "platform/cloud/NameFolding.h"
 #include "platform/ui/Application.h"
-
-#include <algorithm>
-#include <cctype>
 
 namespace tavrin {
 namespace {
 
+using platform::ActionStyle;
+using platform::AlertAction;
 using platform::Failure;
 using platform::localized;
 using platform::Url;
 
 /// Stands in where an error brings no words of its own.
 constexpr std::string_view fallbackMessage = "Error exception";
-
-bool equalIgnoringCase(std::string_view a, std::string_view b) {
-    return std::equal(a.begin(), a.end(), b.begin(), b.end(), [](unsigned char x, unsigned char y) {
-        return std::tolower(x) == std::tolower(y);
-    });
-}
 
 std::string messageOf(const platform::Error& error) {
     if (error.localizedDescription)
@@ -70,7 +64,8 @@ Failure UIUtils::renameItemAtURL(const Url& item, std::string_view toName) {
 Url UIUtils::computeNewURL(const Url& item, std::string_view newBasename) {
     std::string name(newBasename);
     const std::string_view old = item.pathExtension();
-    if (!old.empty() && !equalIgnoringCase(old, platform::pathExtensionOf(newBasename)))
+    if (!old.empty() &&
+        platform::foldedName(old) != platform::foldedName(platform::pathExtensionOf(newBasename)))
         name.append(".").append(old);
     const std::optional<Url> folder = item.deletingLastPathComponent();
     return folder ? folder->appending(name, item.hasDirectoryMark()) : item;
@@ -83,7 +78,7 @@ std::string UIUtils::bestMessage(const Failure& error) {
 void UIUtils::showAlert(std::string_view title, std::string_view message,
                         const Screen& parentViewController) {
     auto alert = platform::AlertController::create(title, message, platform::AlertStyle::alert);
-    alert->addAction(platform::AlertAction::make(localized("OK"), platform::ActionStyle::standard));
+    alert->addAction(AlertAction::make(localized("OK"), ActionStyle::standard));
     if (parentViewController)
         parentViewController->presentViewController(alert, true);
 }
@@ -109,6 +104,37 @@ void UIUtils::showInvalidItemNameAlert(std::string_view name, const Screen& pare
                                         "characters, or with no punctuation marks.",
                                         name),
               parentViewController);
+}
+
+void UIUtils::showDeleteWarningAlert(const std::vector<platform::Url>& items, bool /*hasContainer*/,
+                                     const Screen& viewController,
+                                     const std::shared_ptr<platform::View>& usingView,
+                                     const platform::BarButtonItem::Pointer& usingButton,
+                                     DeleteCompletion completion) {
+    if (items.empty()) {
+        completion(nullptr, true);
+        return;
+    }
+    const std::optional<std::string> message = messageForDeletePrompt(items);
+    if (!message)
+        return;
+    auto sheet = platform::AlertController::create("", *message, platform::AlertStyle::actionSheet);
+    sheet->addAction(AlertAction::make(localized("Delete from Tavrin"), ActionStyle::destructive,
+                                       [completion](AlertAction& action) {
+                                           VXLOG(vxDebug, "Delete action");
+                                           completion(&action, false);
+                                       }));
+    sheet->addAction(AlertAction::make(localized("Cancel"), ActionStyle::cancel,
+                                       [completion](AlertAction& action) {
+                                           VXLOG(vxInfo, "Delete: Cancel pressed");
+                                           completion(&action, true);
+                                       }));
+    if (usingView)
+        sheet->setPopoverAnchor(usingView, anchorRect(*usingView),
+                                platform::ArrowDirection::left | platform::ArrowDirection::right);
+    else if (usingButton)
+        sheet->setPopoverAnchor(usingButton);
+    viewController->presentViewController(sheet, true);
 }
 
 void UIUtils::setCursorInTextFieldToBeforeExtension(platform::TextField& field) {
