@@ -62,7 +62,7 @@ void FilenamePrompt::initWithTitle(const Text& title, const Text& message, const
                                    const Text& doneButtonText) {
     alert_ = platform::AlertController::create(title.value_or(""), message.value_or(""),
                                                platform::AlertStyle::alert);
-    addField(placeholder);
+    addField(message ? message : title, placeholder);
     addCancelAction({});
     addDefaultAction(doneButtonText);
     errMsg_ = std::make_shared<SimpleTextViewController>();
@@ -70,12 +70,14 @@ void FilenamePrompt::initWithTitle(const Text& title, const Text& message, const
     updateErrorMessage("");
 }
 
-void FilenamePrompt::addField(const Text& placeholder) {
+void FilenamePrompt::addField(const Text& accessibleName, const Text& placeholder) {
     alert_->addTextField([&](TextField& field) {
         if (origFilename_)
             field.setText(*origFilename_);
         if (placeholder)
             field.setPlaceholder(*placeholder);
+        // The placeholder may be the very name that is to be replaced: no name for the field.
+        field.setAccessibleName(accessibleName.value_or(""));
         field.setClearButtonWhileEditing(true);
         field.setReturnKey(platform::ReturnKey::done);
         field.setReturnKeyNeedsText(true);

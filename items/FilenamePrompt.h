@@ -44,7 +44,7 @@ public:
 private:
     void initWithTitle(const Text& title, const Text& message, const Text& placeholder,
                        const Text& doneButtonText);
-    void addField(const Text& placeholder);
+    void addField(const Text& accessibleName, const Text& placeholder);
     bool mayDismiss();
 
     std::shared_ptr<platform::AlertController> alert_;
