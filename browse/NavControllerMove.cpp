@@ -2,9 +2,8 @@
 #include "browse/NavController.h"
 #include "items/FileUtils.h"
 #include "items/UIUtils.h"
-#include "platform/Platform.h"
 #include "platform/base/Text.h"
-#include "platform/cloud/CloudDocumentService.h"
+#include "platform/cloud/CloudContainer.h"
 #include "platform/files/FileManager.h"
 
 namespace tavrin {
@@ -37,8 +36,7 @@ std::optional<bool> isDirectoryEntry(const Url& folder, const platform::Director
 
 /// Makes the folder that a prompt asked for; the words for what stands in its way.
 FilenamePrompt::Text makeNewFolder(const Url& folder) {
-    // A document that is only promised has its name as well.
-    if (FileUtils::exists(folder) || platform::Platform::current().documents().isPromised(folder)) {
+    if (FileUtils::isTaken(folder)) {
         VXLOG(vxInfo, "Item exists at path: %@", folder.path());
         return UIUtils::bestMessage(
             platform::makeError(platform::ErrorCode::fileExists, folder.lastPathComponent()));
