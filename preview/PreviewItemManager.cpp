@@ -29,14 +29,20 @@ PreviewItemManager::PreviewItemManager()
 
 std::shared_ptr<PreviewItemManager> PreviewItemManager::create() {
     std::shared_ptr<PreviewItemManager> manager(new PreviewItemManager());
-    PreviewItemManager* const self = manager.get(); // its observations end with it
     platform::NotificationCenter& center = platform::Platform::current().notifications();
-    self->becameActive_ =
+    // Weak: the manager may come to its end on another thread while a notification is posted.
+    const auto calling = [weak = std::weak_ptr(manager)](void (PreviewItemManager::*operation)()) {
+        return [weak, operation](const platform::Notification&) {
+            if (const auto self = weak.lock())
+                ((*self).*operation)();
+        };
+    };
+    manager->becameActive_ =
         center.observe(platform::applicationDidBecomeActiveNotification,
-                       [self](const auto&) { self->didBecomeActiveNotification(); });
-    self->willResign_ =
+                       calling(&PreviewItemManager::didBecomeActiveNotification));
+    manager->willResign_ =
         center.observe(platform::applicationWillResignActiveNotification,
-                       [self](const auto&) { self->willResignActiveNotification(); });
+                       calling(&PreviewItemManager::willResignActiveNotification));
     // So that the full-preview screen exists before the first preview.
     GlimpseItemController::defaultController();
     return manager;
@@ -44,8 +50,9 @@ std::shared_ptr<PreviewItemManager> PreviewItemManager::create() {
 
 PreviewItemManager::~PreviewItemManager() {
     cancelDownload();
-    // The registry holds presenters weakly: with this object its registration is gone. The last
-    // reference may have been a notice's, on another thread; the screens end on the main one.
+    unregisterAsFilePresenter();
+    // The last reference may have been a notice's, on another thread; the screens end on the main
+    // one.
     const platform::MainOwned download(std::move(downloadViewController_));
     const platform::MainOwned details(std::move(detailsViewController_));
     const platform::MainOwned menu(std::move(documentInteractionController_));

@@ -119,7 +119,11 @@ private:
     std::optional<platform::Url> itemResolvedUrl() const;
     bool takeRefreshTurn();
     void finishRefreshTurn();
+    bool fullPreviewLagsBehind() const;
+    /// Leaves the preview of a file that is gone.
     void popScreen();
+    /// The screen is a preview screen of this manager's item.
+    bool worksFor(const Screen& screen) const;
 
     struct Download;
     static void startDownloadingNow(const std::weak_ptr<PreviewItemManager>& manager,
@@ -142,7 +146,7 @@ private:
     int mode_ = 0;
     bool autoDownload_ = false;
     std::optional<platform::Date> modifiedDate_;
-    std::weak_ptr<platform::NavigationController> navigationController_;
+    std::weak_ptr<platform::NavigationController> navigationController_; // it owns this manager
     std::shared_ptr<platform::DocumentInteractionController> documentInteractionController_;
     std::shared_ptr<platform::OperationQueue> fcQueue_;
     std::shared_ptr<platform::WorkQueue> downloadQueue_;

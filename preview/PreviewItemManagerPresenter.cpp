@@ -37,7 +37,7 @@ void PreviewItemManager::unregisterAsFilePresenter() {
     const std::lock_guard lock(registrationLock_);
     if (!filePresenterRegistered_)
         return;
-    FileCoordinator::removeFilePresenter(shared_from_this());
+    FileCoordinator::removeFilePresenter(this); // also from the destructor: no shared pointer
     filePresenterRegistered_ = false;
 }
 
@@ -95,10 +95,21 @@ void PreviewItemManager::refreshItem(const Url& url) {
     const bool rebuild = arrived && (!details || details->view()->isHidden());
     setItem(fresh, rebuild);
     VXLOG(vxInfo, "Refreshing %@", itemUrl());
-    if (newer)
+    if (fullPreviewLagsBehind())
+        GlimpseItemController::defaultController()->glimpseNewItem(shared_from_this());
+    else if (newer)
         reloadVisiblePreview();
     if (const auto shown = detailsViewController())
         shown->refreshItem();
+}
+
+/// The full preview shows this manager's document, at the place where it was before a move.
+bool PreviewItemManager::fullPreviewLagsBehind() const {
+    const auto& preview = GlimpseItemController::defaultController();
+    const std::optional<std::vector<Url>>& shown = preview->arrayOfDocuments();
+    const std::optional<Url> current = itemResolvedUrl();
+    return preview->itemManager().get() == this && shown && !shown->empty() && current &&
+           shown->front() != *current;
 }
 
 void PreviewItemManager::presentedItemDidMoveToURL(const Url& newUrl) {
@@ -118,8 +129,17 @@ void PreviewItemManager::accommodatePresentedItemDeletionWithCompletionHandler(
 }
 
 void PreviewItemManager::popScreen() {
-    if (const auto navigation = navigationController())
+    const auto navigation = navigationController();
+    // Whoever deleted the file from its preview, or has left that, is back at the list already.
+    if (navigation && worksFor(navigation->topViewController()))
         navigation->popViewController(true);
+}
+
+bool PreviewItemManager::worksFor(const Screen& screen) const {
+    if (const auto preview = std::dynamic_pointer_cast<PreviewBaseViewController>(screen))
+        return preview->itemManager().get() == this;
+    const auto full = std::dynamic_pointer_cast<GlimpseItemController>(screen);
+    return full && full->itemManager().get() == this;
 }
 
 void PreviewItemManager::accommodatePresentedSubitemDeletionAtURL(const Url& part,
