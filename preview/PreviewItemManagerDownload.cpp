@@ -1,5 +1,6 @@
 #include "app/VXLogging.h"
 #include "items/FileUtils.h"
+#include "items/UIUtils.h"
 #include "platform/Platform.h"
 #include "platform/base/MainOwned.h"
 #include "platform/base/Text.h"
@@ -180,7 +181,7 @@ std::shared_ptr<FileCoordinator> PreviewItemManager::downloadFC() const {
 void PreviewItemManager::showDownloadError(const Failure& error) {
     if (!error || hasCode(*error, ErrorCode::userCancelled))
         return;
-    std::string message = error->localizedDescription.value_or("");
+    std::string message = UIUtils::bestMessage(error);
     if (hasCode(*error, ErrorCode::serverNotAvailable) &&
         !NetworkWatcher::sharedNetworkWatcher()->isConnected())
         message = platform::localized(
