@@ -28,6 +28,7 @@ constexpr int detailsMode = 1;
 
 PreviewBaseViewController::PreviewBaseViewController()
     : progress_(std::make_shared<ProgressState>()) {
+    setExtendsUnderBars(true); // the margins keep the content clear of the bars
 }
 
 PreviewBaseViewController::~PreviewBaseViewController() {
@@ -121,41 +122,53 @@ void PreviewBaseViewController::refreshItem() {
     progress_->resetChunk();
 }
 
-void PreviewBaseViewController::configureButtons() {
-    const auto calling = [weak = weak_from_this()](void (PreviewBaseViewController::*operation)()) {
-        return [weak, operation](BarButtonItem&) {
-            if (const auto self = std::static_pointer_cast<PreviewBaseViewController>(weak.lock()))
-                ((*self).*operation)();
-        };
+std::function<void()> PreviewBaseViewController::calling(Operation operation) {
+    return [weak = weak_from_this(), operation] {
+        if (const auto self = std::static_pointer_cast<PreviewBaseViewController>(weak.lock()))
+            ((*self).*operation)();
     };
-    const auto flexible = BarButtonItem::withSystemItem(SystemItem::flexibleSpace);
-    const auto fixed = BarButtonItem::withSystemItem(SystemItem::fixedSpace);
-    moveItem_ = BarButtonItem::withSystemItem(SystemItem::organize,
-                                              calling(&PreviewBaseViewController::showMoveTarget));
-    deleteItem_ = BarButtonItem::withSystemItem(
-        SystemItem::trash, calling(&PreviewBaseViewController::showWarningAndDeleteDocument));
-    actionItem_ = BarButtonItem::withSystemItem(
-        SystemItem::action, calling(&PreviewBaseViewController::showDocumentActivities));
-    BarButtonItem::Pointer openItem;
-    if (const auto control = openInAppNavControllerButton()) {
-        control->addAction(platform::ControlEvent::touchUpInside, [weak = weak_from_this()] {
-            if (const auto self = std::static_pointer_cast<PreviewBaseViewController>(weak.lock()))
-                self->openInDefaultApp();
-        });
-        control->sizeToFit();
-        openItem = BarButtonItem::withCustomView(control);
-    }
+}
+
+void PreviewBaseViewController::configureButtons() {
+    const auto button = [this](SystemItem image, Operation operation) {
+        return BarButtonItem::withSystemItem(
+            image, [call = calling(operation)](BarButtonItem&) { call(); });
+    };
+    moveItem_ = button(SystemItem::organize, &PreviewBaseViewController::showMoveTarget);
+    deleteItem_ =
+        button(SystemItem::trash, &PreviewBaseViewController::showWarningAndDeleteDocument);
+    actionItem_ = button(SystemItem::action, &PreviewBaseViewController::showDocumentActivities);
+    const BarButtonItem::Pointer openItem = makeOpenItem();
     if (!itemHasUrl())
         for (const BarButtonItem::Pointer& item : {actionItem_, deleteItem_, moveItem_})
             item->setEnabled(false);
+    placeButtons(openItem);
+}
+
+BarButtonItem::Pointer PreviewBaseViewController::makeOpenItem() {
+    const auto control = openInAppNavControllerButton();
+    if (!control)
+        return nullptr;
+    // A control that comes back at a later appearance is connected already.
+    if (connectedControl_.lock() != control)
+        control->addAction(platform::ControlEvent::touchUpInside,
+                           calling(&PreviewBaseViewController::openInDefaultApp));
+    connectedControl_ = control;
+    control->sizeToFit();
+    return BarButtonItem::withCustomView(control);
+}
+
+void PreviewBaseViewController::placeButtons(const BarButtonItem::Pointer& openItem) {
     platform::NavigationController* stack = navigationController();
     if (UIUtils::tabloMode()) {
+        const auto fixed = BarButtonItem::withSystemItem(SystemItem::fixedSpace);
         navigationItem().setRightBarButtonItems(
             {actionItem_, fixed, deleteItem_, fixed, moveItem_});
         if (stack)
             stack->setToolbarHidden(true, false);
         return;
     }
+    const auto flexible = BarButtonItem::withSystemItem(SystemItem::flexibleSpace);
     setToolbarItems({actionItem_, flexible, deleteItem_, flexible, moveItem_});
     if (stack)
         stack->setToolbarHidden(false, false);

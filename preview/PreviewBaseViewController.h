@@ -4,8 +4,8 @@
 #include "platform/ui/Controls.h"
 #include "platform/ui/ViewController.h"
 
+#include <functional>
 #include <memory>
-#include <mutex>
 #include <utility>
 #include <vector>
 
@@ -74,8 +74,13 @@ public:
 
 private:
     struct ProgressState;
+    using Operation = void (PreviewBaseViewController::*)();
 
     bool itemHasUrl() const;
+    /// What calls the operation for as long as the screen is there.
+    std::function<void()> calling(Operation operation);
+    platform::BarButtonItem::Pointer makeOpenItem();
+    void placeButtons(const platform::BarButtonItem::Pointer& openItem);
 
     std::shared_ptr<platform::View> wrapperView_;
     std::weak_ptr<PreviewItemManager> itemManager_;
@@ -87,6 +92,7 @@ private:
     platform::BarButtonItem::Pointer actionItem_;
     platform::BarButtonItem::Pointer deleteItem_;
     platform::BarButtonItem::Pointer moveItem_;
+    std::weak_ptr<platform::Button> connectedControl_;
     std::shared_ptr<ProgressState> progress_;
 };
 
