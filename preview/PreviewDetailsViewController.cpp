@@ -165,6 +165,8 @@ void PreviewDetailsViewController::activateFixedConstraints() {
     filenameTextFieldFullWidthConstraint_ =
         LayoutConstraint::equal(*filenameTextField_, LayoutAttribute::width,
                                 *hairlineViews_.front(), LayoutAttribute::width);
+    // The lines are wider than the column that the name must keep to.
+    filenameTextFieldFullWidthConstraint_->setPriority(almostRequired);
     const auto nameHeight =
         static_cast<float>(nameHeightInLines * filenameTextField_->font().lineHeight());
     Constraints fixed = {filenameTextFieldFullWidthConstraint_,
@@ -235,8 +237,10 @@ void PreviewDetailsViewController::refreshItem() {
     PreviewBaseViewController::refreshItem();
     const auto manager = itemManager();
     const auto item = manager ? manager->item() : nullptr;
-    fileInfoView_->setItem(item);
     originalFilename_ = item ? item->localizedName().value_or("") : "";
+    if (!isViewLoaded()) // it is shown when a search has made way for it
+        return;
+    fileInfoView_->setItem(item);
     filenameTextField_->setText(originalFilename_);
     thumbnailView_->setItem(item);
 }

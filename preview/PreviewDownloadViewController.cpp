@@ -73,6 +73,8 @@ void PreviewDownloadViewController::setDownloading(bool downloading) {
 
 void PreviewDownloadViewController::refreshItem() {
     PreviewBaseViewController::refreshItem();
+    if (!isViewLoaded())
+        return;
     const auto manager = itemManager();
     const auto item = manager ? manager->item() : nullptr;
     downloadView_->setItem(item);
@@ -87,7 +89,7 @@ void PreviewDownloadViewController::updateProgress(
     const auto show = [weak = weak_from_this(), waiting = reportWaiting_, progress] {
         waiting->store(false);
         const auto self = std::static_pointer_cast<PreviewDownloadViewController>(weak.lock());
-        if (self && self->isViewLoaded() && self->downloadView_->downloading())
+        if (self && self->isViewLoaded())
             self->downloadView_->updateProgress(*progress);
     };
     const bool atAnEnd = progress->completedUnitCount() == 0 ||

@@ -29,12 +29,15 @@ void PreviewThumbnailViewController::setupViewsAndConstraints() {
 
 void PreviewThumbnailViewController::refreshItem() {
     PreviewBaseViewController::refreshItem();
+    if (!isViewLoaded())
+        return;
     const auto manager = itemManager();
     thumbnailView_->setItem(manager ? manager->item() : nullptr);
 }
 
 void PreviewThumbnailViewController::showProgress(bool shown) {
-    thumbnailView_->showProgress(shown);
+    if (isViewLoaded())
+        thumbnailView_->showProgress(shown);
 }
 
 } // namespace tavrin
