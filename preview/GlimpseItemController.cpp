@@ -1,6 +1,9 @@
 #include "preview/GlimpseItemController.h"
 
 #include "app/VXLogging.h"
+#include "platform/Platform.h"
+#include "platform/base/NotificationCenter.h"
+#include "platform/ui/Application.h"
 #include "preview/PreviewItemManager.h"
 
 namespace tavrin {
@@ -9,9 +12,15 @@ using platform::BarButtonItem;
 using platform::SystemItem;
 
 const std::shared_ptr<GlimpseItemController>& GlimpseItemController::defaultController() {
-    // Never destroyed: its view must not outlive the toolkit.
-    static const auto* const shared = new std::shared_ptr<GlimpseItemController>(create());
-    return *shared;
+    static std::shared_ptr<GlimpseItemController> shared;
+    static platform::Observation willTerminate;
+    if (!shared) {
+        shared = create();
+        willTerminate = platform::Platform::current().notifications().observe(
+            platform::applicationWillTerminateNotification,
+            [](const platform::Notification&) { shared.reset(); });
+    }
+    return shared;
 }
 
 std::shared_ptr<GlimpseItemController> GlimpseItemController::create() {

@@ -16,7 +16,7 @@ class GlimpseItemController : public platform::PlatformPreviewController,
                               public platform::PlatformPreviewDataSource,
                               public platform::PlatformPreviewDelegate {
 public:
-    /// Lives until the process ends.
+    /// Lives as long as the application.
     static const std::shared_ptr<GlimpseItemController>& defaultController();
     static std::shared_ptr<GlimpseItemController> create();
     static std::shared_ptr<GlimpseItemController>

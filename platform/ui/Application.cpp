@@ -38,6 +38,8 @@ Application::~Application() {
     const std::vector<Window*> windows = impl_->windows;
     for (Window* const window : windows)
         window->impl().willClose();
+    if (Runtime::installed())
+        Runtime::current().notifications.post(applicationWillTerminateNotification);
     impl_->delegate.reset();
     impl_.reset();
     sharedApplication = nullptr;

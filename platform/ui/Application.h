@@ -20,6 +20,9 @@ inline constexpr std::string_view applicationDidBecomeActiveNotification =
     "ApplicationDidBecomeActiveNotification";
 inline constexpr std::string_view applicationWillResignActiveNotification =
     "ApplicationWillResignActiveNotification";
+/// Posted when the toolkit is about to go: shared screens and views must not outlive it.
+inline constexpr std::string_view applicationWillTerminateNotification =
+    "ApplicationWillTerminateNotification";
 
 using LaunchOptions = Value::Map;
 /// Options of an open request: the caller's identity under sourceApplicationKey.
