@@ -123,7 +123,8 @@ Platform::Platform(PlatformParts parts) : state_(std::make_unique<State>(std::mo
 
 Platform::~Platform() {
     FileCoordinator::setContentProvider(nullptr);
-    state_->cloud.reset(); // what ends with it may still ask for the others
+    state_->cloud.reset();  // what ends with it may still ask for the others
+    state_->notify.reset(); // its handlers use the platform
     FileCoordinator::waitUntilIdle();
     installedPlatform = nullptr;
 }

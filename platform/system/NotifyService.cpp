@@ -51,6 +51,12 @@ class FileNotifyService final : public NotifyService {
 public:
     FileNotifyService(std::string folder, std::string managedFile)
         : folder_(std::move(folder)), managedFile_(std::move(managedFile)) {}
+    /// Whoever still holds a token hears nothing more.
+    ~FileNotifyService() override {
+        for (const std::weak_ptr<Observer>& each : observers_)
+            if (const std::shared_ptr<Observer> observer = each.lock())
+                observer->watches.clear();
+    }
 
     Token observe(std::string_view name, Executor& queue, Job handler) override {
         makeFolder();
@@ -62,6 +68,9 @@ public:
         observer->watch(path, queue, shared);
         if (name == managedSettingsChangedNotice)
             observer->watch(managedFile_, queue, shared);
+        const std::lock_guard lock(mutex_);
+        std::erase_if(observers_, [](const auto& each) { return each.expired(); });
+        observers_.push_back(observer);
         return observer;
     }
 
@@ -110,6 +119,8 @@ private:
 
     std::string folder_;
     std::string managedFile_;
+    std::mutex mutex_;
+    std::vector<std::weak_ptr<Observer>> observers_; // guarded by mutex_
     std::shared_ptr<DirectoryWatcher> watcher_ = std::make_shared<DirectoryWatcher>();
 };
 
