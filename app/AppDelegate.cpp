@@ -63,6 +63,7 @@ bool AppDelegate::applicationWillFinishLaunchingWithOptions(
     rootWindow_->setRootViewController(root);
     root->setRestorationIdentifier("Root");
     rootWindow_->makeKeyAndVisible();
+    statusStrip_ = std::make_unique<StatusStrip>(*rootWindow_);
     return true;
 }
 

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "app/StatusStrip.h"
 #include "platform/ui/Application.h"
 #include "platform/ui/Window.h"
 
@@ -32,6 +33,7 @@ private:
     std::shared_ptr<NavController> rootScreen() const;
 
     std::unique_ptr<platform::Window> rootWindow_;
+    std::unique_ptr<StatusStrip> statusStrip_; // shows itself in the window
 };
 
 } // namespace tavrin

@@ -1,0 +1,77 @@
+#include "app/StatusStrip.h"
+
+#include "platform/Platform.h"
+#include "platform/base/Identity.h"
+#include "platform/base/Text.h"
+#include "platform/base/WorkQueue.h"
+#include "platform/cloud/CloudAccountService.h"
+#include "platform/system/NetworkActivityIndicator.h"
+
+#include <optional>
+
+namespace tavrin {
+namespace {
+
+using platform::localized;
+using platform::Platform;
+
+/// Stands for the store of whoever is signed in.
+constexpr const char* watchedHost = "www.pelmora.com";
+
+std::string networkText(std::optional<std::uint32_t> flags) {
+    if (!flags)
+        return {};
+    if ((*flags & platform::reachabilityReachable) == 0)
+        return localized("Offline");
+    return localized((*flags & platform::reachabilityCellular) != 0 ? "Cellular" : "Wi-Fi");
+}
+
+} // namespace
+
+/// What reports reach; they may come while the strip is going.
+struct StatusStrip::Reports {
+    StatusStrip* strip = nullptr;
+    std::optional<std::uint32_t> flags; // none before the first report
+};
+
+StatusStrip::StatusStrip(platform::Window& window)
+    : window_(window), reports_(std::make_shared<Reports>()) {
+    reports_->strip = this;
+    Platform& platform = Platform::current();
+    const auto changed = [this](const platform::Notification&) { update(); };
+    accountChanged_ =
+        platform.notifications().observe(platform::cloudIdentityDidChangeNotification, changed);
+    activityChanged_ = platform.notifications().observe(
+        platform::networkActivityIndicatorDidChangeNotification, changed);
+    target_ = platform.reachability().createTarget(watchedHost);
+    if (target_) {
+        target_->setCallback([weak = std::weak_ptr(reports_)](std::uint32_t flags) {
+            Platform::current().mainQueue().async([weak, flags] {
+                const std::shared_ptr<Reports> reports = weak.lock();
+                if (!reports)
+                    return;
+                reports->flags = flags;
+                reports->strip->update();
+            });
+        });
+        target_->setQueue(std::make_shared<platform::WorkQueue>(
+            std::string(platform::applicationIdentifier) + ".statusstrip"));
+    }
+    update();
+}
+
+StatusStrip::~StatusStrip() {
+    if (!target_)
+        return;
+    target_->setCallback({});
+    target_->setQueue(nullptr);
+}
+
+void StatusStrip::update() {
+    const auto account = Platform::current().accounts().account();
+    window_.setStatusStrip({account ? account->name : localized("Not signed in"),
+                            account ? networkText(reports_->flags) : std::string(),
+                            Platform::current().networkActivityIndicator().isVisible()});
+}
+
+} // namespace tavrin
