@@ -52,14 +52,17 @@ void StoreHouse::start() {
     clock = manual.get();
     parts.clock = std::move(manual);
     parts.folders = foldersBelow(home);
+    if (adjustParts)
+        adjustParts(parts);
     platform = std::make_unique<platform::Platform>(std::move(parts));
 }
 
 void StoreHouse::signIn() {
     platform::AccountRecord account;
     account.kind = platform::folderAccountKind;
-    account.address = home / "remote";
+    account.address = remote;
     account.name = "anna@example.org";
+    account.rateLimit = rateLimit;
     account.identity = platform::Bytes(16, std::byte{7});
     if (const auto failure = platform::writeAccount(foldersBelow(home), account))
         throw std::runtime_error(failure->localizedDescription.value_or("no account"));

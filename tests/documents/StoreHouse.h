@@ -7,9 +7,11 @@
 #include "tests/support/TemporaryFolder.h"
 
 #include <condition_variable>
+#include <cstdint>
 #include <functional>
 #include <memory>
 #include <mutex>
+#include <optional>
 #include <string>
 #include <string_view>
 
@@ -44,7 +46,14 @@ public:
     platform::CloudDocumentService& documents() const { return platform->documents(); }
     platform::DocumentServices services() const { return platform::DocumentServices::current(); }
 
+    /// Puts parts of its own into the platform before it starts.
+    std::function<void(platform::PlatformParts&)> adjustParts;
+
+    /// Bytes a second that the account's transfers may take, from the next signIn on.
+    std::optional<std::uint64_t> rateLimit;
     TemporaryFolder home;
+    /// What the account signs in to.
+    std::string remote = home / "remote";
     platform::ManualClock* clock = nullptr;
     std::unique_ptr<platform::Platform> platform;
     /// Runs what waits on the main thread, and the toolkit's events where there are any.

@@ -1,0 +1,71 @@
+#include "tests/product/ProductHouse.h"
+
+#include "app/VXLogging.h"
+#include "platform/cloud/AccountFile.h"
+#include "platform/cloud/CloudAccountService.h"
+#include "platform/system/ReachabilityService.h"
+#include "services/NetworkWatcher.h"
+#include "tests/product/LogCapture.h"
+
+#include <gtest/gtest.h>
+
+#include <filesystem>
+
+namespace test {
+namespace {
+
+constexpr auto networkScript = "network";
+
+} // namespace
+
+ProductHouse::ProductHouse() {
+    home.write(networkScript, "wifi");
+    adjustParts = [this](platform::PlatformParts& parts) {
+        parts.jot = std::make_unique<CapturingJot>();
+        parts.reachability = platform::makeScriptedReachability("file:" + (home / networkScript));
+        parts.markerExists = [](const std::string&) { return false; };
+        parts.managedSettingsFile = home / "managed-settings.json";
+    };
+}
+
+ProductHouse::~ProductHouse() {
+    // The watcher and the log client are the process's own and outlive this platform.
+    tavrin::NetworkWatcher::sharedNetworkWatcher()->stop();
+    if (platform)
+        clearLog();
+}
+
+void ProductHouse::givenNetwork(const std::string& state) const {
+    home.write(networkScript, state);
+}
+
+void ProductHouse::awaitIdentityChange(const std::function<void()>& change) {
+    bool changed = false;
+    const platform::Observation observation = platform->notifications().observe(
+        platform::cloudIdentityDidChangeNotification,
+        [&changed](const platform::Notification&) { changed = true; });
+    change();
+    EXPECT_TRUE(until([&] { return changed; }));
+}
+
+void ProductHouse::signInAs(const std::string& name, const std::string& remoteFolder) {
+    platform::AccountRecord account;
+    account.kind = platform::folderAccountKind;
+    account.address = home.makeFolder(remoteFolder);
+    account.name = name;
+    account.identity = platform::Bytes(16, std::byte{9});
+    awaitIdentityChange(
+        [&] { EXPECT_FALSE(platform::writeAccount(platform->runtime().folders, account)); });
+}
+
+void ProductHouse::signOut() {
+    awaitIdentityChange([&] {
+        std::filesystem::remove(platform->runtime().folders.config + "/pelmora/account.json");
+    });
+}
+
+void ProductHouse::givenContainer(const std::string& name, const std::string& description) const {
+    home.write("remote/" + name + "/.container.json", description);
+}
+
+} // namespace test

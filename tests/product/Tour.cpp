@@ -1,0 +1,187 @@
+// A tour of the program's screens on the sample store: writes a picture of each into the folder
+// that it is given.
+
+#include "platform/base/Text.h"
+#include "platform/documents/DocumentSearchController.h"
+#include "preview/PreviewDownloadViewController.h"
+#include "preview/PreviewItemManager.h"
+#include "tests/product/ProgramHouse.h"
+#include "tools/pelmora/SampleStore.h"
+
+#include <QGuiApplication>
+
+#include <cstdio>
+#include <string>
+
+using namespace std::chrono_literals;
+
+namespace {
+
+struct Look {
+    std::string name;
+    platform::Size size;
+    bool rightToLeft = false;
+    double scale = 1;
+};
+
+std::string folder = "screens";
+/// The remote that all windows show; nobody changes it.
+std::string sampleFolder;
+
+/// Its pages and pictures are drawn with the toolkit's fonts.
+void makeSample(const std::string& root) {
+    int count = 1;
+    char name[] = "tour";
+    char* arguments[] = {name, nullptr};
+    const QGuiApplication drawing(count, arguments);
+    if (const auto failure = pelmora::makeSampleStore(root))
+        throw std::runtime_error(failure->localizedDescription.value_or("no sample"));
+    sampleFolder = root;
+}
+
+/// The program on the sample, in one form of the window.
+struct Tour : test::ProgramHouse {
+    explicit Tour(Look look, std::optional<std::uint64_t> rate = {}) : look_(std::move(look)) {
+        remote = sampleFolder;
+        rateLimit = rate;
+        signIn();
+        launch(look_.size);
+        application->setRightToLeft(look_.rightToLeft);
+        untilShows("Travel");
+    }
+
+    void picture(const std::string& name) {
+        calmDown();
+        advance(1s); // what moves comes to rest
+        savePicture(folder + "/" + name + "-" + look_.name + ".png", look_.scale);
+    }
+    void back() {
+        nav().popViewController(false);
+        advance(1s);
+    }
+    void closeAlert() {
+        if (platform::AlertController* const shown = alert())
+            shown->dismissViewController(false);
+        advance(1s);
+    }
+    void select(const std::vector<std::string>& names) {
+        std::vector<platform::Url> urls;
+        for (const std::string& name : names)
+            urls.push_back(row(name));
+        list()->setSelectedItems(urls);
+        nav().documentListControllerItemsChanged(*list());
+    }
+    void action(platform::DocumentAction number, const std::string& name) {
+        nav().documentListControllerPerformAction(*list(), static_cast<int>(number), row(name),
+                                                  list()->view(), [] {});
+        advance(1s);
+    }
+
+private:
+    Look look_;
+};
+
+void lists(Tour& tour) {
+    tour.picture("1-store");
+    tour.open("Documents");
+    tour.untilShows("House Rules.pdf");
+    tour.picture("2-folder");
+    tour.nav().beginEditMode();
+    tour.picture("3-edit");
+    tour.select({"Archive", "Budget 2026.csv"});
+    tour.picture("3-edit-selected");
+    tour.nav().showMoveTargetForSelectedItems();
+    tour.advance(1s);
+    tour.picture("4-move-to");
+    tour.nav().dismissViewController(false);
+    tour.advance(1s);
+    tour.nav().showWarningAndDeleteDocument();
+    tour.picture("5-delete");
+    tour.closeAlert();
+    tour.nav().promtForNewFolderAndCreate();
+    tour.picture("6-new-folder");
+    tour.closeAlert();
+    tour.nav().endEditMode();
+    tour.action(platform::DocumentAction::rename, "Shopping.txt");
+    tour.picture("7-rename");
+    tour.closeAlert();
+    tour.action(platform::DocumentAction::more, "House Rules.pdf");
+    tour.picture("8-more");
+    tour.nav().dismissViewController(false);
+    tour.advance(1s);
+    tour.action(platform::DocumentAction::information, "House Rules.pdf");
+    tour.picture("9-details");
+    tour.back();
+}
+
+void documents(Tour& tour) {
+    for (const std::string name : {"House Rules.pdf", "Lake House.svg", "Long Story.txt"}) {
+        tour.open(name);
+        tour.until([&] { return tour.titles().back() == name; });
+        tour.calmDown();
+        tour.picture("document-" + name.substr(0, name.find('.')));
+        tour.back();
+    }
+    tour.open("Coast Panorama.png");
+    tour.picture("download-waiting");
+    tour.back();
+}
+
+void search(Tour& tour) {
+    const auto screen = platform::DocumentSearchController::create(tour.list());
+    tour.nav().presentViewController(screen, false);
+    tour.advance(1s);
+    tour.type("fer");
+    tour.picture("search");
+    tour.nav().dismissViewController(false);
+    tour.advance(1s);
+}
+
+void download(const Look& look) {
+    Tour tour(look, 6'291'456 / 10);
+    tour.open("Documents");
+    tour.open("Coast Panorama.png");
+    tour.tap(*tour.button("Download to View"));
+    tour.calmDown();
+    tour.advance(3s);
+    tour.picture("download-running");
+    tour.nav().itemManager()->cancelDownload();
+    tour.calmDown();
+}
+
+void signedOut(const Look& look) {
+    test::ProgramHouse house;
+    house.launch(look.size);
+    house.calmDown();
+    house.savePicture(folder + "/nobody-" + look.name + ".png");
+}
+
+void show(const Look& look) {
+    std::printf("%s\n", look.name.c_str());
+    Tour tour(look);
+    lists(tour);
+    documents(tour);
+    search(tour);
+}
+
+} // namespace
+
+int main(int argc, char** argv) {
+    if (argc > 1)
+        folder = argv[1];
+    platform::loadLocalizedTexts("en_US");
+    const test::TemporaryFolder sample;
+    makeSample(sample / "Sample");
+    const Look phone{"phone", test::phone};
+    const Look tablet{"tablet", test::tablet};
+    show(phone);
+    show(tablet);
+    show({"phone-landscape", {844, 390}});
+    show({"tablet-portrait", {768, 1024}});
+    show({"phone-rtl", test::phone, true, 2});
+    download(phone);
+    download(tablet);
+    signedOut(phone);
+    signedOut(tablet);
+    return 0;
+}
