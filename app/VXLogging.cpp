@@ -213,7 +213,7 @@ void VXLogv(const char* file, const char* function, unsigned line, const char* c
         [message = std::move(message)] { sendMessage(*message); });
 }
 
-void _TavrinLogTest() {
+void TavrinLogTest() {
     platform::writeConsoleLine(platform::format("Jot log level is %@", VXJotLogLevel()));
     static constexpr std::array<std::pair<int, const char*>, 6> levels = {{{7, "LOG_DEBUG"},
                                                                            {6, "LOG_INFO"},
@@ -226,13 +226,14 @@ void _TavrinLogTest() {
 }
 
 void connectPlatformLog() {
-    platform::setLogSink({[](int level) { return VXShouldLog(level); },
-                          [](int level, std::string message, const std::source_location& where) {
-                              const std::array<platform::FormatArgument, 1> arguments{
-                                  platform::makeFormatArgument(message)};
-                              VXLogv(where.file_name(), where.function_name(), where.line(), "VX",
-                                     level, nullptr, "%@", arguments);
-                          }});
+    platform::setLogSink(
+        {[](int level) { return VXShouldLog(level); },
+         [](int level, const std::string& message, const std::source_location& where) {
+             const std::array<platform::FormatArgument, 1> arguments{
+                 platform::makeFormatArgument(message)};
+             VXLogv(where.file_name(), where.function_name(), where.line(), "VX", level, nullptr,
+                    "%@", arguments);
+         }});
 }
 
 } // namespace tavrin

@@ -90,7 +90,7 @@ void VXLog(const char* file, const char* function, unsigned line, const char* ca
 }
 
 /// Writes the six levels once each; for trying out the log by hand.
-void _TavrinLogTest();
+void TavrinLogTest();
 
 /// Sends what the platform logs through the same client, under the file and line where it stands.
 void connectPlatformLog();
