@@ -1,11 +1,18 @@
 #include "app/AppDelegate.h"
 #include "app/VXLogging.h"
 #include "items/FileUtils.h"
+#include "platform/ApplicationEntry.h"
 #include "platform/Platform.h"
 #include "platform/base/Text.h"
 
+#include <optional>
+#include <string>
+
 int main(int argc, char** argv) {
     platform::loadLocalizedTexts(platform::systemLanguage());
+    platform::ApplicationEntry entry(argc, argv);
+    if (const std::optional<int> status = entry.exitStatus())
+        return *status;
     platform::Platform services;
     tavrin::connectPlatformLog();
     const std::string program = argc > 0 ? argv[0] : "";
@@ -15,7 +22,7 @@ int main(int argc, char** argv) {
     int status = 0;
     {
         platform::Application application(argc, argv);
-        status = application.run(std::make_shared<tavrin::AppDelegate>());
+        status = entry.run(application, std::make_shared<tavrin::AppDelegate>());
     }
     // The services go away before the threads that may still log.
     tavrin::VXJotClient::JotClient()->close();

@@ -169,7 +169,7 @@ TEST_F(Browse, offersAMoveOnlyWhereThereAreFolders) {
     EXPECT_THAT(sheetEntries(), Contains("Move to Folder…"));
 }
 
-TEST_F(Browse, renamesByTheRowAndKeepsAskingWhileTheNameIsTaken) {
+TEST_F(Browse, renamesByTheRowBesideATakenName) {
     signIn();
     givenFile("Milk.txt");
     givenFile("Bread.txt");
@@ -177,20 +177,22 @@ TEST_F(Browse, renamesByTheRowAndKeepsAskingWhileTheNameIsTaken) {
     open("Documents");
     ASSERT_TRUE(untilShows("Milk.txt"));
     perform(DocumentAction::rename, row("Milk.txt"));
+    EXPECT_EQ(completions, 1);
     ASSERT_EQ(alertText(), "Rename Item: Enter a new name for this item.");
     const auto field = alert()->textFields().front();
-    EXPECT_EQ(field->text(), "Milk.txt");
-    type("Bread"); // over the name before the extension, which is selected
-    ASSERT_EQ(field->text(), "Bread.txt");
-    tap(*button("Done"));
-    advance(1s);
-    EXPECT_NE(alert(), nullptr);
-    type("X");
+    ASSERT_EQ(field->text(), "Milk.txt");
+    for (int i = 0; i < 8; ++i)
+        press(Key::backspace);
+    type("Rye/");
+    EXPECT_NE(label("Character not allowed in filename"), nullptr);
+    EXPECT_FALSE(button("Done")->isEnabled());
+    for (int i = 0; i < 4; ++i)
+        press(Key::backspace);
+    type("Bread");
     tap(*button("Done"));
     advance(1s);
     EXPECT_EQ(alert(), nullptr);
-    EXPECT_TRUE(untilShows("BreadX.txt"));
-    EXPECT_EQ(completions, 1);
+    EXPECT_TRUE(untilShows("Bread 2.txt"));
 }
 
 TEST_F(Browse, opensTheScreensDownToADeepAddressForKnownCallersOnly) {

@@ -26,8 +26,10 @@ bool takes(const CloudContainer& container, std::string_view extension) {
     if (!type)
         return true;
     return std::ranges::any_of(container.documentTypes(), [&](const ContainerDocumentType& kind) {
-        return std::ranges::any_of(kind.contentTypes,
-                                   [&](const Value& each) { return isFamilyOf(each, *type); });
+        const Value::List* const contents = kind.contentTypes.list();
+        return contents && std::ranges::any_of(*contents, [&](const Value& each) {
+                   return isFamilyOf(each, *type);
+               });
     });
 }
 
