@@ -1,6 +1,7 @@
 #include "tests/product/ProductHouse.h"
 
 #include "app/VXLogging.h"
+#include "platform/base/Process.h"
 #include "platform/cloud/AccountFile.h"
 #include "platform/cloud/CloudAccountService.h"
 #include "platform/system/ReachabilityService.h"
@@ -16,9 +17,22 @@ namespace {
 
 constexpr auto networkScript = "network";
 
+/// The machine's types and pictures without its applications: which of them are installed must not
+/// decide what a tap does.
+struct DeskWithoutApplications {
+    DeskWithoutApplications() {
+        for (const std::string name : {"mime", "icons", "themes"})
+            std::filesystem::create_directory_symlink("/usr/share/" + name, share / name);
+        platform::setEnvironmentVariable("XDG_DATA_DIRS", share.path());
+        platform::setEnvironmentVariable("XDG_CONFIG_DIRS", share.path());
+    }
+    TemporaryFolder share;
+};
+
 } // namespace
 
 ProductHouse::ProductHouse() {
+    static const DeskWithoutApplications desk;
     home.write(networkScript, "wifi");
     adjustParts = [this](platform::PlatformParts& parts) {
         parts.jot = std::make_unique<CapturingJot>();
