@@ -95,6 +95,8 @@ void lists(Tour& tour) {
     tour.picture("4-move-to");
     tour.nav().dismissViewController(false);
     tour.advance(1s);
+    tour.nav().beginEditMode();
+    tour.select({"Archive", "Budget 2026.csv"});
     tour.nav().showWarningAndDeleteDocument();
     tour.picture("5-delete");
     tour.closeAlert();
