@@ -96,7 +96,7 @@ Result<bool> handToSocket(const InstanceFolder& folder, const OpenRequest& reque
         return socket.error();
     if (!*socket)
         return false;
-    if (const Result<bool> sent = sendAll(socket->get(), frameOf(request), deadline); !sent)
+    if (Result<bool> sent = sendAll(socket->get(), frameOf(request), deadline); !sent)
         return sent;
     Result<std::string> answer = answerOf(socket->get(), deadline);
     if (!answer)
