@@ -37,7 +37,7 @@ struct Instances : ::testing::Test {
     WorkQueue queue{"test.instance"};
     std::mutex mutex;
     std::condition_variable arrived;
-    std::vector<OpenRequest> requests;
+    std::vector<OpenRequest> heard; // guarded by mutex
     std::unique_ptr<SingleInstance> instance;
 
     Instances() {
@@ -54,15 +54,15 @@ struct Instances : ::testing::Test {
         instance = *std::move(claimed);
         instance->setHandler(queue, [this](const OpenRequest& request) {
             const std::lock_guard lock(mutex);
-            requests.push_back(request);
+            heard.push_back(request);
             arrived.notify_all();
         });
     }
     /// As soon as there are so many.
-    const std::vector<OpenRequest>& waitForRequests(std::size_t count) {
+    std::vector<OpenRequest> waitForRequests(std::size_t count) {
         std::unique_lock lock(mutex);
-        arrived.wait_for(lock, std::chrono::seconds(20), [&] { return requests.size() >= count; });
-        return requests;
+        arrived.wait_for(lock, std::chrono::seconds(20), [&] { return heard.size() >= count; });
+        return heard;
     }
     Program::Start peer(const std::string& what, const std::vector<std::string>& urls = {},
                         const std::string& program = peerProgram) const {
@@ -99,7 +99,8 @@ TEST_F(Instances, ASecondStartHandsOverAndEnds) {
     const test::Outcome second = test::run(peer("claim", {url, "tavrinapp:///%zz"}));
     EXPECT_EQ(second.output, "second\n");
     EXPECT_EQ(second.status, 0);
-    ASSERT_EQ(waitForRequests(1).size(), 1U);
+    const auto requests = waitForRequests(1);
+    ASSERT_EQ(requests.size(), 1U);
     EXPECT_THAT(requests[0].urls, ElementsAre(url, "tavrinapp:///%zz")) << "as they were given";
     EXPECT_EQ(requests[0].source, fs::canonical(peerProgram)) << "who it really is";
     EXPECT_EQ(hand({}), "taken\n");
@@ -146,7 +147,7 @@ TEST_F(Instances, WhileOneEndsTheNextWaits) {
     EXPECT_FALSE(SingleInstance::claim(options, {})) << "it has not closed its files yet";
     instance.reset();
     EXPECT_EQ(next.readLine(), "first");
-    EXPECT_TRUE(requests.empty());
+    EXPECT_TRUE(waitForRequests(0).empty());
 }
 
 TEST_F(Instances, WithNoPlaceForTheLockItStartsAllTheSame) {
@@ -177,7 +178,8 @@ TEST_F(Instances, TheOpenerAndTheTestRunnerAreKnownByTheirFiles) {
     givenInstance();
     for (const char* program : {"opener", "runner", "alias"})
         EXPECT_EQ(test::run(peer("hand", {url}, home / program)).output, "taken\n");
-    waitForRequests(3);
+    const auto requests = waitForRequests(3);
+    ASSERT_EQ(requests.size(), 3U);
     EXPECT_EQ(requests[0].source, homeScreenApplicationIdentifier);
     EXPECT_EQ(requests[1].source, testRunnerApplicationIdentifier);
     EXPECT_EQ(requests[2].source, homeScreenApplicationIdentifier) << "whatever it is called";
@@ -265,7 +267,8 @@ TEST_F(OnABus, AnswersAsAnApplication) {
     EXPECT_EQ(call("Activate", "'a{sv}' 1 desktop-startup-id s u").status, 0);
     EXPECT_NE(call("ActivateAction", "'sava{sv}' erase 0 0").status, 0);
     EXPECT_NE(call("Open", "'asa{sv}' 1 " + std::string(100'000, 'x') + " 0").status, 0);
-    ASSERT_EQ(waitForRequests(2).size(), 2U);
+    const auto requests = waitForRequests(2);
+    ASSERT_EQ(requests.size(), 2U);
     EXPECT_THAT(requests[0].urls, ElementsAre(url, "b"));
     EXPECT_EQ(requests[0].activationToken, "t");
     EXPECT_THAT(*requests[0].source, HasSubstr("busctl"));
@@ -280,7 +283,8 @@ TEST_F(OnABus, TheNameOnTheBusHoldsOtherRuntimeFoldersTogether) {
     options.folders.runtime = other;
     EXPECT_EQ(test::run(peer("claim", {url})).output, "second\n");
     EXPECT_EQ(hand({url}), "taken\n");
-    ASSERT_EQ(waitForRequests(2).size(), 2U);
+    const auto requests = waitForRequests(2);
+    ASSERT_EQ(requests.size(), 2U);
     EXPECT_EQ(requests[1].source, homeScreenApplicationIdentifier) << "known on the bus as well";
 }
 
