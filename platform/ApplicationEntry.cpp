@@ -8,6 +8,7 @@
 
 #include <cstdio>
 #include <utility>
+#include <vector>
 
 namespace platform {
 namespace {
@@ -16,16 +17,55 @@ constexpr int handedOver = 0;
 constexpr int notTaken = 1;
 constexpr int notPassedOn = 2;
 
-void open(Application& application, const OpenRequest& request) {
-    application.bringForward(request.activationToken);
-    OpenUrlOptions options;
-    if (request.source)
-        options.emplace(sourceApplicationKey, *request.source);
-    for (const std::string& url : request.urls)
-        application.openUrl(url, options);
-}
+/// A desk that gives the focus gives it sooner than this.
+constexpr auto activationPatience = std::chrono::milliseconds(500);
 
 } // namespace
+
+/// Requests on their way to the application. Addresses wait until it is active: what it looks after
+/// at that moment (another account) may rebuild its screens, and would take away what was opened.
+class ApplicationEntry::Requests : public std::enable_shared_from_this<Requests> {
+public:
+    explicit Requests(Application& application)
+        : application_(application),
+          activated_(Runtime::current().notifications.observe(
+              applicationDidBecomeActiveNotification,
+              [this](const Notification&) { openSoon(); })) {}
+
+    void take(const OpenRequest& request) {
+        application_.bringForward(request.activationToken);
+        waiting_.push_back(request);
+        if (application_.isActive())
+            openSoon();
+        else if (!limit_)
+            limit_ = Runtime::current().mainQueue.timer(activationPatience, [this] { openAll(); });
+    }
+
+private:
+    /// After all others who hear of the activity.
+    void openSoon() {
+        Runtime::current().mainQueue.async([weak = weak_from_this()] {
+            if (const auto self = weak.lock())
+                self->openAll();
+        });
+    }
+
+    void openAll() {
+        limit_ = Timer();
+        for (const OpenRequest& request : std::exchange(waiting_, {})) {
+            OpenUrlOptions options;
+            if (request.source)
+                options.emplace(sourceApplicationKey, *request.source);
+            for (const std::string& url : request.urls)
+                application_.openUrl(url, options);
+        }
+    }
+
+    Application& application_;
+    std::vector<OpenRequest> waiting_;
+    Timer limit_;
+    Observation activated_;
+};
 
 ApplicationEntry::ApplicationEntry(int argc, const char* const* argv)
     : ApplicationEntry(SingleInstance::Options::ofThisProcess(),
@@ -64,15 +104,18 @@ int ApplicationEntry::run(Application& application,
 }
 
 void ApplicationEntry::serve(Application& application) {
-    if (instance_)
-        instance_->setHandler(
-            Runtime::current().mainQueue,
-            [&application](const OpenRequest& request) { open(application, request); });
+    if (!instance_)
+        return;
+    requests_ = std::make_shared<Requests>(application);
+    instance_->setHandler(
+        Runtime::current().mainQueue,
+        [requests = requests_](const OpenRequest& request) { requests->take(request); });
 }
 
 void ApplicationEntry::stopServing() {
     if (instance_)
         instance_->stop();
+    requests_.reset();
 }
 
 } // namespace platform

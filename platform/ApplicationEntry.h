@@ -32,18 +32,20 @@ public:
     std::optional<int> exitStatus() const { return exitStatus_; }
 
     /// Launches and runs the application as its own `run` does, with the requests: each brings it
-    /// forward, then opens its addresses in their order. None is heard before the launch is over,
-    /// nor after the loop's end.
+    /// forward and, once it is active (or the desk keeps the focus where it is), opens its
+    /// addresses in their order. None is heard before the launch is over, nor after the loop's end.
     int run(Application& application, const std::shared_ptr<ApplicationDelegate>& delegate);
     /// The parts of run, for hosts with a loop of their own.
     void serve(Application& application);
     void stopServing();
 
 private:
+    class Requests;
     int statusOf(const Error& error) const;
 
     std::string busAddress_;
     std::unique_ptr<SingleInstance> instance_;
+    std::shared_ptr<Requests> requests_;
     std::optional<int> exitStatus_;
 };
 
