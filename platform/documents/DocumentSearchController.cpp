@@ -5,18 +5,22 @@
 #include "platform/documents/list/ListView.h"
 #include "platform/documents/list/ListWidget.h"
 #include "platform/documents/search/SearchModel.h"
+#include "platform/ui/BarButtonImpl.h"
 #include "platform/ui/Controls.h"
 #include "platform/ui/Direction.h"
 #include "platform/ui/Theme.h"
 
 #include <algorithm>
 #include <cmath>
+#include <utility>
 
 namespace platform {
 namespace {
 
-constexpr double gap = 8;
-constexpr double bottomGap = 8;
+/// A button's own padding, which stands within the page's margin.
+constexpr double buttonPadding = Theme::iconGap;
+constexpr double bottomGap = 4;
+constexpr double largestCancelShare = 0.45;
 
 /// The field and the way out, above what was found.
 class SearchPage : public View {
@@ -25,6 +29,7 @@ public:
         : field(std::make_shared<TextField>()),
           results_(std::move(results)),
           cancel_(std::make_shared<Button>(ButtonType::system)),
+          bar_(std::make_shared<View>()),
           line_(std::make_shared<View>()) {
         setBackgroundColor(Theme::page);
         field->setPlaceholder(localized("Search all documents"));
@@ -33,9 +38,10 @@ public:
         field->setCapitalization(Capitalization::none);
         cancel_->setTitle(localized("Cancel"));
         cancel_->addAction(ControlEvent::touchUpInside, std::move(cancelled));
+        bar_->setBackgroundColor(Theme::bar);
         line_->setBackgroundColor(Theme::hairline);
         for (const std::shared_ptr<View>& each :
-             std::initializer_list<std::shared_ptr<View>>{field, cancel_, results_, line_})
+             std::initializer_list<std::shared_ptr<View>>{bar_, field, cancel_, results_, line_})
             addSubview(each);
     }
 
@@ -44,15 +50,20 @@ public:
 protected:
     void layoutSubviews() override {
         const double width = bounds().width;
-        const double margin = RowStyle::current().margin;
+        const double margin = pageMargin();
         const double height =
             std::max(Theme::minimumTarget, std::ceil(field->intrinsicContentSize().height));
         const double top = (Theme::barHeight - Theme::minimumTarget) / 2;
-        const double cancelWidth = std::min(cancel_->intrinsicContentSize().width, width / 3);
-        const double fieldWidth = std::max(0.0, width - 2 * margin - gap - cancelWidth);
+        // As in the bar that stands here on other screens.
+        if (const double scale = barTitleScale(); std::exchange(cancelScale_, scale) != scale)
+            cancel_->setTitleFont(Font::preferred(TextStyle::body).scaled(scale));
+        const double cancelWidth =
+            std::min(cancel_->intrinsicContentSize().width, width * largestCancelShare);
+        const double fieldWidth = std::max(0.0, width - 2 * margin + buttonPadding - cancelWidth);
         field->setFrame(mirrored({margin, top, fieldWidth, height}, width));
-        cancel_->setFrame(mirrored({margin + fieldWidth + gap, top, cancelWidth, height}, width));
+        cancel_->setFrame(mirrored({margin + fieldWidth, top, cancelWidth, height}, width));
         const double y = top + height + bottomGap;
+        bar_->setFrame({0, 0, width, y});
         line_->setFrame({0, y - 1, width, 1});
         results_->setFrame({0, y, width, std::max(0.0, bounds().height - y)});
     }
@@ -60,6 +71,8 @@ protected:
 private:
     std::shared_ptr<ListView> results_;
     std::shared_ptr<Button> cancel_;
+    double cancelScale_ = 1;
+    std::shared_ptr<View> bar_;
     std::shared_ptr<View> line_;
 };
 
@@ -113,10 +126,12 @@ struct DocumentSearchController::Impl final : ListClient {
         if (model->count() > 0)
             return std::nullopt;
         if (model->text().empty())
-            return StatusPage::Content{StatusPage::Drawing::nothingFound,
-                                       localized("Search all documents"),
-                                       localized("Type a part of the name."),
-                                       {}};
+            return StatusPage::Content{
+                StatusPage::Drawing::nothingFound,
+                localized("Type a part of a name"),
+                localized("Documents and folders of the whole store are found, also those "
+                          "that are not downloaded."),
+                {}};
         return StatusPage::Content{
             StatusPage::Drawing::nothingFound,
             localized("Nothing found"),

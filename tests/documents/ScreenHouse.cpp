@@ -4,6 +4,7 @@
 #include <QEventLoop>
 #include <QTimer>
 
+#include <algorithm>
 #include <filesystem>
 #include <fstream>
 
@@ -38,8 +39,8 @@ ScreenHouse::~ScreenHouse() {
 void ScreenHouse::openWindow(platform::Size size) {
     if (!application)
         application = std::make_unique<platform::Application>(argumentCount, arguments);
-    application->setIdiom(size.width < 600 ? platform::DeviceIdiom::phone
-                                           : platform::DeviceIdiom::tablet);
+    application->setIdiom(std::min(size.width, size.height) < 600 ? platform::DeviceIdiom::phone
+                                                                  : platform::DeviceIdiom::tablet);
     window = std::make_unique<platform::Window>(platform::Rect{0, 0, size.width, size.height});
     window->setStatusStrip({"anna@example.org", "Wi-Fi", false});
     navigation = std::make_shared<platform::NavigationController>();

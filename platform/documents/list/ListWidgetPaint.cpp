@@ -25,6 +25,8 @@ void ListWidget::paintEvent(QPaintEvent* event) {
         measure();
     QPainter painter(this);
     painter.setRenderHint(QPainter::Antialiasing);
+    // The parts of a second line stand in the program's order, whatever they are written in.
+    painter.setLayoutDirection(state_.style.rightToLeft ? Qt::RightToLeft : Qt::LeftToRight);
     if (state_.model.count() == 0 && placeholders_)
         paintPlaceholders(painter);
     else
