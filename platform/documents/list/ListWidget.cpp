@@ -6,9 +6,8 @@
 #include "platform/ui/Theme.h"
 #include "platform/ui/qt/Bridge.h"
 
-#include <QContextMenuEvent>
+#include <QEvent>
 #include <QScrollBar>
-#include <QWheelEvent>
 
 #include <algorithm>
 #include <cmath>
@@ -16,18 +15,11 @@
 namespace platform {
 namespace {
 
-/// One notch of a wheel, in rows.
-constexpr double rowsPerNotch = 1.5;
-constexpr double notch = 120;
 constexpr int scrollBarWidth = 12;
 /// A scroll bar counts in whole numbers of 31 bits.
 constexpr double longestScrollBar = 1e9;
 /// Beyond what the list is wide, so that a row half drawn in has its details already.
 constexpr std::size_t rowsAhead = 4;
-
-Point fromQt(QPointF point) {
-    return {point.x(), point.y()};
-}
 
 } // namespace
 
@@ -172,120 +164,6 @@ void ListWidget::rowContentDidChange(const std::vector<RowId>& rows) {
 void ListWidget::modelStateDidChange() {
     if (modelStateChanged_)
         modelStateChanged_();
-    update();
-}
-
-// Events
-
-bool ListWidget::event(QEvent* event) {
-    switch (event->type()) {
-    case QEvent::TouchBegin:
-    case QEvent::TouchUpdate:
-    case QEvent::TouchEnd:
-    case QEvent::TouchCancel:
-        return touch(static_cast<QTouchEvent&>(*event));
-    default:
-        return QWidget::event(event);
-    }
-}
-
-bool ListWidget::touch(QTouchEvent& event) {
-    event.accept();
-    if (event.type() == QEvent::TouchCancel || event.points().isEmpty()) {
-        pointer_.cancel();
-        return true;
-    }
-    const Point point = fromQt(event.points().constFirst().position());
-    if (event.type() == QEvent::TouchBegin) {
-        setFocus(Qt::MouseFocusReason);
-        pointer_.press(point, true, event.modifiers());
-    } else if (event.type() == QEvent::TouchUpdate) {
-        pointer_.move(point);
-    } else {
-        pointer_.release(point);
-    }
-    return true;
-}
-
-void ListWidget::mousePressEvent(QMouseEvent* event) {
-    if (event->button() == Qt::LeftButton)
-        pointer_.press(fromQt(event->position()), false, event->modifiers());
-    else
-        QWidget::mousePressEvent(event);
-}
-
-void ListWidget::mouseMoveEvent(QMouseEvent* event) {
-    if (event->buttons().testFlag(Qt::LeftButton))
-        pointer_.move(fromQt(event->position()));
-    else
-        pointer_.hover(fromQt(event->position()));
-}
-
-void ListWidget::mouseReleaseEvent(QMouseEvent* event) {
-    if (event->button() == Qt::LeftButton)
-        pointer_.release(fromQt(event->position()));
-    else
-        QWidget::mouseReleaseEvent(event);
-}
-
-void ListWidget::leaveEvent(QEvent* event) {
-    pointer_.hover(std::nullopt);
-    QWidget::leaveEvent(event);
-}
-
-void ListWidget::wheelEvent(QWheelEvent* event) {
-    const double pixels = event->pixelDelta().y();
-    const double notches = event->angleDelta().y() / notch;
-    if (pixels != 0)
-        state_.scrolling.jumpTo(state_.scrolling.offset() - pixels);
-    else if (notches != 0)
-        state_.scrolling.glideBy(-notches * rowsPerNotch * state_.style.rowHeight);
-    if (state_.swipe.row())
-        state_.swipe.close();
-    pointer_.hover(fromQt(event->position()));
-    event->accept();
-}
-
-void ListWidget::keyPressEvent(QKeyEvent* event) {
-    const std::optional<RowId> former = state_.current;
-    if (!keys_.press(*event)) {
-        QWidget::keyPressEvent(event);
-        return;
-    }
-    if (state_.current != former)
-        announceCurrentRow(*this);
-    update();
-}
-
-void ListWidget::contextMenuEvent(QContextMenuEvent* event) {
-    const bool byKey = event->reason() == QContextMenuEvent::Keyboard;
-    const std::optional<std::size_t> index =
-        byKey ? state_.indexOf(state_.current) : state_.rowAt(event->pos().y());
-    event->accept();
-    if (!index)
-        return;
-    state_.setCurrent(*index);
-    const QPoint at = event->pos();
-    state_.askForActions(*index,
-                         byKey ? state_.moreRect(*index) : Rect{at.x() - 1.0, at.y() - 1.0, 2, 2});
-}
-
-void ListWidget::focusInEvent(QFocusEvent* event) {
-    state_.hasFocus = true;
-    if (!state_.current && state_.model.count() > 0)
-        if (const auto first = state_.allowedAround(state_.firstWholeInView()))
-            state_.current = state_.model.idAt(*first);
-    const auto index = state_.indexOf(state_.current);
-    const bool byKey =
-        event->reason() == Qt::TabFocusReason || event->reason() == Qt::BacktabFocusReason;
-    if (byKey && index && (*index < state_.firstInView() || *index >= state_.endInView()))
-        state_.reveal(*index, false);
-    announceCurrentRow(*this);
-    update();
-}
-
-void ListWidget::focusOutEvent(QFocusEvent* /*event*/) {
-    state_.hasFocus = false;
     update();
 }
 

@@ -72,7 +72,7 @@ public:
         auto content = std::make_unique<PictureContent>();
         content_ = content.get();
         auto widget = std::make_unique<ZoomWidget>(
-            std::move(content), ZoomWidget::Settings{ZoomWidget::Fit::whole, 0, true, 8});
+            std::move(content), ZoomWidget::Settings{{ZoomPlace::Fit::whole, 0, 8}, true});
         widget_ = widget.get();
         view_ = std::make_shared<WidgetView>(std::move(widget));
     }

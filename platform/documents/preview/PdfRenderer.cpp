@@ -176,7 +176,8 @@ public:
             std::make_unique<PagesContent>([this](auto pages) { render(std::move(pages)); });
         content_ = content.get();
         auto widget = std::make_unique<ZoomWidget>(
-            std::move(content), ZoomWidget::Settings{ZoomWidget::Fit::width, pageMargin, false, 6});
+            std::move(content),
+            ZoomWidget::Settings{{ZoomPlace::Fit::width, pageMargin, 6}, false});
         widget_ = widget.get();
         widget_->setMovedHandler([this] { tellPlace(); });
         view_ = std::make_shared<WidgetView>(std::move(widget));

@@ -53,35 +53,40 @@ private:
 
     void open(std::uint64_t top) {
         worker_.cancel();
-        worker_.run([this, file = file_, slot = slot_, top](PreviewToken& token) -> Job {
-            slot->file.reset();
-            const Failure failure = readDocument(file, token, [&](const std::string& path) {
-                Result<TextFile> text = TextFile::open(file, path);
-                if (!text)
-                    return Failure(text.error());
-                slot->file.emplace(std::move(*text));
-                return Failure();
+        worker_.run(
+            [this, file = file_, slot = slot_, widget = widget_, top](PreviewToken& token) -> Job {
+                slot->file.reset();
+                const Failure failure = readDocument(file, token, [&](const std::string& path) {
+                    Result<TextFile> text = TextFile::open(file, path);
+                    if (!text)
+                        return Failure(text.error());
+                    slot->file.emplace(std::move(*text));
+                    return Failure();
+                });
+                if (failure || !slot->file)
+                    return [this, failure] {
+                        if (failure)
+                            reports_.failed(*failure);
+                    };
+                return [this, lines = linesAround(*slot->file, top, widget)] {
+                    lines();
+                    reports_.shown();
+                };
             });
-            return [this, failure, top] {
-                if (failure) {
-                    reports_.failed(*failure);
-                    return;
-                }
-                reports_.shown();
-                show(top);
-            };
-        });
     }
 
     void show(std::uint64_t place) {
-        worker_.run([this, slot = slot_, place](PreviewToken&) -> Job {
-            if (!slot->file)
-                return {};
-            const auto lines = std::make_shared<Lines>(slot->file->linesAround(place));
-            return [this, lines, place, start = slot->file->start(), size = slot->file->size()] {
-                widget_->setLines(std::move(*lines), start, size, place);
-            };
+        worker_.run([slot = slot_, widget = widget_, place](PreviewToken&) -> Job {
+            return slot->file ? linesAround(*slot->file, place, widget) : Job();
         });
+    }
+
+    /// Reads them; the answer, on the main thread, puts them into the widget.
+    static Job linesAround(const TextFile& file, std::uint64_t place, TextWidget* widget) {
+        const auto lines = std::make_shared<Lines>(file.linesAround(place));
+        return [widget, lines, place, start = file.start(), size = file.size()] {
+            widget->setLines(std::move(*lines), start, size, place);
+        };
     }
 
     void read(std::function<Lines(const TextFile&)> what, std::function<void(Lines)> take) {

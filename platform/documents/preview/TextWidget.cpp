@@ -1,6 +1,5 @@
 #include "platform/documents/preview/TextWidget.h"
 
-#include "platform/documents/list/RowStyle.h"
 #include "platform/ui/Direction.h"
 #include "platform/ui/Theme.h"
 #include "platform/ui/qt/Bridge.h"
@@ -24,14 +23,11 @@ constexpr double keyStep = 48;
 constexpr double edge = 12;
 /// The end of the text can be drawn above the buttons that float over it.
 constexpr double edgeBelow = 112;
-constexpr double lineHeightFactor = 1.4;
-constexpr int tabColumns = 4;
 constexpr int scrollBarWidth = 12;
 constexpr int scrollBarSteps = 1'000'000;
-/// Lines kept on either side of the view; more are dropped and read again when they are wanted.
-constexpr std::size_t mostLinesAside = 4000;
 /// More is asked for when fewer are left.
 constexpr std::size_t fewLines = 200;
+constexpr double narrowestLine = 40;
 constexpr double smallestZoom = 0.6;
 constexpr double largestZoom = 4;
 
@@ -47,7 +43,6 @@ QFont textFont(double zoom) {
 
 TextWidget::TextWidget(Wishes wishes)
     : wishes_(std::move(wishes)),
-      font_(textFont(1)),
       scrollBar_(new QScrollBar(Qt::Vertical, this)),
       flinger_([this](Point stretch) { return scrollBy(-stretch.y); }) {
     setFocusPolicy(Qt::StrongFocus);
@@ -64,18 +59,10 @@ TextWidget::~TextWidget() = default;
 
 void TextWidget::setLines(std::vector<TextLine> lines, std::uint64_t start, std::uint64_t size,
                           std::uint64_t top) {
-    lines_.clear();
     start_ = start;
     size_ = size;
-    top_ = 0;
-    above_ = 0;
     asksBefore_ = asksAfter_ = false;
-    for (TextLine& line : lines) {
-        if (line.offset <= top)
-            top_ = lines_.size();
-        lines_.push_back({std::move(line), nullptr, 0});
-    }
-    keepEndInView();
+    column_.set(std::move(lines), top);
     updateScrollBar();
     askForMore();
     update();
@@ -83,173 +70,93 @@ void TextWidget::setLines(std::vector<TextLine> lines, std::uint64_t start, std:
 
 void TextWidget::appendLines(std::vector<TextLine> lines) {
     asksAfter_ = false;
-    for (TextLine& line : lines)
-        if (lines_.empty() || line.offset == lines_.back().line.end)
-            lines_.push_back({std::move(line), nullptr, 0});
-    while (top_ > mostLinesAside) {
-        lines_.pop_front();
-        --top_;
-    }
-    keepEndInView();
+    column_.append(std::move(lines));
     updateScrollBar();
     update();
 }
 
 void TextWidget::prependLines(std::vector<TextLine> lines) {
     asksBefore_ = false;
-    for (auto line = lines.rbegin(); line != lines.rend(); ++line)
-        if (lines_.empty() || line->end == lines_.front().line.offset) {
-            lines_.push_front({std::move(*line), nullptr, 0});
-            ++top_;
-        }
-    while (lines_.size() > top_ + mostLinesAside)
-        lines_.pop_back();
+    column_.prepend(std::move(lines));
     updateScrollBar();
     update();
 }
 
 std::uint64_t TextWidget::topOffset() const {
-    return top_ < lines_.size() ? lines_[top_].line.offset : start_;
+    return column_.isEmpty() ? start_ : column_.topOffset();
 }
 
 void TextWidget::zoomBy(double factor) {
     zoom_ = std::clamp(zoom_ * factor, smallestZoom, largestZoom);
-    font_ = textFont(zoom_);
-    forgetLayouts();
-    keepEndInView();
+    shape();
     update();
 }
 
 double TextWidget::lineWidth() const {
-    return std::max(40.0, width() - 2 * RowStyle::current().margin);
+    return std::max(narrowestLine, width() - 2 * pageMargin());
 }
 
-double TextWidget::viewHeight() const {
-    return std::max(1.0, height() - edge - edgeBelow);
-}
-
-void TextWidget::layOut(Laid& laid) const {
-    laid.layout = std::make_unique<QTextLayout>(laid.line.text, font_);
-    QTextOption option;
-    option.setWrapMode(QTextOption::WrapAtWordBoundaryOrAnywhere);
-    const QFontMetricsF metrics(font_);
-    option.setTabStopDistance(tabColumns * metrics.horizontalAdvance(QLatin1Char(' ')));
-    laid.layout->setTextOption(option);
-    const double step = std::round(font_.pixelSize() * lineHeightFactor);
-    double y = 0;
-    laid.layout->beginLayout();
-    for (QTextLine line = laid.layout->createLine(); line.isValid();
-         line = laid.layout->createLine()) {
-        line.setLineWidth(lineWidth());
-        line.setPosition({0, y + std::floor((step - line.height()) / 2)});
-        y += step;
-    }
-    laid.layout->endLayout();
-    laid.height = std::max(step, y);
-}
-
-double TextWidget::heightOf(std::size_t index) {
-    Laid& laid = lines_[index];
-    if (!laid.layout)
-        layOut(laid);
-    return laid.height;
-}
-
-void TextWidget::forgetLayouts() {
-    for (Laid& laid : lines_)
-        laid.layout.reset();
-    above_ = 0;
+void TextWidget::shape() {
+    column_.setShape(textFont(zoom_), lineWidth(), std::max(1.0, height() - edge - edgeBelow));
+    updateScrollBar();
 }
 
 bool TextWidget::scrollBy(double distance) {
-    if (lines_.empty())
-        return false;
-    above_ += distance;
-    while (above_ < 0 && top_ > 0)
-        above_ += heightOf(--top_);
-    while (top_ + 1 < lines_.size() && above_ >= heightOf(top_))
-        above_ -= heightOf(top_++);
-    const bool free = above_ >= 0;
-    above_ = std::max(0.0, above_);
-    const std::size_t top = top_;
-    const double above = above_;
-    keepEndInView();
+    const bool free = column_.scrollBy(distance);
     askForMore();
     updateScrollBar();
     update();
-    return free && top == top_ && above == above_;
-}
-
-/// The last line of the text does not go above the lower edge.
-void TextWidget::keepEndInView() {
-    double free = viewHeight() + above_;
-    for (std::size_t i = top_; i < lines_.size() && free > 0; ++i)
-        free -= heightOf(i);
-    if (free <= 0)
-        return;
-    above_ -= free;
-    while (above_ < 0 && top_ > 0)
-        above_ += heightOf(--top_);
-    above_ = std::max(0.0, above_);
+    return free;
 }
 
 void TextWidget::askForMore() {
-    if (lines_.empty())
+    if (column_.isEmpty())
         return;
-    if (!asksBefore_ && top_ < fewLines && lines_.front().line.offset > start_) {
+    if (!asksBefore_ && column_.linesBefore() < fewLines && column_.firstOffset() > start_) {
         asksBefore_ = true;
-        wishes_.linesBefore(lines_.front().line.offset);
+        wishes_.linesBefore(column_.firstOffset());
     }
-    if (!asksAfter_ && lines_.size() < top_ + fewLines && lines_.back().line.end < size_) {
+    if (!asksAfter_ && column_.linesFromTop() < fewLines && column_.endOffset() < size_) {
         asksAfter_ = true;
-        wishes_.linesFrom(lines_.back().line.end);
+        wishes_.linesFrom(column_.endOffset());
     }
 }
 
 void TextWidget::updateScrollBar() {
-    // By bytes: the height of lines that were never read is not known.
-    std::uint64_t end = topOffset();
-    double room = viewHeight() + above_;
-    for (std::size_t i = top_; i < lines_.size() && room > 0; ++i) {
-        room -= heightOf(i);
-        end = lines_[i].line.end;
+    if (column_.isEmpty()) {
+        scrollBar_->hide();
+        return;
     }
+    // By bytes: the height of lines that were never read is not known.
+    const std::uint64_t top = column_.topOffset();
+    const std::uint64_t end = column_.bottomOffset();
     const double all = static_cast<double>(std::max<std::uint64_t>(1, size_ - start_));
-    const bool whole = topOffset() <= start_ && end >= size_;
-    scrollBar_->setVisible(!whole);
-    const double page = static_cast<double>(end - topOffset()) / all;
+    scrollBar_->setVisible(top > start_ || end < size_);
+    const double page = static_cast<double>(end - top) / all;
     const QSignalBlocker quiet(scrollBar_);
     scrollBar_->setRange(0, static_cast<int>(scrollBarSteps * (1 - std::min(page, 0.99))));
     scrollBar_->setPageStep(std::max(1, static_cast<int>(scrollBarSteps * page)));
     scrollBar_->setValue(
-        static_cast<int>(static_cast<double>(topOffset() - start_) / all * scrollBarSteps));
+        static_cast<int>(static_cast<double>(top - start_) / all * scrollBarSteps));
 }
 
 void TextWidget::jumpTo(std::uint64_t offset) {
-    if (!lines_.empty() && offset >= lines_.front().line.offset &&
-        offset < lines_.back().line.end) {
-        const auto behind = std::upper_bound(
-            lines_.begin(), lines_.end(), offset,
-            [](std::uint64_t place, const Laid& laid) { return place < laid.line.offset; });
-        top_ = static_cast<std::size_t>(behind - lines_.begin()) - 1;
-        above_ = 0;
-        scrollBy(0);
-    } else {
+    if (!column_.holds(offset)) {
         wishes_.linesAround(offset);
+        return;
     }
+    column_.goTo(offset);
+    askForMore();
+    updateScrollBar();
+    update();
 }
 
 void TextWidget::paintEvent(QPaintEvent* /*event*/) {
     QPainter painter(this);
     painter.fillRect(rect(), toQt(Theme::page));
     painter.setPen(toQt(Theme::text));
-    const double x = mirrored({RowStyle::current().margin, 0, lineWidth(), 0}, width()).x;
-    double y = edge - above_;
-    for (std::size_t i = top_; i < lines_.size() && y < height(); ++i) {
-        const double line = heightOf(i);
-        lines_[i].layout->draw(&painter, {x, y});
-        y += line;
-    }
+    const double x = mirrored({pageMargin(), 0, lineWidth(), 0}, width()).x;
+    column_.paint(painter, {x, edge}, height());
 }
 
 void TextWidget::resizeEvent(QResizeEvent* event) {
@@ -257,9 +164,7 @@ void TextWidget::resizeEvent(QResizeEvent* event) {
     const bool rightToLeft = layoutDirection() == Qt::RightToLeft;
     scrollBar_->setGeometry(rightToLeft ? 0 : width() - scrollBarWidth, 0, scrollBarWidth,
                             height());
-    forgetLayouts();
-    keepEndInView();
-    updateScrollBar();
+    shape();
 }
 
 bool TextWidget::event(QEvent* event) {

@@ -1,23 +1,18 @@
 #pragma once
 
 #include "platform/documents/preview/Flinger.h"
-#include "platform/documents/preview/TextFile.h"
+#include "platform/documents/preview/TextColumn.h"
 
-#include <QFont>
-#include <QTextLayout>
 #include <QWidget>
 
-#include <deque>
 #include <functional>
-#include <memory>
 
 class QScrollBar;
 class QTouchEvent;
 
 namespace platform {
 
-/// Shows the lines of a text around one place, wrapped to its width, and asks for more before they
-/// run out.
+/// Shows the lines of a text around one place and asks for more before they run out.
 class TextWidget : public QWidget {
 public:
     /// What it wants read; answered by the three functions below, or not at all.
@@ -49,21 +44,10 @@ protected:
     void mouseReleaseEvent(QMouseEvent* event) override;
 
 private:
-    struct Laid {
-        TextLine line;
-        /// None until it comes near the view.
-        std::unique_ptr<QTextLayout> layout;
-        double height = 0;
-    };
-
-    double heightOf(std::size_t index);
-    void layOut(Laid& laid) const;
-    void forgetLayouts();
+    void shape();
     double lineWidth() const;
-    double viewHeight() const;
     /// Answers whether the whole way was free.
     bool scrollBy(double distance);
-    void keepEndInView();
     void askForMore();
     void updateScrollBar();
     void jumpTo(std::uint64_t offset);
@@ -71,15 +55,11 @@ private:
     void drag(QPointF point, bool first, bool last);
 
     Wishes wishes_;
-    std::deque<Laid> lines_;
+    TextColumn column_;
     std::uint64_t start_ = 0;
     std::uint64_t size_ = 0;
-    std::size_t top_ = 0;
-    /// How much of the top line is above the view.
-    double above_ = 0;
     bool asksBefore_ = false;
     bool asksAfter_ = false;
-    QFont font_;
     double zoom_ = 1;
     QScrollBar* scrollBar_;
     QPointF dragged_;

@@ -40,7 +40,10 @@ QPointF middleOf(const QTouchEvent& event) {
 } // namespace
 
 ZoomWidget::ZoomWidget(std::unique_ptr<ZoomContent> content, const Settings& settings)
-    : content_(std::move(content)), settings_(settings), flinger_([this](Point stretch) {
+    : content_(std::move(content)),
+      wheelZooms_(settings.wheelZooms),
+      place_(settings.limits),
+      flinger_([this](Point stretch) {
           return moveBy({stretch.x, stretch.y});
       }) {
     setFocusPolicy(Qt::StrongFocus);
@@ -50,79 +53,33 @@ ZoomWidget::ZoomWidget(std::unique_ptr<ZoomContent> content, const Settings& set
 
 ZoomWidget::~ZoomWidget() = default;
 
-QRectF ZoomWidget::visibleRect() const {
-    const QRectF seen(toContent({0, 0}), QSizeF(width(), height()) / zoom_);
-    return seen.intersected(QRectF(QPointF(), content_->contentSize()));
-}
-
-double ZoomWidget::fittingZoom() const {
-    const QSizeF size = content_->contentSize();
-    const double room = std::max(1.0, width() - 2 * settings_.margin);
-    if (size.isEmpty())
-        return 1;
-    if (settings_.fit == Fit::width)
-        return room / size.width();
-    const double high = std::max(1.0, height() - 2 * settings_.margin);
-    return std::min({1.0, room / size.width(), high / size.height()});
-}
-
-double ZoomWidget::clampedZoom(double zoom) const {
-    const double fitting = fittingZoom();
-    return std::clamp(zoom, std::min(fitting, 1.0), std::max(settings_.largestZoom, fitting));
-}
-
-QPointF ZoomWidget::toContent(QPointF point) const {
-    return (point - origin_) / zoom_;
-}
-
 void ZoomWidget::zoomBy(double factor) {
-    zoomAround(zoom_ * factor, rect().center());
+    zoomAround(zoom() * factor, rect().center());
 }
 
 void ZoomWidget::zoomAround(double zoom, QPointF point) {
-    const QPointF content = toContent(point);
-    zoom_ = clampedZoom(zoom);
-    fitted_ = std::abs(zoom_ - fittingZoom()) < 1e-9;
-    origin_ = point - content * zoom_;
-    place();
+    place_.zoomTo(zoom, point);
     changed();
 }
 
 void ZoomWidget::toggleZoom(QPointF point) {
-    const double fitting = fittingZoom();
-    zoomAround(zoom_ > fitting * 1.05 ? fitting : fitting * doubleTapZoom, point);
+    const double fitting = place_.fittingZoom();
+    zoomAround(zoom() > fitting * 1.05 ? fitting : fitting * doubleTapZoom, point);
 }
 
 void ZoomWidget::fitAgain() {
-    zoomAround(fittingZoom(), rect().center());
+    zoomAround(place_.fittingZoom(), rect().center());
 }
 
 void ZoomWidget::contentChanged() {
-    if (fitted_)
-        zoom_ = fittingZoom();
-    place();
+    place_.setSizes(size(), content_->contentSize());
     changed();
 }
 
 bool ZoomWidget::moveBy(QPointF distance) {
-    const QPointF wanted = origin_ + distance;
-    origin_ = wanted;
-    place();
+    const bool free = place_.moveBy(distance);
     changed();
-    return (origin_ - wanted).manhattanLength() < std::max(1.0, distance.manhattanLength());
-}
-
-/// What is smaller than the view stands in its middle; what is larger leaves no gap at an edge.
-void ZoomWidget::place() {
-    const QSizeF size = content_->contentSize() * zoom_;
-    const auto along = [&](double origin, double length, double room, bool centred) {
-        const double free = room - length;
-        if (free >= 2 * settings_.margin)
-            return centred ? free / 2 : settings_.margin;
-        return std::clamp(origin, free - settings_.margin, settings_.margin);
-    };
-    origin_ = {along(origin_.x(), size.width(), width(), true),
-               along(origin_.y(), size.height(), height(), settings_.fit == Fit::whole)};
+    return free;
 }
 
 void ZoomWidget::changed() {
@@ -134,9 +91,9 @@ void ZoomWidget::changed() {
 void ZoomWidget::paintEvent(QPaintEvent* /*event*/) {
     QPainter painter(this);
     painter.setRenderHint(QPainter::SmoothPixmapTransform);
-    painter.translate(origin_);
-    painter.scale(zoom_, zoom_);
-    content_->paintContent(painter, visibleRect(), zoom_);
+    painter.translate(place_.origin());
+    painter.scale(zoom(), zoom());
+    content_->paintContent(painter, visibleRect(), zoom());
 }
 
 void ZoomWidget::resizeEvent(QResizeEvent* event) {
@@ -155,7 +112,7 @@ bool ZoomWidget::event(QEvent* event) {
         const auto& gesture = static_cast<QNativeGestureEvent&>(*event);
         if (gesture.gestureType() != Qt::ZoomNativeGesture)
             return QWidget::event(event);
-        zoomAround(zoom_ * (1 + gesture.value()), gesture.position());
+        zoomAround(zoom() * (1 + gesture.value()), gesture.position());
         return true;
     }
     default:
@@ -205,13 +162,10 @@ void ZoomWidget::pinch(const QTouchEvent& event) {
     tap_.reset();
     const QPointF middle = middleOf(event);
     if (!pinch_) {
-        pinch_ = Pinch{distanceOf(event), zoom_, toContent(middle)};
+        pinch_ = Pinch{distanceOf(event), zoom(), place_.toContent(middle)};
         return;
     }
-    zoom_ = clampedZoom(pinch_->zoom * distanceOf(event) / pinch_->distance);
-    fitted_ = false;
-    origin_ = middle - pinch_->content * zoom_;
-    place();
+    place_.bring(pinch_->content, pinch_->zoom * distanceOf(event) / pinch_->distance, middle);
     changed();
 }
 
@@ -257,8 +211,8 @@ void ZoomWidget::wheelEvent(QWheelEvent* event) {
     event->accept();
     flinger_.stop();
     const double notches = event->angleDelta().y() / notch;
-    if (settings_.wheelZooms || event->modifiers().testFlag(Qt::ControlModifier)) {
-        zoomAround(zoom_ * std::pow(zoomPerNotch, notches), event->position());
+    if (wheelZooms_ || event->modifiers().testFlag(Qt::ControlModifier)) {
+        zoomAround(zoom() * std::pow(zoomPerNotch, notches), event->position());
         return;
     }
     const QPointF pixels = event->pixelDelta();

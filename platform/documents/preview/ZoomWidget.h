@@ -1,8 +1,8 @@
 #pragma once
 
 #include "platform/documents/preview/Flinger.h"
+#include "platform/documents/preview/ZoomPlace.h"
 
-#include <QRectF>
 #include <QWidget>
 
 #include <functional>
@@ -26,29 +26,19 @@ public:
 /// double tap. Keeps the content fitted until somebody zooms.
 class ZoomWidget : public QWidget {
 public:
-    enum class Fit {
-        /// All of it is in view, and nothing is drawn larger than it is.
-        whole,
-        /// As wide as the view.
-        width
-    };
     struct Settings {
-        Fit fit = Fit::whole;
-        /// Around the content, in points of the view.
-        double margin = 0;
+        ZoomPlace::Limits limits;
         /// A wheel makes larger and smaller; else it scrolls, and Ctrl makes it zoom.
         bool wheelZooms = false;
-        /// Pixels of the content that one zooms in to at most, for each point of the view.
-        double largestZoom = 8;
     };
 
     ZoomWidget(std::unique_ptr<ZoomContent> content, const Settings& settings);
     ~ZoomWidget() override;
 
     ZoomContent& content() const { return *content_; }
-    double zoom() const { return zoom_; }
+    double zoom() const { return place_.zoom(); }
     /// The part of the content that is in view.
-    QRectF visibleRect() const;
+    QRectF visibleRect() const { return place_.visibleRect(); }
     void zoomBy(double factor);
     /// The content has another size now; the same share of it stays in view.
     void contentChanged();
@@ -73,26 +63,18 @@ private:
         QPointF content;
     };
 
-    double fittingZoom() const;
-    double clampedZoom(double zoom) const;
-    QPointF toContent(QPointF point) const;
     void zoomAround(double zoom, QPointF point);
     void toggleZoom(QPointF point);
     void fitAgain();
-    /// Keeps the content in the view; answers whether all of the way was free.
     bool moveBy(QPointF distance);
-    void place();
     bool touch(QTouchEvent& event);
     void pinch(const QTouchEvent& event);
     bool tappedTwice(QPointF point);
     void changed();
 
     std::unique_ptr<ZoomContent> content_;
-    const Settings settings_;
-    double zoom_ = 1;
-    /// Of the content, in the view.
-    QPointF origin_;
-    bool fitted_ = true;
+    const bool wheelZooms_;
+    ZoomPlace place_;
     std::optional<QPointF> dragged_;
     std::optional<Pinch> pinch_;
     std::optional<QPointF> tap_;
