@@ -23,9 +23,9 @@ std::optional<std::string> nameProblem(const std::string& name, const Arrivals::
     return std::nullopt;
 }
 
-BaseRow baseOf(const Place& place, const RemoteEntry& entry, const FileIdentity& identity,
+BaseRow baseOf(const Place& place, const RemoteEntry& entry, const FileAttributes& here,
                Bytes hash = {}) {
-    return {place, entry.etag, entry.size, std::move(hash), identity};
+    return baseRowOf(place, entry.etag, entry.size, std::move(hash), here);
 }
 
 } // namespace
@@ -66,7 +66,7 @@ Result<Arrivals::Outcome> Arrivals::takeFolder(const Spot& spot, const RemoteEnt
     const Place place{spot.folder, entry.name};
     outcome.madeFolder = true;
     outcome.local = localRowOf(place, *attributes, false);
-    outcome.base = baseOf(place, entry, attributes->identity);
+    outcome.base = baseOf(place, entry, *attributes);
     return outcome;
 }
 
@@ -90,7 +90,7 @@ Result<Arrivals::Outcome> Arrivals::takeExisting(const Spot& spot, const RemoteE
     // Two folders of one name are one folder. Two files have nothing in common until their
     // contents were compared: no base.
     if (folder)
-        outcome.base = baseOf(place, entry, attributes->identity);
+        outcome.base = baseOf(place, entry, *attributes);
     return outcome;
 }
 
@@ -133,7 +133,7 @@ Result<std::optional<Arrivals::Outcome>> Arrivals::promiseAs(const SidecarName& 
     const Place place{spot.folder, entry.name};
     Outcome promised = outcome;
     promised.local = localRowOf(place, *made, true);
-    promised.base = baseOf(place, entry, made->identity);
+    promised.base = baseOf(place, entry, *made);
     return std::optional(std::move(promised));
 }
 
@@ -158,7 +158,7 @@ Result<std::optional<Arrivals::Outcome>> Arrivals::takeOver(const Spot& spot,
         return attributes.error();
     const Place place{spot.folder, entry.name};
     taken.local = localRowOf(place, *attributes, true);
-    taken.base = baseOf(place, entry, attributes->identity);
+    taken.base = baseOf(place, entry, *attributes);
     return std::optional(std::move(taken));
 }
 
@@ -189,7 +189,7 @@ Result<Arrivals::Outcome> Arrivals::fetch(const Spot& spot, const RemoteEntry& e
         return attributes.error();
     const Place place{spot.folder, entry.name};
     outcome.local = localRowOf(place, *attributes, false);
-    outcome.base = baseOf(place, *version, attributes->identity, ContentHash::of(content));
+    outcome.base = baseOf(place, *version, *attributes, ContentHash::of(content));
     return outcome;
 }
 

@@ -99,8 +99,9 @@ Failure ContentPlacing::record(ItemId item, OpRow op, const FileAttributes& attr
             context_.database.putRemote(item, remote);
         }
         context_.database.putLocal(item, localRowOf(*state->item.place, attributes, false));
-        context_.database.putBase(item, {state->item.place.value(), op.expectEtag, attributes.size,
-                                         op.hash, attributes.identity});
+        context_.database.putBase(item,
+                                  baseRowOf(state->base ? state->base->place : remote.place,
+                                            op.expectEtag, attributes.size, op.hash, attributes));
         context_.database.putOperation(op);
         return std::nullopt;
     });

@@ -148,8 +148,8 @@ Failure Eviction::record(const Subject& subject, OpRow& op, const FoundSidecar& 
     remote.etag = subject.version.etag;
     remote.size = subject.version.size;
     remote.modified = subject.version.modified;
-    BaseRow base{
-        remote.place, subject.version.etag, subject.version.size, {}, attributes->identity};
+    BaseRow base =
+        baseRowOf(remote.place, subject.version.etag, subject.version.size, {}, *attributes);
     if (subject.state.base)
         base.place = subject.state.base->place;
     return context_.database.transaction([&]() -> Failure {
@@ -201,11 +201,8 @@ void Eviction::resume(StoreContext& context, const OpRow& op) {
         if (undone && state && state->item.place) {
             context.database.putLocal(op.item, localRowOf(*state->item.place, *file, false));
             if (state->base) {
-                BaseRow base = *state->base;
-                base.etag = op.expectEtag;
-                base.hash = op.hash;
-                base.identity = file->identity;
-                context.database.putBase(op.item, base);
+                context.database.putBase(op.item, baseRowOf(state->base->place, op.expectEtag,
+                                                            file->size, op.hash, *file));
             }
         }
         context.database.removeOperation(op.id);

@@ -73,6 +73,13 @@ Failure StateDatabase::prepareSchema(bool thorough) {
                 return std::nullopt;
             }))
             return failure;
+    } else if (version == 1) {
+        if (Failure failure = transaction([&]() -> Failure {
+                connection.execute(stateMigrationToSecond);
+                setMeta("schema", std::to_string(stateSchemaVersion));
+                return std::nullopt;
+            }))
+            return failure;
     } else if (thorough) {
         Statement check(connection, "PRAGMA quick_check(1)");
         if (check.step() && check.text(0) != "ok")
@@ -210,14 +217,22 @@ void StateDatabase::putBase(ItemId item, const BaseRow& row) {
     if (!row.hash.empty())
         hash = row.hash;
     handles_
-        ->prepared("INSERT INTO base(item, parent, name, etag, size, hash, dev, ino, btime) "
-                   "VALUES(?1, ?2, ?3, ?4, ?5, ?6, ?7, ?8, ?9) ON CONFLICT(item) DO UPDATE SET "
-                   "parent = excluded.parent, name = excluded.name, etag = excluded.etag, size "
-                   "= excluded.size, hash = excluded.hash, dev = excluded.dev, ino = "
-                   "excluded.ino, btime = excluded.btime")
+        ->prepared("INSERT OR REPLACE INTO base(item, parent, name, etag, size, hash, dev, ino,"
+                   " btime, mtime_ns, ctime_ns)"
+                   " VALUES(?1, ?2, ?3, ?4, ?5, ?6, ?7, ?8, ?9, ?10, ?11)")
         .with(item, row.place.parent, Name{row.place.name}, row.etag, row.size, hash,
-              row.identity.device, row.identity.inode, row.identity.birthNanoseconds)
+              row.identity.device, row.identity.inode, row.identity.birthNanoseconds,
+              row.modified.nanoseconds, row.changed.nanoseconds)
         .run();
+}
+
+void StateDatabase::removeBase(ItemId item) {
+    handles_->prepared("DELETE FROM base WHERE item = ?1").with(item).run();
+}
+
+void StateDatabase::moveLocalChildren(ItemId from, ItemId to) {
+    handles_->prepared("UPDATE item SET parent = ?2 WHERE parent = ?1").with(from, to).run();
+    handles_->prepared("UPDATE local SET parent = ?2 WHERE parent = ?1").with(from, to).run();
 }
 
 void StateDatabase::putScan(ItemId folder, Side side, const ScanRow& scan) {

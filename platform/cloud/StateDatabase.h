@@ -32,6 +32,21 @@ public:
     std::optional<std::string> pathOf(ItemId item);
     /// Its path on the remote as last observed.
     std::optional<std::string> remotePathOf(ItemId item);
+    /// Its path on the disk as last observed.
+    std::optional<std::string> localPathOf(ItemId item);
+    /// Everything that is not the same on both sides.
+    std::vector<ItemState> disagreements();
+    std::optional<ItemId> localItemAt(const Place& place);
+    std::optional<ItemId> remoteItemAt(const Place& place);
+    std::optional<ItemId> itemOfRemoteId(std::string_view remoteId);
+    /// Everything that was seen on the disk.
+    std::vector<ItemState> localItems();
+    /// What as many whole listings of its folder in a row have not seen.
+    std::vector<ItemId> missingFromRemote(int listings);
+    /// The item and what is in it on that side.
+    std::vector<ItemId> treeOf(ItemId item, Side side);
+    /// Items that both sides have had.
+    std::int64_t agreedItems();
     /// Items whose folded name contains the folded text, at most `limit`.
     std::vector<ItemId> itemsNamed(std::string_view text, std::size_t limit);
 
@@ -81,6 +96,9 @@ public:
     /// Forgets an item in which nobody's place is, with all that was known of it.
     void removeItem(ItemId item);
     void putBase(ItemId item, const BaseRow& row);
+    void removeBase(ItemId item);
+    /// What lies in the one folder on the disk lies in the other.
+    void moveLocalChildren(ItemId from, ItemId to);
     /// A folder's listing number. A row of the remote whose generation equals it is there; one less
     /// is missing since one whole listing, two less since two. The number moves on only when
     /// something is missing, so that a listing without news writes nothing.

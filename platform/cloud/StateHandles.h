@@ -25,6 +25,8 @@ struct StateQueries::Handles {
 
 /// The tables of a new database.
 extern const char* const stateSchema;
-inline constexpr int stateSchemaVersion = 1;
+inline constexpr int stateSchemaVersion = 2;
+/// Brings the tables of version 1 to version 2.
+extern const char* const stateMigrationToSecond;
 
 } // namespace platform

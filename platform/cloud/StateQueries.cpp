@@ -14,7 +14,7 @@ using sqlite::Statement;
     "SELECT i.id, i.kind, i.parent, i.name,"                                                       \
     " r.parent, r.name, r.etag, r.size, r.mtime, r.created, r.remote_id, r.role, r.tags, r.gen,"   \
     " l.parent, l.name, l.dev, l.ino, l.btime, l.size, l.mtime_ns, l.ctime_ns, l.promise, l.gen,"  \
-    " b.parent, b.name, b.etag, b.size, b.hash, b.dev, b.ino, b.btime"                             \
+    " b.parent, b.name, b.etag, b.size, b.hash, b.dev, b.ino, b.btime, b.mtime_ns, b.ctime_ns"     \
     " FROM item i LEFT JOIN remote r ON r.item = i.id LEFT JOIN local l ON l.item = i.id"          \
     " LEFT JOIN base b ON b.item = i.id "
 
@@ -60,6 +60,8 @@ BaseRow readBase(const Statement& row, int at) {
     base.hash = row.bytes(at + 4);
     base.identity = {static_cast<std::uint64_t>(row.integer(at + 5)),
                      static_cast<std::uint64_t>(row.integer(at + 6)), row.integer(at + 7)};
+    base.modified = {row.integer(at + 8)};
+    base.changed = {row.integer(at + 9)};
     return base;
 }
 
@@ -83,6 +85,14 @@ std::vector<ItemState> readStates(Statement& rows) {
     while (rows.step())
         states.push_back(readState(rows));
     return states;
+}
+
+std::optional<std::int64_t> firstItem(Statement& row) {
+    if (!row.step())
+        return std::nullopt;
+    const std::int64_t number = row.integer(0);
+    row.reset();
+    return number;
 }
 
 /// Deeper than any path that the system takes; a circle of damaged rows ends here.
@@ -224,6 +234,73 @@ std::vector<RefusedRow> StateQueries::refused(ItemId folder, Side side) {
     while (rows.step())
         refused.push_back({rows.text(0), rows.text(1)});
     return refused;
+}
+
+// As isAgreed() has it, for the database to find out.
+std::vector<ItemState> StateQueries::disagreements() {
+    return readStates(
+        handles_
+            ->prepared(STATE_COLUMNS
+                       "WHERE i.id <> 1 AND (r.item IS NULL OR l.item IS NULL OR b.item IS NULL"
+                       " OR l.parent <> b.parent OR l.name <> b.name"
+                       " OR r.parent <> b.parent OR r.name <> b.name"
+                       " OR (i.kind = 0 AND (r.etag <> b.etag OR (l.promise = 0 AND ("
+                       "   b.hash IS NULL OR l.ino <> b.ino OR l.dev <> b.dev OR"
+                       "   l.btime <> b.btime OR l.size <> b.size OR"
+                       "   l.mtime_ns <> b.mtime_ns OR l.ctime_ns <> b.ctime_ns)))))")
+            .with());
+}
+
+std::optional<ItemId> StateQueries::localItemAt(const Place& place) {
+    Statement& row = handles_->prepared("SELECT item FROM local WHERE parent = ?1 AND name = ?2");
+    return firstItem(row.with(place.parent, Name{place.name}));
+}
+
+std::optional<ItemId> StateQueries::remoteItemAt(const Place& place) {
+    Statement& row = handles_->prepared("SELECT item FROM remote WHERE parent = ?1 AND name = ?2");
+    return firstItem(row.with(place.parent, Name{place.name}));
+}
+
+std::optional<ItemId> StateQueries::itemOfRemoteId(std::string_view remoteId) {
+    Statement& row = handles_->prepared("SELECT item FROM remote WHERE remote_id = ?1");
+    return firstItem(row.with(remoteId));
+}
+
+std::vector<ItemState> StateQueries::localItems() {
+    return readStates(handles_->prepared(STATE_COLUMNS "WHERE l.item IS NOT NULL").with());
+}
+
+std::optional<std::string> StateQueries::localPathOf(ItemId item) {
+    return pathUpwards(handles_->prepared("SELECT parent, name FROM local WHERE item = ?1"), item);
+}
+
+std::vector<ItemId> StateQueries::missingFromRemote(int listings) {
+    Statement& rows = handles_->prepared(
+        "SELECT r.item FROM remote r JOIN folder_scan s ON s.item = r.parent AND s.side = 0"
+        " WHERE s.complete = 1 AND r.gen <= s.gen - ?1 ORDER BY r.item");
+    rows.with(listings);
+    std::vector<ItemId> items;
+    while (rows.step())
+        items.push_back(rows.integer(0));
+    return items;
+}
+
+std::vector<ItemId> StateQueries::treeOf(ItemId item, Side side) {
+    Statement& rows = handles_->prepared(
+        side == Side::remote
+            ? "WITH RECURSIVE tree(id) AS (SELECT ?1 UNION SELECT remote.item FROM remote JOIN"
+              " tree ON remote.parent = tree.id) SELECT id FROM tree"
+            : "WITH RECURSIVE tree(id) AS (SELECT ?1 UNION SELECT local.item FROM local JOIN"
+              " tree ON local.parent = tree.id) SELECT id FROM tree");
+    rows.with(item);
+    std::vector<ItemId> items;
+    while (rows.step())
+        items.push_back(rows.integer(0));
+    return items;
+}
+
+std::int64_t StateQueries::agreedItems() {
+    return firstItem(handles_->prepared("SELECT count(*) FROM base").with()).value_or(0);
 }
 
 std::vector<ItemState> StateQueries::sharedItems() {

@@ -68,6 +68,9 @@ struct BaseRow {
     /// SHA-256 of the content; empty for folders and promises.
     Bytes hash;
     FileIdentity identity;
+    /// Of the content on the disk, as it was then.
+    Date modified;
+    Date changed;
 };
 
 struct ItemState {

@@ -54,7 +54,9 @@ CREATE TABLE base(
     hash BLOB,
     dev INTEGER NOT NULL,
     ino INTEGER NOT NULL,
-    btime INTEGER NOT NULL);
+    btime INTEGER NOT NULL,
+    mtime_ns INTEGER NOT NULL DEFAULT 0,
+    ctime_ns INTEGER NOT NULL DEFAULT 0);
 CREATE TABLE op(
     id INTEGER PRIMARY KEY AUTOINCREMENT,
     item INTEGER NOT NULL REFERENCES item(id) ON DELETE CASCADE,
@@ -81,6 +83,13 @@ CREATE TABLE refused(
     reason TEXT NOT NULL,
     PRIMARY KEY(folder, side, name)) WITHOUT ROWID;
 INSERT INTO item(id, parent, name, folded, kind) VALUES(1, NULL, x'', '', 1);
+)sql";
+
+// A record of what was agreed on had no times; the disk was last looked at in that moment.
+const char* const stateMigrationToSecond = R"sql(
+ALTER TABLE base ADD COLUMN mtime_ns INTEGER NOT NULL DEFAULT 0;
+ALTER TABLE base ADD COLUMN ctime_ns INTEGER NOT NULL DEFAULT 0;
+UPDATE base SET mtime_ns = l.mtime_ns, ctime_ns = l.ctime_ns FROM local l WHERE l.item = base.item;
 )sql";
 
 } // namespace platform

@@ -38,4 +38,10 @@ inline LocalRow localRowOf(const Place& place, const FileAttributes& attributes,
             0};
 }
 
+/// What both sides agree on, with the disk as it is now.
+inline BaseRow baseRowOf(const Place& place, const std::string& etag, std::uint64_t size,
+                         Bytes hash, const FileAttributes& here) {
+    return {place, etag, size, std::move(hash), here.identity, here.modified, here.changed};
+}
+
 } // namespace platform
