@@ -3,6 +3,7 @@
 #include "app/VXLogging.h"
 #include "items/FileUtils.h"
 #include "items/UIUtils.h"
+#include "items/UrlExtensions.h"
 #include "platform/Platform.h"
 #include "platform/base/Identity.h"
 #include "platform/base/Text.h"
@@ -183,6 +184,9 @@ void NavController::decodeRestorableStateWithCoder(const platform::RestorationCo
     const auto found = coder.find(restoredUrlKey);
     const Url* url = found == coder.end() ? nullptr : found->second.url();
     if (!url || !FileUtils::exists(*url) || !FileUtils::isFile(*url))
+        return;
+    // A state that was saved under another account stays that account's.
+    if (!dossa_isInShelfroot(*url))
         return;
     const auto mode = coder.find(restoredModeKey);
     const std::int64_t number = mode == coder.end() ? 0 : mode->second.integer().value_or(0);

@@ -99,10 +99,10 @@ TEST_F(Browse, comesBackWithThePreviewItHadAndWithoutAVanishedOne) {
     open("Documents");
     open("Milk.txt");
     ASSERT_TRUE(untilTitled("Milk.txt"));
-    application->setActive(false); // the desk may end it from here on
+    advance(1s); // it may be killed from here on
     relaunch();
     ASSERT_TRUE(untilTitled("Milk.txt"));
-    application->setActive(false);
+    advance(1s);
     remove("Milk.txt");
     relaunch();
     calmDown();

@@ -121,7 +121,7 @@ void documents(Tour& tour) {
         tour.open(name);
         tour.until([&] { return tour.titles().back() == name; });
         tour.calmDown();
-        tour.picture("document-" + name.substr(0, name.find('.')));
+        tour.picture("document-" + name.substr(0, name.find(' ')));
         tour.back();
     }
     tour.open("Coast Panorama.png");

@@ -31,6 +31,8 @@ namespace {
 
 constexpr double smallestTextScale = 0.5;
 constexpr double largestTextScale = 4;
+/// Joins the saves of screens that come quickly one after the other.
+constexpr auto saveDelay = std::chrono::milliseconds(500);
 
 /// Runs before QApplication reads the desktop's look.
 char** withoutDesktopLook(char** argv) {
@@ -185,6 +187,19 @@ Window* Application::Impl::visibleWindow() const {
     const auto found = std::find_if(windows.rbegin(), windows.rend(),
                                     [](const Window* each) { return each->isVisible(); });
     return found == windows.rend() ? nullptr : *found;
+}
+
+void Application::Impl::screensChanged() {
+    if (saveWaits || !delegate || !Runtime::installed())
+        return;
+    saveWaits = true;
+    Runtime::current().mainQueue.after(saveDelay, [] {
+        Impl* const impl = applicationImpl();
+        if (!impl)
+            return;
+        impl->saveWaits = false;
+        impl->saveState();
+    });
 }
 
 void Application::Impl::saveState() {

@@ -30,6 +30,8 @@ struct Application::Impl : public QObject {
     void showKeyboardFocus(bool shown);
     /// The latest of those in view; none when there is none.
     Window* visibleWindow() const;
+    /// Saves the state soon: a program that is killed has no other moment for it.
+    void screensChanged();
     void saveState();
     void restoreState();
 
@@ -41,6 +43,7 @@ struct Application::Impl : public QObject {
     std::vector<Window*> windows;
     bool active = false;
     bool keyboardFocus = false;
+    bool saveWaits = false;
     bool pointerHovers = true;
     bool motionReduced = false;
     double scale = 1;

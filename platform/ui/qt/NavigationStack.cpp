@@ -3,6 +3,7 @@
 #include "platform/ui/Direction.h"
 #include "platform/ui/Theme.h"
 #include "platform/ui/Window.h"
+#include "platform/ui/qt/ApplicationImpl.h"
 #include "platform/ui/qt/Bridge.h"
 #include "platform/ui/qt/ViewImpl.h"
 #include "platform/ui/qt/WindowImpl.h"
@@ -171,6 +172,8 @@ void NavigationController::Stack::didShow(bool animated) {
     const auto listener = delegate.lock();
     if (const Screen screen = top(); screen && listener)
         listener->navigationControllerDidShowViewController(owner, *screen, animated);
+    if (Application::Impl* const application = applicationImpl())
+        application->screensChanged();
 }
 
 } // namespace platform
