@@ -1,5 +1,7 @@
 #include "platform/base/WorkQueue.h"
 
+#include "platform/base/RunAndWait.h"
+
 #include <condition_variable>
 #include <mutex>
 #include <pthread.h>
@@ -113,17 +115,7 @@ void WorkQueue::sync(const Job& job) {
         job();
         return;
     }
-    std::mutex mutex;
-    std::condition_variable done;
-    bool finished = false;
-    async([&] {
-        job();
-        const std::lock_guard lock(mutex);
-        finished = true;
-        done.notify_one();
-    });
-    std::unique_lock lock(mutex);
-    done.wait(lock, [&] { return finished; });
+    runAndWait(job, [this](Job waited) { async(std::move(waited)); });
 }
 
 const std::string& WorkQueue::label() const {

@@ -1,11 +1,11 @@
 #include "platform/system/EventThread.h"
 
 #include "platform/base/Log.h"
+#include "platform/base/RunAndWait.h"
 #include "platform/base/WorkQueue.h"
 #include "platform/files/FileDescriptor.h"
 #include "platform/system/SystemHandles.h"
 
-#include <condition_variable>
 #include <cstring>
 #include <mutex>
 #include <poll.h>
@@ -125,17 +125,7 @@ void EventThread::sync(const Job& job) {
         job();
         return;
     }
-    std::mutex mutex;
-    std::condition_variable done;
-    bool finished = false;
-    async([&] {
-        job();
-        const std::lock_guard lock(mutex);
-        finished = true;
-        done.notify_one();
-    });
-    std::unique_lock lock(mutex);
-    done.wait(lock, [&] { return finished; });
+    runAndWait(job, [this](Job waited) { async(std::move(waited)); });
 }
 
 bool EventThread::isCurrent() const {
