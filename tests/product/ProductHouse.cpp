@@ -45,8 +45,23 @@ ProductHouse::ProductHouse() {
 ProductHouse::~ProductHouse() {
     // The watcher and the log client are the process's own and outlive this platform.
     tavrin::NetworkWatcher::sharedNetworkWatcher()->stop();
-    if (platform)
+    if (platform) {
+        tavrin::VXSetLogLevel(tavrin::vxInfo);
         clearLog();
+    }
+}
+
+bool ProductHouse::untilElsewhere(const std::function<bool()>& condition) {
+    return until([&] {
+        if (condition())
+            return true;
+        platform->mainQueue().async([] {});
+        return false;
+    });
+}
+
+void ProductHouse::listenClosely() {
+    tavrin::VXSetLogLevel(tavrin::vxDebug);
 }
 
 void ProductHouse::givenNetwork(const std::string& state) const {

@@ -2,6 +2,7 @@
 
 #include "tests/documents/StoreHouse.h"
 
+#include <functional>
 #include <string>
 
 namespace test {
@@ -17,6 +18,11 @@ struct ProductHouse : StoreHouse {
     /// when the platform has said so.
     void signInAs(const std::string& name, const std::string& remoteFolder);
     void signOut();
+    /// The same as until for what other queues do without a word to the main one: looks again and
+    /// again.
+    bool untilElsewhere(const std::function<bool()>& condition);
+    /// From now on the log keeps what is said at any level, while this house stands.
+    static void listenClosely();
     /// A library of the store that has a rule file.
     void givenContainer(const std::string& name, const std::string& description) const;
 
