@@ -63,6 +63,7 @@ void StoreHouse::signIn() {
     account.address = remote;
     account.name = "anna@example.org";
     account.rateLimit = rateLimit;
+    account.quota = quota;
     account.identity = platform::Bytes(16, std::byte{7});
     if (const auto failure = platform::writeAccount(foldersBelow(home), account))
         throw std::runtime_error(failure->localizedDescription.value_or("no account"));

@@ -51,6 +51,8 @@ public:
 
     /// Bytes a second that the account's transfers may take, from the next signIn on.
     std::optional<std::uint64_t> rateLimit;
+    /// Size of the account in bytes, from the next signIn on.
+    std::optional<std::uint64_t> quota;
     TemporaryFolder home;
     /// What the account signs in to.
     std::string remote = home / "remote";
