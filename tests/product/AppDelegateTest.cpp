@@ -9,8 +9,6 @@
 #include "tests/product/ProductFixture.h"
 
 using testing::Contains;
-using testing::ElementsAre;
-using testing::IsEmpty;
 using testing::Not;
 using testing::StartsWith;
 
@@ -121,14 +119,6 @@ TEST_F(Entry, keepsItsStateWhileSomebodyIsSignedIn) {
     signOut();
     EXPECT_FALSE(delegate->applicationShouldSaveApplicationState(*application));
     EXPECT_FALSE(delegate->applicationShouldRestoreApplicationState(*application));
-}
-
-TEST_F(Entry, answersBeforeThereIsAWindow) {
-    givenStore();
-    tavrin::AppDelegate early;
-    EXPECT_FALSE(early.applicationShouldSaveApplicationState(*application));
-    EXPECT_FALSE(early.applicationOpenURLOptions(*application, address(),
-                                                 from(platform::homeScreenApplicationIdentifier)));
 }
 
 TEST_F(Entry, showsAccountNetworkAndActivityInTheStrip) {

@@ -225,14 +225,6 @@ TEST_F(Logging, bringsThePlatformsOwnMessagesWithTheirPlace) {
     EXPECT_NE(valueOf(record, "Line"), "");
 }
 
-TEST_F(Logging, triesItsLevels) {
-    VXSetLogLevel(9);
-    EXPECT_THAT(consoleOf([] { TavrinLogTest(); }), testing::HasSubstr(": Jot log level is 7\n"));
-    EXPECT_THAT(logLines(), ElementsAre("7 LOG_DEBUG", "6 LOG_INFO", "4 LOG_WARNING", "3 LOG_ERR",
-                                        "2 LOG_CRIT", "1 LOG_ALERT"));
-    EXPECT_EQ(valueOf(logRecords().front(), "Function"), "TavrinLogTest");
-}
-
 TEST(LogThreshold, followsTheAdministratorsSettings) {
     expectInFreshProcess([] {
         ProductHouse house;

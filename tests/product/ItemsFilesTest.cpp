@@ -10,7 +10,6 @@
 
 using platform::ErrorCode;
 using platform::Failure;
-using platform::Url;
 using tavrin::FileUtils;
 using testing::Contains;
 using testing::ElementsAre;
@@ -66,26 +65,6 @@ TEST_F(Files, countsUpFromTwoBeforeTheLastExtension) {
     EXPECT_EQ(freeNameFor("report.pdf"), std::nullopt);
     EXPECT_EQ(freeNameFor("a 4.txt"), std::nullopt);
     EXPECT_EQ(FileUtils::generateUniquePath(url("free.txt")), url("free.txt"));
-}
-
-TEST_F(Files, knowWhatStandsAtAPath) {
-    givenRemote("far.txt");
-    signIn();
-    givenFile("near.txt");
-    std::filesystem::create_symlink("/nowhere", path("Link"));
-    struct Case {
-        const char* name;
-        bool exists, isFile, isDir, isTaken;
-    };
-    for (const Case& each :
-         {Case{"near.txt", true, true, false, true}, Case{"", true, false, true, true},
-          Case{"far.txt", false, false, false, true}, Case{"Link", false, false, false, true},
-          Case{"none", false, false, false, false}}) {
-        EXPECT_EQ(FileUtils::exists(url(each.name)), each.exists) << each.name;
-        EXPECT_EQ(FileUtils::isFile(url(each.name)), each.isFile) << each.name;
-        EXPECT_EQ(FileUtils::isDir(url(each.name)), each.isDir) << each.name;
-        EXPECT_EQ(FileUtils::isTaken(url(each.name)), each.isTaken) << each.name;
-    }
 }
 
 TEST_F(Files, moveAndSayEachStep) {

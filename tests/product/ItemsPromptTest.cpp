@@ -14,7 +14,6 @@ using tavrin::NewFolderPrompt;
 using tavrin::RenamePrompt;
 using tavrin::UIUtils;
 using testing::ElementsAre;
-using testing::HasSubstr;
 using testing::StartsWith;
 
 namespace test {
@@ -278,15 +277,6 @@ TEST_F(Alerts, askBeforeADeletionWhereThereIsSomethingToAsk) {
     EXPECT_THAT(asked, ElementsAre("nothing cancelled", "Cancel cancelled", "Delete from Tavrin"));
     EXPECT_TRUE(logged("6 Delete: Cancel pressed"));
     EXPECT_TRUE(FileUtils::isTaken(url("far.txt"))) << "asking deletes nothing";
-}
-
-TEST_F(Alerts, pointAtTheMiddleOfWhatTheyAreAbout) {
-    launch();
-    EXPECT_TRUE(UIUtils::tabloMode());
-    const platform::View view(platform::Rect{10, 20, 200, 40});
-    EXPECT_EQ(UIUtils::anchorRect(view), (platform::Rect{0, 20, 200, 0}));
-    application->setIdiom(platform::DeviceIdiom::phone);
-    EXPECT_FALSE(UIUtils::tabloMode());
 }
 
 TEST_F(Alerts, putTheCursorBeforeTheExtension) {

@@ -1,13 +1,9 @@
 #include "items/FileUtils.h"
-#include "platform/cloud/CloudContainer.h"
-#include "platform/cloud/CloudDocumentService.h"
 #include "tests/product/ProductFixture.h"
 
-using platform::ErrorCode;
 using platform::Url;
 using tavrin::FileUtils;
 using testing::Contains;
-using testing::ElementsAre;
 using testing::StartsWith;
 
 namespace test {
@@ -135,23 +131,6 @@ TEST_F(Rules, writeTheWayToAnItemWithoutItsOwnName) {
     EXPECT_EQ(locationOf("Offer.pages"), "Documents");
     EXPECT_EQ(locationOf("A/\u65E5\u672C/Offer.pages"), "Documents \u25B8 A \u25B8 \u65E5\u672C");
     EXPECT_EQ(locationOf("/"), "nowhere");
-}
-
-TEST_F(Rules, fillOnlyTheSlotsThatCanBeFilled) {
-    givenLibraries();
-    std::shared_ptr<const platform::CloudContainer> container;
-    std::vector<std::string> components = {"untouched"};
-    const auto ask = [&](const Url& item) {
-        return FileUtils::containerAndRelativePathforURL(item, &container, &components);
-    };
-    EXPECT_TRUE(ask(Url::file(home / "a"))->is(ErrorCode::noSuchItem));
-    EXPECT_EQ(container, nullptr);
-    EXPECT_EQ(ask(url("/Pages/Documents")), std::nullopt);
-    EXPECT_THAT(components, ElementsAre("untouched")) << "the library's own top";
-    EXPECT_EQ(container->identifier(), "com.example.pages");
-    EXPECT_EQ(ask(url("/Pages/Documents/A/b.txt")), std::nullopt);
-    EXPECT_THAT(components, ElementsAre("A", "b.txt"));
-    EXPECT_EQ(FileUtils::containerAndRelativePathforURL(url("x"), nullptr, nullptr), std::nullopt);
 }
 
 } // namespace

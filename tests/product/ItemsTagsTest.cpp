@@ -94,13 +94,10 @@ TEST_F(Tags, standAsOverlappingDots) {
     expectNear(pixel(three, 0, 5),
                tavrin::_colorBlendedWithColor(labelColor(6), Color::white.withAlpha(0.5)));
     EXPECT_TRUE(FileTags::blipWithTags({}, 10, 1).empty());
-}
-
-TEST_F(Tags, roundADotUpToWholePoints) {
-    const Image two = FileTags::blipWithTags({"a", "b"}, 10.5, 2);
-    EXPECT_EQ(two.scale(), 2);
-    EXPECT_NEAR(two.size().width, 16.25, 0.5);
-    EXPECT_EQ(two.size().height, 11);
+    const Image fine = FileTags::blipWithTags({"a", "b"}, 10.5, 2);
+    EXPECT_EQ(fine.scale(), 2);
+    EXPECT_NEAR(fine.size().width, 16.25, 0.5); // 11 and half of 10.5
+    EXPECT_EQ(fine.size().height, 11);
 }
 
 TEST_F(Tags, standAloneWhereTheLineWantsThem) {

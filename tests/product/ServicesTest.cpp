@@ -323,15 +323,6 @@ TEST_F(Quota, isToldAlsoWhenNothingIsLeft) {
     EXPECT_THAT(listener->heard, ElementsAre(0U));
 }
 
-TEST_F(Quota, isKeptForADelegateThatDoesNotListen) {
-    const auto silent = std::make_shared<tavrin::QuotaFetcherDelegate>();
-    givenFetcher();
-    fetcher->setDelegate(silent);
-    advance(0s);
-    EXPECT_TRUE(until([&] { return fetcher->freeBytes() == 600'000; }));
-    EXPECT_THAT(listener->heard, IsEmpty());
-}
-
 TEST_F(Quota, endsWithItsFetcher) {
     givenFetcher();
     advance(0s);
