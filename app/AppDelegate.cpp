@@ -4,6 +4,7 @@
 #include "browse/NavController.h"
 #include "items/UrlExtensions.h"
 #include "platform/system/SourceApplications.h"
+#include "preview/PreviewItemManager.h"
 #include "services/NetworkWatcher.h"
 
 namespace tavrin {
@@ -13,20 +14,18 @@ using platform::Url;
 
 constexpr std::string_view scheme = "tavrinapp";
 constexpr std::string_view modeItem = "mode";
-constexpr int fullPreview = 0;
-constexpr int detailsScreen = 1;
 
 /// The mode that the query asks for; of several recognised values the last one wins.
 int previewModeOf(const Url& request) {
-    int mode = fullPreview;
+    int mode = fullPreviewMode;
     for (const platform::QueryItem& item : request.queryItems()) {
         if (platform::percentDecoded(item.name) != modeItem)
             continue;
         const std::optional<std::string> value = platform::percentDecoded(item.value);
         if (value == "preview")
-            mode = fullPreview;
+            mode = fullPreviewMode;
         else if (value == "details" || value == "info")
-            mode = detailsScreen;
+            mode = detailsMode;
     }
     return mode;
 }

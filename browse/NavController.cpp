@@ -189,8 +189,9 @@ void NavController::decodeRestorableStateWithCoder(const platform::RestorationCo
     if (!dossa_isInShelfroot(*url))
         return;
     const auto mode = coder.find(restoredModeKey);
-    const std::int64_t number = mode == coder.end() ? 0 : mode->second.integer().value_or(0);
-    showPreview(std::make_shared<VXItem>(*url), static_cast<int>(number));
+    const std::optional<std::int64_t> number =
+        mode == coder.end() ? std::nullopt : mode->second.integer();
+    showPreview(std::make_shared<VXItem>(*url), static_cast<int>(number.value_or(fullPreviewMode)));
 }
 
 void NavController::navigationControllerDidShowViewController(platform::NavigationController&,

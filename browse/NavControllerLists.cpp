@@ -19,8 +19,6 @@ using platform::Url;
 /// Delete, more and information; renaming is added to what the list then offers.
 constexpr unsigned basicActions = 7;
 constexpr unsigned renameAction = 1U << static_cast<unsigned>(platform::DocumentAction::rename);
-constexpr int fullPreview = 0;
-constexpr int detailsScreen = 1;
 
 /// The count logged last, by whichever list; at first none that a list can have.
 std::size_t lastLoggedCount = std::numeric_limits<std::size_t>::max();
@@ -97,7 +95,7 @@ void NavController::documentListControllerDidSelectItemAtURL(List& /*list*/, con
         VXLOG(vxDebug, "openInDefaultApp returned NO, showing preview");
         platform::Platform::current().mainQueue().async([weak = weak_from_this(), item] {
             if (const auto screen = std::static_pointer_cast<NavController>(weak.lock()))
-                screen->showPreview(item, fullPreview);
+                screen->showPreview(item, fullPreviewMode);
         });
     });
 }
@@ -126,7 +124,7 @@ void NavController::documentListControllerPerformAction(
         showActionsMenuFromView(originatingView, url, list.presentedURL(), std::move(completion));
         break;
     case static_cast<int>(platform::DocumentAction::information):
-        showPreview(std::make_shared<VXItem>(url), detailsScreen);
+        showPreview(std::make_shared<VXItem>(url), detailsMode);
         completion();
         break;
     case static_cast<int>(platform::DocumentAction::rename):

@@ -22,7 +22,6 @@ using platform::SystemItem;
 constexpr double firstInset = 8; // before the margins are known
 constexpr double narrowMargin = 17;
 constexpr double wideMargin = 45;
-constexpr int detailsMode = 1;
 
 } // namespace
 

@@ -87,7 +87,7 @@ PreviewItemManager::Screen PreviewItemManager::prepareToPreviewItem(const ItemPo
 
     Screen screen;
     const char* name = "PreviewDetailsViewController";
-    if (mode_ != 0) {
+    if (mode_ != fullPreviewMode) {
         screen = createDetailsViewController();
     } else if (local) {
         screen = createGlimpseController();
@@ -106,7 +106,7 @@ PreviewItemManager::Screen PreviewItemManager::prepareToPreviewItem(const ItemPo
 
 void PreviewItemManager::finishPreviewingItem() {
     const auto navigation = navigationController();
-    if (!autoDownload_ || !navigation || mode_ != 0)
+    if (!autoDownload_ || !navigation || mode_ != fullPreviewMode)
         return;
     if (!std::dynamic_pointer_cast<PreviewDownloadViewController>(navigation->topViewController()))
         return;

@@ -17,6 +17,10 @@
 
 namespace tavrin {
 
+/// What a preview shows of its item. Numbers of other origin (a restored state) are taken as well:
+/// every one but 0 shows the details.
+enum PreviewMode : int { fullPreviewMode = 0, detailsMode = 1 };
+
 class PreviewDetailsViewController;
 class PreviewDownloadViewController;
 
@@ -85,7 +89,7 @@ public:
 
     /// Safe from any thread.
     ItemPointer item() const;
-    /// 0 for the full preview, anything else for the details screen.
+    /// A PreviewMode.
     int mode() const { return mode_; }
     void setMode(int mode) { mode_ = mode; }
     std::shared_ptr<platform::NavigationController> navigationController() const;
@@ -143,7 +147,7 @@ private:
     mutable std::mutex registrationLock_;
     bool filePresenterRegistered_ = false; // guarded by registrationLock_
 
-    int mode_ = 0;
+    int mode_ = fullPreviewMode;
     bool autoDownload_ = false;
     std::optional<platform::Date> modifiedDate_;
     std::weak_ptr<platform::NavigationController> navigationController_; // it owns this manager
