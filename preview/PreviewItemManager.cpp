@@ -43,6 +43,8 @@ std::shared_ptr<PreviewItemManager> PreviewItemManager::create() {
     manager->willResign_ =
         center.observe(platform::applicationWillResignActiveNotification,
                        calling(&PreviewItemManager::willResignActiveNotification));
+    manager->willTerminate_ = center.observe(platform::applicationWillTerminateNotification,
+                                             calling(&PreviewItemManager::cancelDownload));
     // So that the full-preview screen exists before the first preview.
     GlimpseItemController::defaultController();
     return manager;
@@ -71,11 +73,13 @@ void PreviewItemManager::setItem(const ItemPointer& item, bool updatePreview) {
 }
 
 PreviewItemManager::Screen PreviewItemManager::prepareToPreviewItem(const ItemPointer& item) {
-    cancelDownload();
+    const std::optional<Url> oldUrl = itemUrl();
     const std::optional<Url> newUrl = item ? item->url() : std::nullopt;
-    if (const std::optional<Url> oldUrl = itemUrl(); !oldUrl || !newUrl || *oldUrl != *newUrl)
-        unregisterAsFilePresenter();
+    // Before the cancellation: what has arrived whole and is shown now is not evicted by it.
     replaceItem(item);
+    cancelDownload();
+    if (!oldUrl || !newUrl || *oldUrl != *newUrl)
+        unregisterAsFilePresenter();
     if (!item || !item->resolvedURL() || item->resolvedURL()->path().empty()) {
         VXLOG(vxWarning, "no preview URL, nothing to show");
         return nullptr;
@@ -152,6 +156,7 @@ void PreviewItemManager::replaceLastViewController(const Screen& screen) {
     const auto navigation = navigationController();
     if (!navigation)
         return;
+    left_ = false;
     std::vector<Screen> screens = navigation->viewControllers();
     if (!screens.empty() && isPreviewControllerDisplayed(screens.back().get())) {
         screens.back() = screen;
@@ -175,6 +180,8 @@ bool PreviewItemManager::isPreviewControllerDisplayed(const platform::ViewContro
 }
 
 void PreviewItemManager::viewControllerWillDisappear(const platform::ViewController& screen) {
+    const auto navigation = navigationController();
+    left_ = !navigation || !worksFor(navigation->topViewController());
     const auto download = downloadViewController();
     const auto details = detailsViewController();
     if (static_cast<const platform::ViewController*>(download.get()) == &screen) {

@@ -10,6 +10,7 @@
 #include "platform/launch/DocumentInteractionController.h"
 #include "platform/ui/NavigationController.h"
 
+#include <cstdint>
 #include <functional>
 #include <memory>
 #include <mutex>
@@ -70,7 +71,7 @@ public:
     // Downloading (PreviewItemManagerDownload.cpp)
     void startDownload();
     void startDownloading(DownloadCompletion completion);
-    /// From any thread.
+    /// Ends the download that runs and those that wait for it. From any thread.
     void cancelDownload();
     void showDownloadError(const platform::Failure& error);
 
@@ -116,6 +117,8 @@ private:
     PreviewItemManager();
     void didBecomeActiveNotification();
     void willResignActiveNotification();
+    /// The person has gone back from the screen that this manager put on the stack.
+    bool wasLeft() const { return left_; }
     void replaceItem(const ItemPointer& item);
     void setScreens(std::shared_ptr<PreviewDownloadViewController> download,
                     std::shared_ptr<PreviewDetailsViewController> details);
@@ -130,9 +133,10 @@ private:
     bool worksFor(const Screen& screen) const;
 
     struct Download;
-    static void startDownloadingNow(const std::weak_ptr<PreviewItemManager>& manager,
-                                    DownloadCompletion completion);
-    std::shared_ptr<platform::FileCoordinator> replaceDownloadCoordinator();
+    std::shared_ptr<platform::FileCoordinator>
+    replaceDownloadCoordinator(std::uint64_t cancellations);
+    void cancelCoordinator();
+    bool showsContentsOf(const std::optional<platform::Url>& url) const;
     void finishDownload(const Download& download, const std::optional<platform::Url>& newUrl,
                         const platform::Failure& error);
 
@@ -141,6 +145,8 @@ private:
     std::shared_ptr<platform::FileCoordinator> downloadFC_;
     std::shared_ptr<PreviewDownloadViewController> downloadViewController_;
     std::shared_ptr<PreviewDetailsViewController> detailsViewController_;
+    /// How often cancelDownload was called: a download that was asked for before does not begin.
+    std::uint64_t cancellations_ = 0;
     bool refreshPending_ = false;
 
     // Of its own: registration asks for the presented URL, which takes the lock above.
@@ -149,6 +155,7 @@ private:
 
     int mode_ = fullPreviewMode;
     bool autoDownload_ = false;
+    bool left_ = false;
     std::optional<platform::Date> modifiedDate_;
     std::weak_ptr<platform::NavigationController> navigationController_; // it owns this manager
     std::shared_ptr<platform::DocumentInteractionController> documentInteractionController_;
@@ -156,6 +163,7 @@ private:
     std::shared_ptr<platform::WorkQueue> downloadQueue_;
     platform::Observation becameActive_;
     platform::Observation willResign_;
+    platform::Observation willTerminate_;
 };
 
 } // namespace tavrin

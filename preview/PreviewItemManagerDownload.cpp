@@ -6,6 +6,7 @@
 #include "platform/base/Text.h"
 #include "platform/cloud/CloudDocumentService.h"
 #include "platform/ui/AlertController.h"
+#include "platform/ui/Application.h"
 #include "preview/PreviewDownloadViewController.h"
 #include "preview/PreviewItemManager.h"
 #include "services/NetworkIndicator.h"
@@ -28,6 +29,16 @@ bool hasCode(const platform::Error& error, ErrorCode code) {
 
 NetworkIndicator& indicator() {
     return *NetworkIndicator::sharedNetworkIndicator();
+}
+
+/// No download uses the platform any more once the application has told of its end.
+platform::Observation waitAtTermination(const std::shared_ptr<platform::WorkQueue>& queue) {
+    return platform::Platform::current().notifications().observe(
+        platform::applicationWillTerminateNotification,
+        [weak = std::weak_ptr(queue)](const platform::Notification&) {
+            if (const auto running = weak.lock())
+                running->sync([] {});
+        });
 }
 
 void evictPartialCopy(const std::optional<Url>& url) {
@@ -57,25 +68,25 @@ void PreviewItemManager::startDownload() {
         if (error)
             self->showDownloadError(error);
         else
-            self->setItem(std::make_shared<VXItem>(newUrl), true);
+            // The contents may come while the screen is already on its way out.
+            self->setItem(std::make_shared<VXItem>(newUrl), !self->wasLeft());
     });
 }
 
-void PreviewItemManager::startDownloading(DownloadCompletion completion) {
-    VXLOG(vxDebug, "Dispatching download...");
-    // The job holds its queue, not the manager: a manager that goes away ends the read instead of
-    // waiting for it.
-    downloadQueue_->async(
-        [queue = downloadQueue_, weak = weak_from_this(), completion = std::move(completion)] {
-            startDownloadingNow(weak, completion);
-        });
+/// The preview was made from the document's contents: a change notice had found them arrived.
+bool PreviewItemManager::showsContentsOf(const std::optional<Url>& url) const {
+    const ItemPointer current = item();
+    return current && current->isDownloaded() && current->resolvedURL() == url;
 }
 
-std::shared_ptr<FileCoordinator> PreviewItemManager::replaceDownloadCoordinator() {
-    cancelDownload();
+std::shared_ptr<FileCoordinator>
+PreviewItemManager::replaceDownloadCoordinator(std::uint64_t cancellations) {
+    cancelCoordinator();
     auto coordinator = std::make_shared<FileCoordinator>(
         std::weak_ptr<platform::FilePresenter>(shared_from_this()));
     const std::lock_guard lock(lock_);
+    if (cancellations_ != cancellations)
+        coordinator->cancel();
     downloadFC_ = coordinator;
     return coordinator;
 }
@@ -86,14 +97,25 @@ struct PreviewItemManager::Download {
     std::weak_ptr<PreviewItemManager> manager;
     DownloadCompletion completion;
     std::shared_ptr<FileCoordinator> coordinator;
+    std::uint64_t cancellations = 0; // when it was asked for
     std::optional<Url> url;
+
+    void run() {
+        if (!begin())
+            return;
+        const Failure failure = coordinator->coordinateReading(
+            *url, ReadingOptions::withoutChanges | ReadingOptions::resolvesSymbolicLink,
+            [this](const Url& readUrl) { succeed(readUrl); });
+        if (failure)
+            fail(*failure);
+    }
 
     bool begin() {
         const auto self = platform::lockForMain(manager);
         if (!self)
             return false;
         VXLOG(vxDebug, "Download queue: changing FilePresenter");
-        coordinator = self->replaceDownloadCoordinator();
+        coordinator = self->replaceDownloadCoordinator(cancellations);
         url = self->itemResolvedUrl();
         if (!url)
             return false;
@@ -126,15 +148,18 @@ struct PreviewItemManager::Download {
     }
 
     void fail(const platform::Error& error) const {
+        bool shown = false;
         if (const auto self = platform::lockForMain(manager)) {
             const platform::MainOwned screen(self->downloadViewController());
             if (screen)
                 screen->unregisterProgress();
+            shown = self->showsContentsOf(url);
         }
         indicator().hide(indicatorKey);
         if (hasCode(error, ErrorCode::userCancelled)) {
             VXLOG(vxDebug, "coordinateReadingItemAtURL was cancelled, URL %@", url);
-            evictPartialCopy(url);
+            if (!shown)
+                evictPartialCopy(url);
         } else {
             VXLOG(vxError, "coordinateReadingItemAtURL failed, URL %@: %@", url, error);
         }
@@ -147,16 +172,18 @@ struct PreviewItemManager::Download {
     }
 };
 
-void PreviewItemManager::startDownloadingNow(const std::weak_ptr<PreviewItemManager>& manager,
-                                             DownloadCompletion completion) {
-    Download download{manager, std::move(completion), nullptr, std::nullopt};
-    if (!download.begin())
-        return;
-    const Failure failure = download.coordinator->coordinateReading(
-        *download.url, ReadingOptions::withoutChanges | ReadingOptions::resolvesSymbolicLink,
-        [&download](const Url& readUrl) { download.succeed(readUrl); });
-    if (failure)
-        download.fail(*failure);
+void PreviewItemManager::startDownloading(DownloadCompletion completion) {
+    VXLOG(vxDebug, "Dispatching download...");
+    Download download{weak_from_this(), std::move(completion), nullptr, 0, std::nullopt};
+    {
+        const std::lock_guard lock(lock_);
+        download.cancellations = cancellations_;
+    }
+    // Of the job, not of the manager: that one may be gone while its read still comes to an end.
+    const auto ending = std::make_shared<platform::Observation>(waitAtTermination(downloadQueue_));
+    // The job holds its queue, not the manager: a manager that goes away ends the read instead of
+    // waiting for it.
+    downloadQueue_->async([queue = downloadQueue_, ending, download]() mutable { download.run(); });
 }
 
 void PreviewItemManager::finishDownload(const Download& download, const std::optional<Url>& newUrl,
@@ -168,6 +195,14 @@ void PreviewItemManager::finishDownload(const Download& download, const std::opt
 }
 
 void PreviewItemManager::cancelDownload() {
+    {
+        const std::lock_guard lock(lock_);
+        ++cancellations_;
+    }
+    cancelCoordinator();
+}
+
+void PreviewItemManager::cancelCoordinator() {
     if (const auto coordinator = downloadFC())
         coordinator->cancel();
     indicator().hide(indicatorKey);

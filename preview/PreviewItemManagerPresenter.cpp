@@ -92,7 +92,7 @@ void PreviewItemManager::refreshItem(const Url& url) {
     const ItemPointer current = item();
     const auto details = detailsViewController();
     const bool arrived = current && !current->isDownloaded() && fresh->isDownloaded();
-    const bool rebuild = arrived && (!details || details->view()->isHidden());
+    const bool rebuild = arrived && (!details || details->view()->isHidden()) && !wasLeft();
     setItem(fresh, rebuild);
     VXLOG(vxInfo, "Refreshing %@", itemUrl());
     if (fullPreviewLagsBehind())

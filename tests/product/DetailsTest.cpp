@@ -1,0 +1,158 @@
+#include "platform/base/Process.h"
+#include "platform/cloud/KeyValueCloudStore.h"
+#include "platform/files/FileManager.h"
+#include "preview/PreviewThumbnailViewController.h"
+#include "tests/product/PreviewFixture.h"
+
+using tavrin::FileInfoCell;
+using tavrin::FileInfoStackView;
+using tavrin::VXItem;
+using testing::ElementsAre;
+
+namespace test {
+namespace {
+
+struct Details : PreviewTest {
+    void givenDetails(const std::string& name, platform::Size size = phone) {
+        signIn();
+        givenFile(name, "some content");
+        launch(size);
+        open("Documents");
+        preview(name, tavrin::detailsMode);
+    }
+    static std::vector<std::string> names(const FileInfoStackView& rows) {
+        std::vector<std::string> names;
+        for (const auto& row : rows.arrangedSubviews())
+            names.push_back(dynamic_cast<FileInfoCell&>(*row).nameLabel()->text());
+        return names;
+    }
+    /// In the window's coordinates.
+    static platform::Rect place(const platform::View& view) {
+        return view.convertToWindow(view.bounds());
+    }
+};
+
+TEST_F(Details, showsARowForEachValueThatThereIs) {
+    givenDetails("Milk.txt");
+    const FileInfoStackView& rows = *details()->fileInfoView();
+    EXPECT_THAT(names(rows), ElementsAre("Kind", "Size", "Where", "Created", "Modified"));
+    const auto item = std::make_shared<VXItem>(url("Milk.txt"));
+    item->setCreationDate(std::nullopt);
+    item->setFriendlyFileSize(std::nullopt);
+    item->setTags(std::vector<std::string>{"red one", "two"});
+    details()->fileInfoView()->setItem(item);
+    EXPECT_THAT(names(rows), ElementsAre("Kind", "Where", "Modified", "Tags"));
+    EXPECT_EQ(rows.creationDateCell(), nullptr);
+    details()->fileInfoView()->setItem(nullptr);
+    EXPECT_THAT(names(rows), ElementsAre("Kind", "Where", "Modified", "Tags"));
+    advance(20ms);
+    double width = -1;
+    for (const auto& row : rows.arrangedSubviews()) {
+        const double here = dynamic_cast<FileInfoCell&>(*row).nameLabel()->bounds().width;
+        EXPECT_TRUE(width < 0 || width == here) << "all names form one column";
+        width = here;
+    }
+}
+
+TEST_F(Details, putsADotBeforeEachTag) {
+    launch();
+    VXItem item(platform::Url::file(home / "A.txt"));
+    EXPECT_EQ(FileInfoStackView::buildTagsWithImagesString(item, FileInfoCell::font()),
+              std::nullopt);
+    item.setTags(std::vector<std::string>{"one", "2 and 3"});
+    const auto line = FileInfoStackView::buildTagsWithImagesString(item, FileInfoCell::font());
+    ASSERT_EQ(line->runs.size(), 4U);
+    EXPECT_FALSE(line->runs[0].image.empty());
+    EXPECT_EQ(line->runs[1].text, "one ");
+    EXPECT_FALSE(line->runs[2].image.empty());
+    EXPECT_EQ(line->runs[3].text, "2 and 3");
+    EXPECT_EQ(line->runs[3].baselineOffset, -FileInfoCell::font().descender());
+}
+
+TEST_F(Details, choosesTheLongestDatesThatFit) {
+    givenDetails("Milk.txt");
+    const auto item = std::make_shared<VXItem>(url("Milk.txt"));
+    item->setCreationDate(platform::Date::fromSeconds(1'695'000'000)); // in September
+    item->setContentModificationDate(platform::Date::fromSeconds(1'715'000'000));
+    const auto rows = std::make_shared<FileInfoStackView>();
+    rows->setAxis(platform::Axis::vertical);
+    nav().view()->addSubview(rows);
+    rows->setItem(item);
+    const auto width = platform::LayoutConstraint::constant(*rows, platform::LayoutAttribute::width,
+                                                            platform::LayoutRelation::equal, 0);
+    width->setActive(true);
+    using enum platform::DateStyle;
+    const auto widthOf = [&](platform::DateStyle style) {
+        const platform::Font font = FileInfoCell::font();
+        return std::max(font.width(*item->friendlyCreationDate(style)),
+                        font.width(*item->friendlyContentModificationDate(style)));
+    };
+    const double names = 10 + FileInfoCell::font().width("Modified");
+    for (const auto& [room, style] : {std::pair{widthOf(longStyle) + 3, longStyle},
+                                      {widthOf(longStyle) - 5, medium},
+                                      {widthOf(medium) + 3, medium},
+                                      {widthOf(medium) - 5, shortStyle},
+                                      {widthOf(shortStyle) - 20, shortStyle}}) {
+        SCOPED_TRACE(room);
+        width->setConstant(names + room);
+        advance(100ms);
+        EXPECT_EQ(rows->creationDateCell()->valueLabel()->text(),
+                  item->friendlyCreationDate(style));
+        EXPECT_EQ(rows->modifiedDateCell()->valueLabel()->text(),
+                  item->friendlyContentModificationDate(style));
+    }
+}
+
+TEST_F(Details, renamesByTheNameAndFollows) {
+    givenDetails("Milk.txt");
+    const auto screen = details();
+    tap(*screen->filenameTextField());
+    advance(1s);
+    ASSERT_NE(alert(), nullptr);
+    for (int i = 0; i < 8; ++i)
+        press(Key::backspace);
+    type("Bread");
+    tap(*button("Done"));
+    EXPECT_TRUE(whileTimePasses([&] { return screen->originalFilename() == "Bread.txt"; }));
+    EXPECT_EQ(screen->filenameTextField()->text(), "Bread.txt");
+    EXPECT_EQ(details(), screen);
+    EXPECT_EQ(manager().presentedItemURL(), url("Bread.txt"));
+    EXPECT_TRUE(std::filesystem::exists(path("Bread.txt")));
+}
+
+TEST_F(Details, leavesTheNameOfALibraryAlone) {
+    givenDetails("Milk.txt");
+    const auto item = std::make_shared<VXItem>(url("Milk.txt"));
+    item->setRenameable(false);
+    manager().setItem(item, false);
+    tap(*details()->filenameTextField());
+    advance(1s);
+    EXPECT_EQ(topPresented(), nullptr);
+}
+
+TEST_F(Details, standsBelowUprightAndBesideAcross) {
+    givenDetails("Milk.txt", {768, 1024});
+    const auto screen = details();
+    for (const auto& line : screen->hairlineViews()) {
+        EXPECT_EQ(place(*line).x, 0);
+        EXPECT_EQ(place(*line).width, 768);
+        EXPECT_EQ(line->bounds().height, 1 / window().screenScale());
+    }
+    EXPECT_LT(place(*screen->thumbnailView()).maxY(), place(*screen->fileDetailsView()).y);
+    window().resize({1024, 768});
+    advance(1s);
+    const platform::Rect column = place(*screen->fileDetailsView());
+    EXPECT_NEAR(column.width, screen->thumbnailView()->bounds().width, 1);
+    EXPECT_LT(place(*screen->thumbnailView()).x, column.x);
+    for (const auto& line : screen->hairlineViews()) {
+        EXPECT_EQ(place(*line).x, column.x);
+        EXPECT_EQ(place(*line).maxX(), 1024);
+    }
+    EXPECT_EQ(screen->filenameTextField()->textAlignment(), platform::TextAlignment::natural);
+    window().resize({768, 1024});
+    advance(1s);
+    EXPECT_EQ(place(*screen->hairlineViews().front()).width, 768);
+}
+
+} // namespace
+} // namespace test
