@@ -106,6 +106,21 @@ std::shared_ptr<HairlineView> PreviewDetailsViewController::addHairline() {
     return hairlineViews_.back();
 }
 
+/// The lines reach beyond the columns that hold them, and a view shows only what is within its
+/// parent. So the screen itself draws each where it lies.
+void PreviewDetailsViewController::drawOnScreen(HairlineView& line) {
+    const auto drawn = std::make_shared<View>();
+    drawn->setBackgroundColor(line.backgroundColor());
+    drawn->setLaidOutByConstraints(true);
+    line.setBackgroundColor(platform::Color::clear);
+    view()->insertSubview(drawn, 0);
+    Constraints same;
+    for (const LayoutAttribute edge : {LayoutAttribute::leading, LayoutAttribute::trailing,
+                                       LayoutAttribute::top, LayoutAttribute::bottom})
+        same.push_back(LayoutConstraint::equal(*drawn, edge, line, edge));
+    LayoutConstraint::activate(same);
+}
+
 void PreviewDetailsViewController::setupViewsAndConstraints() {
     thumbnailView_ = std::make_shared<ThumbnailImageView>();
     for (const Axis axis : {Axis::horizontal, Axis::vertical})
@@ -117,6 +132,8 @@ void PreviewDetailsViewController::setupViewsAndConstraints() {
         buildVerticalStackWithSubviews({thumbnailView_, fileDetailsView_}, blockSpacing);
     wrapperView()->addSubview(mainStackView_);
     stretchSubview(*mainStackView_, *wrapperView());
+    for (const std::shared_ptr<HairlineView>& line : hairlineViews_)
+        drawOnScreen(*line);
     activateFixedConstraints();
     setupVerticalConstraints();
     setupHorizontalConstraints();

@@ -56,6 +56,7 @@ private:
     void setupVerticalConstraints();
     void setupHorizontalConstraints();
     std::shared_ptr<HairlineView> addHairline();
+    void drawOnScreen(HairlineView& line);
 
     std::shared_ptr<ThumbnailImageView> thumbnailView_;
     std::shared_ptr<platform::Label> filenameTextField_;
