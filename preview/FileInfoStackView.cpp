@@ -3,6 +3,7 @@
 #include "items/FileTags.h"
 #include "items/FileUtils.h"
 #include "platform/base/Text.h"
+#include "platform/ui/Application.h"
 #include "platform/ui/VisualFormat.h"
 
 #include <algorithm>
@@ -15,6 +16,8 @@ using platform::localized;
 
 constexpr double rowSpacing = 10;
 constexpr int locationLines = 3;
+/// Points between a tag's dot and its name.
+constexpr double dotGap = 2;
 
 void showText(const std::shared_ptr<FileInfoCell>& cell, const VXItem::Text& text) {
     if (cell && text && cell->valueLabel()->text() != *text)
@@ -84,8 +87,10 @@ FileInfoStackView::buildTagsWithImagesString(const VXItem& item, const platform:
     if (!item.tags() || item.tags()->empty())
         return std::nullopt;
     const double capHeight = font.capHeight();
-    const platform::Size imageSize{capHeight + 2, font.lineHeight()};
-    const platform::Point offset{0, font.ascender() - capHeight + 1};
+    const platform::Size imageSize{capHeight + dotGap, font.lineHeight()};
+    // The spare room of the image keeps the dot off its name, which follows to the left or right.
+    const double side = platform::Application::shared().isRightToLeft() ? dotGap : 0;
+    const platform::Point offset{side, font.ascender() - capHeight + 1};
     platform::StyledText line;
     for (std::size_t i = 0; i < item.tags()->size(); ++i) {
         const std::string& tag = (*item.tags())[i];
