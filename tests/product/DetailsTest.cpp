@@ -1,8 +1,8 @@
-#include "platform/base/Process.h"
-#include "platform/cloud/KeyValueCloudStore.h"
-#include "platform/files/FileManager.h"
 #include "preview/PreviewThumbnailViewController.h"
 #include "tests/product/PreviewFixture.h"
+
+#include <QColor>
+#include <QImage>
 
 using tavrin::FileInfoCell;
 using tavrin::FileInfoStackView;
@@ -128,6 +128,86 @@ TEST_F(Details, leavesTheNameOfALibraryAlone) {
     tap(*details()->filenameTextField());
     advance(1s);
     EXPECT_EQ(topPresented(), nullptr);
+}
+
+TEST_F(Details, offersTheApplicationWhereThereIsRoomForIt) {
+    home.write("data/applications/pen.desktop", "[Desktop Entry]\nType=Application\nName=Pen\n"
+                                                "Exec=/bin/true %f\nMimeType=text/plain;\n");
+    givenDetails("Milk.txt", tablet);
+    givenFile("Milk.pdf");
+    for (const bool onTablet : {true, false}) {
+        if (!onTablet) {
+            application->setIdiom(platform::DeviceIdiom::phone);
+            window().resize(phone);
+            back();
+            preview("Milk.txt", tavrin::detailsMode);
+        }
+        EXPECT_EQ(details()->hairlineViews().size(), onTablet ? 3U : 2U);
+        EXPECT_EQ(details()->navigationItem().rightBarButtonItems().size(), onTablet ? 5U : 1U);
+        clearLog();
+        tap(*button("Open in “Pen”"));
+        EXPECT_EQ(timesLogged("6 Opening document " + told("Milk.txt") + " in default app"), 1U);
+        back();
+        preview("Milk.pdf", tavrin::detailsMode);
+        EXPECT_EQ(details()->openInAppButton(), nullptr);
+        EXPECT_EQ(details()->hairlineViews().size(), 2U);
+        back();
+        preview("Milk.txt", tavrin::detailsMode);
+    }
+}
+
+TEST_F(Details, drawsTheLinesAcrossTheScreen) {
+    givenDetails("Milk.txt");
+    const auto isLine = [this](double x, const platform::View& line) {
+        const platform::Bytes png = window().snapshotPng(1);
+        const QImage picture = QImage::fromData(
+            QByteArray(reinterpret_cast<const char*>(png.data()), static_cast<int>(png.size())));
+        const QColor color =
+            picture.pixelColor(static_cast<int>(x), static_cast<int>(place(line).y));
+        return color != QColor(Qt::white);
+    };
+    for (const auto& line : details()->hairlineViews())
+        EXPECT_TRUE(isLine(0, *line) && isLine(200, *line) && isLine(389, *line));
+    window().resize({844, 390});
+    advance(1s);
+    for (const auto& line : details()->hairlineViews()) {
+        EXPECT_TRUE(isLine(843, *line) && isLine(place(*line).x + 1, *line));
+        EXPECT_FALSE(isLine(place(*line).x - 2, *line));
+    }
+}
+
+TEST_F(Details, leansTheNamesTowardTheirValues) {
+    givenDetails("Milk.txt");
+    for (const bool rightToLeft : {false, true}) {
+        application->setRightToLeft(rightToLeft);
+        back();
+        preview("Milk.txt", tavrin::detailsMode);
+        const FileInfoCell& cell = *details()->fileInfoView()->modifiedDateCell();
+        EXPECT_EQ(cell.nameLabel()->textAlignment(),
+                  rightToLeft ? platform::TextAlignment::left : platform::TextAlignment::right);
+        EXPECT_EQ(place(*cell.nameLabel()).x > place(*cell.valueLabel()).x, rightToLeft);
+    }
+}
+
+TEST_F(Details, showsAPieOnTheThumbnailOnlyWhenAsked) {
+    givenDetails("Milk.txt");
+    const auto screen = std::make_shared<tavrin::PreviewThumbnailViewController>();
+    screen->setItemManager(manager().weak_from_this());
+    nav().pushViewController(screen, false);
+    advance(1s);
+    const tavrin::ThumbnailImageView& thumbnail = *screen->thumbnailView();
+    EXPECT_FALSE(thumbnail.thumbnailView()->image().empty()) << "the type's icon";
+    thumbnail.progressView()->setProgress(0.7F);
+    screen->thumbnailView()->updateProgress(0.5);
+    EXPECT_EQ(thumbnail.progressView()->progress(), 0.7F) << "hidden, it takes no report";
+    screen->showProgress(true);
+    EXPECT_EQ(thumbnail.progressView()->progress(), 0);
+    screen->thumbnailView()->updateProgress(0.5);
+    EXPECT_EQ(thumbnail.progressView()->progress(), 0.5F);
+    advance(20ms);
+    EXPECT_EQ(place(*thumbnail.progressView()).maxX(), place(*thumbnail.thumbnailView()).maxX());
+    EXPECT_EQ(place(*thumbnail.progressView()).maxY(), place(*thumbnail.thumbnailView()).maxY());
+    EXPECT_EQ(thumbnail.progressView()->bounds().width, 22);
 }
 
 TEST_F(Details, standsBelowUprightAndBesideAcross) {

@@ -1,10 +1,9 @@
-#include "items/FileUtils.h"
 #include "platform/documents/DocumentSearchController.h"
 #include "platform/documents/DocumentTargetSelectionController.h"
 #include "platform/files/FileCoordinator.h"
-#include "platform/files/FileManager.h"
-#include "preview/PreviewThumbnailViewController.h"
 #include "tests/product/PreviewFixture.h"
+
+#include <future>
 
 using tavrin::GlimpseItemController;
 using tavrin::PreviewItemManager;
@@ -275,6 +274,32 @@ TEST_F(Preview, showsWhatArrivesByAnotherRoute) {
     ASSERT_NE(download(), nullptr);
     fetch();
     EXPECT_TRUE(whileTimePasses([&] { return showsFullPreview(); }));
+    EXPECT_THAT(nav().viewControllers(), SizeIs(3));
+}
+
+TEST_F(Preview, keepsWhatArrivedWhileItsOwnDownloadStillWaits) {
+    givenTwo();
+    givenNetwork("cellular");
+    ASSERT_TRUE(untilNetwork(tavrin::networkCellular));
+    preview("Away.txt");
+    std::promise<void> release;
+    std::promise<void> holds;
+    platform::WorkQueue other("other");
+    other.async([&] { // brings the contents, then keeps everybody waiting
+        const platform::Failure failure = platform::FileCoordinator().coordinateWriting(
+            url("Away.txt"), platform::WritingOptions::none, [&](const auto&) {
+                holds.set_value();
+                release.get_future().wait();
+            });
+        EXPECT_FALSE(failure);
+    });
+    holds.get_future().wait();
+    manager().startDownload();
+    ASSERT_TRUE(whileTimePasses([this] { return showsFullPreview(); })) << "by the change notice";
+    release.set_value();
+    downloadsEnd();
+    advance(1s);
+    EXPECT_TRUE(fs::exists(path("Away.txt")));
     EXPECT_THAT(nav().viewControllers(), SizeIs(3));
 }
 
