@@ -34,10 +34,7 @@ struct PreviewTest : ProductTest {
     }
     bool untilNetwork(tavrin::NetworkState state) {
         const auto& watcher = tavrin::NetworkWatcher::sharedNetworkWatcher();
-        const auto deadline = std::chrono::steady_clock::now() + 20s;
-        while (watcher->networkState() != state && std::chrono::steady_clock::now() < deadline)
-            settle();
-        return watcher->networkState() == state;
+        return whileTimePasses([&] { return watcher->networkState() == state; }, 0ms);
     }
     void preview(const std::string& name, int mode = tavrin::fullPreviewMode) {
         nav().showPreview(std::make_shared<tavrin::VXItem>(url(name)), mode);
@@ -62,11 +59,12 @@ struct PreviewTest : ProductTest {
     bool untilFullPreview() {
         return until([this] { return showsFullPreview(); });
     }
-    /// Waits for what comes by other threads and the clock together, a slowed download above all.
-    bool whileTimePasses(const std::function<bool()>& condition) {
+    /// Waits for what comes by other threads and the clock together, a slowed download above all;
+    /// with a step of 0, for what comes at this very moment of the clock.
+    bool whileTimePasses(const std::function<bool()>& condition, platform::Duration step = 16ms) {
         const auto deadline = std::chrono::steady_clock::now() + 20s;
         while (!condition() && std::chrono::steady_clock::now() < deadline)
-            advance(16ms);
+            advance(step);
         return condition();
     }
     /// Nothing is under way on the queue of downloads, and what it reported was dealt with.
