@@ -144,6 +144,28 @@ TEST_F(Folder, readsAChangedFileAgain) {
     EXPECT_TRUE(house.until([&] { return model->detailsAt(0)->size == 4U; }));
 }
 
+TEST_F(Folder, linksAreWhatTheyLeadToAndThoseThatLeadNowhereAreDocuments) {
+    house.signIn();
+    const std::string folder = house.path("");
+    house.givenFile("Trip/a.txt");
+    for (const auto& [link, target] :
+         {std::pair("to folder", "Trip"), std::pair("to file", "Trip/a.txt"),
+          std::pair("dangling", "nowhere"), std::pair("loop", "loop"), std::pair("ping", "pong"),
+          std::pair("pong", "ping"), std::pair("self", ".")})
+        ASSERT_EQ(::symlink(target, (folder + "/" + link).c_str()), 0);
+    ASSERT_EQ(::mkfifo((folder + "/pipe.txt").c_str(), 0600), 0);
+    show();
+    ASSERT_TRUE(untilShown(
+        {"self", "to folder", "Trip", "dangling", "loop", "ping", "pipe.txt", "pong", "to file"}));
+    for (std::size_t i = 0; i < 3; ++i)
+        EXPECT_EQ(model->entryAt(i).kind, EntryKind::folder);
+    EXPECT_EQ(details(1)->itemCount, 1U);
+    for (std::size_t i = 3; i < model->count(); ++i) {
+        EXPECT_EQ(model->entryAt(i).kind, EntryKind::file);
+        EXPECT_TRUE(details(i)) << "nothing waits for a pipe or goes round";
+    }
+}
+
 TEST_F(Folder, listsContainersByTheirNamesAndLooseFilesAfterThem) {
     house.givenRemote("/Zeichnen/.container.json",
                       R"({"identifier":"com.example.draw","names":{"en":"Drawings"},)"

@@ -96,17 +96,28 @@ void ListFixture::type(const std::string& text) {
     house.settle();
 }
 
+void ListFixture::fingerDown(Point point) {
+    QTest::touchEvent(&widget(), finger()).press(0, toPoint(point), &widget());
+}
+
+void ListFixture::fingerTo(Point point) {
+    QTest::touchEvent(&widget(), finger()).move(0, toPoint(point), &widget());
+}
+
+void ListFixture::fingerUp(Point point) {
+    QTest::touchEvent(&widget(), finger()).release(0, toPoint(point), &widget());
+    house.settle();
+}
+
 void ListFixture::drag(Point from, Point to, Duration step) {
     constexpr int steps = 10;
-    QTest::touchEvent(&widget(), finger()).press(0, toPoint(from), &widget());
+    fingerDown(from);
     for (int i = 1; i <= steps; ++i) {
         house.clock->advance(step);
         const double share = static_cast<double>(i) / steps;
-        const Point at{from.x + (to.x - from.x) * share, from.y + (to.y - from.y) * share};
-        QTest::touchEvent(&widget(), finger()).move(0, toPoint(at), &widget());
+        fingerTo({from.x + (to.x - from.x) * share, from.y + (to.y - from.y) * share});
     }
-    QTest::touchEvent(&widget(), finger()).release(0, toPoint(to), &widget());
-    house.settle();
+    fingerUp(to);
 }
 
 void ListFixture::swipe(std::string_view name, double distance, Duration step) {

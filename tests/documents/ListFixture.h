@@ -75,6 +75,9 @@ struct ListFixture : ::testing::Test {
     }
     void press(int key, Qt::KeyboardModifiers modifiers = Qt::NoModifier);
     void type(const std::string& text);
+    void fingerDown(platform::Point point);
+    void fingerTo(platform::Point point);
+    void fingerUp(platform::Point point);
     /// A finger that goes from one place to another in ten steps of `step`.
     void drag(platform::Point from, platform::Point to,
               platform::Duration step = std::chrono::milliseconds(8));

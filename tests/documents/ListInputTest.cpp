@@ -138,6 +138,19 @@ TEST_F(Input, anOpenSwipeClosesAtAnyOtherTapWhichOpensNothing) {
     EXPECT_THAT(delegate->files, IsEmpty());
 }
 
+TEST_F(Input, aRowThatGoesUnderTheFingerIsNeitherOpenedNorSwiped) {
+    const Point at = middleOf("File 1.txt");
+    fingerDown(at);
+    house.remove("File 1.txt");
+    ASSERT_TRUE(house.until([&] { return list->containedItemCount() == 39; }));
+    fingerTo({at.x - 120, at.y});
+    fingerUp({at.x - 120, at.y});
+    EXPECT_FALSE(state().swipe.row());
+    EXPECT_THAT(delegate->files, IsEmpty());
+    tap("File 2.txt");
+    EXPECT_THAT(delegate->files, ElementsAre(house.url("File 2.txt")));
+}
+
 TEST_F(Input, aShortSwipeSpringsBackAndOneInEditModeDoesNothing) {
     swipe("File 1.txt", 60, 50ms);
     EXPECT_FALSE(state().swipe.row());

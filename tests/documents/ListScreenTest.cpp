@@ -3,6 +3,10 @@
 
 #include "tests/documents/ListFixture.h"
 
+#include <atomic>
+#include <thread>
+#include <unistd.h>
+
 using namespace platform;
 using namespace std::chrono_literals;
 using ::testing::ElementsAre;
@@ -187,10 +191,11 @@ TEST_F(List, hostileNamesAreShownHarmlessly) {
     const std::string longest(251, 'n');
     for (const std::string& name :
          {std::string("evil\u202egpj.exe"), std::string("two\nlines"), std::string("bad\xff\xfe"),
-          std::string("Case"), std::string("case"), longest + ".txt"})
+          std::string("Case"), std::string("case"), std::string("Caf\u00E9"),
+          std::string("Cafe\u0301"), longest + ".txt"})
         house.givenFile(name);
     showList();
-    EXPECT_EQ(list->containedItemCount(), 6U);
+    EXPECT_EQ(list->containedItemCount(), 8U);
     EXPECT_EQ(accessibleRow("evil\u202egpj.exe")->text(QAccessible::Name),
               QStringLiteral("evil\uFFFDgpj.exe"));
     EXPECT_EQ(accessibleRow("two\nlines")->text(QAccessible::Name), QStringLiteral("two␊lines"));
@@ -244,6 +249,33 @@ TEST_F(List, mayGoAwayInTheMiddleOfAnything) {
     }
     showList();
     EXPECT_EQ(list->containedItemCount(), 2005U);
+}
+
+TEST_F(List, aStormOfAHundredThousandChangesLeavesPlaceAndSelection) {
+    open();
+    house.givenManyFiles("Big", 2000);
+    showList("Big");
+    list->setEditing(true, false);
+    list->setSelectedItems({house.url("Big/IMG 1000.jpg"), house.url("Big/IMG 1500.jpg")});
+    state().reveal(rowNamed("IMG 1200.jpg"), false);
+    const double y = yOf("IMG 1200.jpg");
+    std::atomic<bool> over = false;
+    std::thread storm([&, folder = house.path("Big/")] {
+        const std::string original = folder + "IMG 0.jpg";
+        for (int i = 0; i < 52'000; ++i)
+            EXPECT_EQ(::link(original.c_str(), (folder + "A " + std::to_string(i)).c_str()), 0);
+        for (int i = 0; i < 50'000; ++i)
+            EXPECT_EQ(::unlink((folder + "A " + std::to_string(i)).c_str()), 0);
+        over = true;
+    });
+    while (!over)
+        house.until([&] { return over.load(); });
+    storm.join();
+    EXPECT_TRUE(house.until([&] {
+        return list->containedItemCount() == 4000 && state().model.entryAt(0).name == "A 50000";
+    }));
+    EXPECT_EQ(yOf("IMG 1200.jpg"), y);
+    EXPECT_THAT(selected(), ElementsAre("IMG 1000.jpg", "IMG 1500.jpg"));
 }
 
 TEST_F(List, aHundredThousandEntriesScrollSelectAndTakeOneMore) {

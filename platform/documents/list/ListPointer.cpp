@@ -78,7 +78,10 @@ void ListPointer::decide(Point point) {
     const double along = std::abs(point.y - start_.y);
     if (std::max(across, along) < slop)
         return;
-    if (across > along && row_ && !state_.editing && state_.client->listActions() != 0)
+    // The row may have gone since it was pressed.
+    const bool swipes =
+        state_.indexOf(row_) && !state_.editing && state_.client->listActions() != 0;
+    if (across > along && swipes)
         beginSwiping(point);
     else if (finger_)
         beginScrolling(point);

@@ -1,6 +1,7 @@
 #include "platform/documents/model/EntryTable.h"
 
 #include <algorithm>
+#include <unordered_set>
 
 namespace platform {
 namespace {
@@ -73,7 +74,7 @@ public:
 
 private:
     void takeOut(Slot slot) {
-        if (std::erase(entering_, slot) != 0 || slot >= leaving_.size())
+        if (entering_.erase(slot) != 0 || slot >= leaving_.size())
             return;
         leaving_[slot] = true;
         takenOut_ = true;
@@ -82,13 +83,13 @@ private:
     void put(Slot slot, DocumentEntry entry) {
         table_.slots_[slot].entry = std::move(entry);
         table_.byName_.emplace(table_.slots_[slot].entry.name, slot);
-        entering_.push_back(slot);
+        entering_.insert(slot);
     }
 
     void insert(const DocumentEntry& entry) {
         const Slot slot = table_.takeSlot(entry);
         table_.byName_.emplace(table_.slots_[slot].entry.name, slot);
-        entering_.push_back(slot);
+        entering_.insert(slot);
     }
 
     void update(Slot slot, const DocumentEntry& entry) {
@@ -108,27 +109,28 @@ private:
         const auto before = [this](Slot a, Slot b) {
             return table_.names_.before(table_.slots_[a].entry, table_.slots_[b].entry);
         };
-        std::sort(entering_.begin(), entering_.end(), before);
+        std::vector<Slot> entering(entering_.begin(), entering_.end());
+        std::sort(entering.begin(), entering.end(), before);
         std::vector<std::size_t> places;
-        for (const Slot slot : entering_)
+        for (const Slot slot : entering)
             places.push_back(table_.positionFor(table_.slots_[slot].entry));
         std::vector<Slot>& order = table_.order_;
         const std::size_t former = order.size();
-        order.resize(former + entering_.size());
+        order.resize(former + entering.size());
         std::size_t end = former;
-        for (std::size_t i = entering_.size(); i-- > 0;) {
+        for (std::size_t i = entering.size(); i-- > 0;) {
             const auto at = [&](std::size_t index) {
                 return order.begin() + static_cast<std::ptrdiff_t>(index);
             };
             std::move_backward(at(places[i]), at(end), at(end + i + 1));
             end = places[i];
-            order[end + i] = entering_[i];
+            order[end + i] = entering[i];
         }
     }
 
     EntryTable& table_;
     std::vector<bool> leaving_;
-    std::vector<Slot> entering_;
+    std::unordered_set<Slot> entering_;
     std::vector<Slot> gone_;
     bool takenOut_ = false;
     bool shownDiffers_ = false;

@@ -6,8 +6,17 @@
 #include "platform/files/FileManager.h"
 
 #include <algorithm>
+#include <iterator>
+#include <mutex>
 
 namespace platform {
+
+/// Changes on their way to the main queue; more may join them until they are taken.
+struct Outbox {
+    std::mutex mutex;
+    std::vector<EntryChanges> changes;
+    bool taken = false;
+};
 
 /// What follows `Of the queue` is touched by jobs of the queue alone.
 struct FolderFeed::State : std::enable_shared_from_this<FolderFeed::State> {
@@ -32,6 +41,10 @@ struct FolderFeed::State : std::enable_shared_from_this<FolderFeed::State> {
     std::vector<DirectoryWatcher::Token> dependencyWatches;
     /// Of the folder that the last reading was made of.
     std::optional<FileIdentity> identity;
+    /// A reading is at the end of the queue: it will tell what the notices before it would.
+    bool readingDue = false;
+    /// The last one; none behind which something else was told.
+    std::shared_ptr<Outbox> outbox;
 
     /// Runs the job on the queue, unless the feed has ended by then.
     void enqueue(std::function<void(State&)> job) {
@@ -42,10 +55,43 @@ struct FolderFeed::State : std::enable_shared_from_this<FolderFeed::State> {
     }
 
     void tell(std::function<void(const Receiver&)> job) {
+        outbox.reset();
         main.async([weak = weak_from_this(), job = std::move(job)] {
             if (const auto self = weak.lock(); self && !self->cancel.isCancelled())
                 job(self->receiver);
         });
+    }
+
+    /// A storm of changes is told in as many pieces as the main thread has time for.
+    void tellChanges(EntryChanges changes) {
+        if (outbox && join(*outbox, changes))
+            return;
+        const auto box = std::make_shared<Outbox>();
+        box->changes.push_back(std::move(changes));
+        tell([box](const Receiver& to) {
+            std::vector<EntryChanges> all;
+            {
+                const std::lock_guard lock(box->mutex);
+                box->taken = true;
+                all.swap(box->changes);
+            }
+            to.changed(all);
+        });
+        outbox = box;
+    }
+
+    /// False when it is too late.
+    static bool join(Outbox& box, EntryChanges& changes) {
+        const std::lock_guard lock(box.mutex);
+        if (box.taken)
+            return false;
+        if (!changes.renamings.empty()) {
+            box.changes.push_back(std::move(changes));
+            return true;
+        }
+        std::vector<EntryFact>& facts = box.changes.back().facts;
+        std::move(changes.facts.begin(), changes.facts.end(), std::back_inserter(facts));
+        return true;
     }
 
     std::optional<FileIdentity> identityNow() const {
@@ -144,16 +190,20 @@ struct FolderFeed::State : std::enable_shared_from_this<FolderFeed::State> {
         });
         if (gone)
             watch.reset();
+        if (readingDue)
+            return;
         std::optional<EntryChanges> known;
         if (!gone)
             known = source->resolve(changes);
         if (!known) {
-            readAgain();
-            return;
+            readingDue = true;
+            enqueue([](State& state) {
+                state.readingDue = false;
+                state.readAgain();
+            });
+        } else if (!known->facts.empty() || !known->renamings.empty()) {
+            tellChanges(std::move(*known));
         }
-        if (known->facts.empty() && known->renamings.empty())
-            return;
-        tell([changes = std::move(*known)](const Receiver& to) { to.changed(changes); });
     }
 };
 

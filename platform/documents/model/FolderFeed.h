@@ -5,6 +5,7 @@
 
 #include <functional>
 #include <memory>
+#include <vector>
 
 namespace platform {
 
@@ -19,7 +20,8 @@ public:
         /// A whole reading, sorted. `replaced`: another folder stands in the place of the one that
         /// was read before.
         std::function<void(std::vector<DocumentEntry> sorted, bool replaced)> read;
-        std::function<void(const EntryChanges& changes)> changed;
+        /// One after the other, as many as there were since the last call.
+        std::function<void(const std::vector<EntryChanges>& changes)> changed;
         /// The folder is gone or cannot be read.
         std::function<void(const Error& error)> failed;
     };

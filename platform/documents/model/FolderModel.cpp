@@ -30,7 +30,7 @@ FolderModel::FolderModel(const Url& folder, const DocumentServices& services)
             {[this](std::vector<DocumentEntry> sorted, bool replaced) {
                  takeReading(std::move(sorted), replaced);
              },
-             [this](const EntryChanges& changes) { takeChanges(changes); },
+             [this](const auto& changes) { takeChanges(changes); },
              [this](const Error& error) { takeFailure(error); }}) {
 }
 
@@ -107,13 +107,15 @@ void FolderModel::takeReading(std::vector<DocumentEntry> sorted, bool replaced) 
     wantDetails();
 }
 
-void FolderModel::takeChanges(const EntryChanges& changes) {
+void FolderModel::takeChanges(const std::vector<EntryChanges>& changes) {
     // Notices of a folder that could not be read are older than the failure.
     if (state_ != ModelState::ready)
         return;
     if (observer_)
         observer_->rowsWillChange();
-    const bool changed = table_.apply(changes);
+    bool changed = false;
+    for (const EntryChanges& each : changes)
+        changed = table_.apply(each) || changed;
     endInView_ = std::min(endInView_, count());
     firstInView_ = std::min(firstInView_, endInView_);
     if (observer_ && changed)

@@ -46,7 +46,7 @@ public:
 
 private:
     void takeReading(std::vector<DocumentEntry> sorted, bool replaced);
-    void takeChanges(const EntryChanges& changes);
+    void takeChanges(const std::vector<EntryChanges>& changes);
     void takeFailure(const Error& error);
     void takeDetails(const std::vector<DetailsLoader::Answer>& answers);
     void setState(ModelState state, std::optional<Error> error);
