@@ -1,5 +1,7 @@
 #include "platform/base/DateFormat.h"
 
+#include "platform/base/Text.h"
+
 #include <QDateTime>
 #include <QLocale>
 #include <QRegularExpression>
@@ -48,7 +50,7 @@ std::string localizedDateText(Date date, DateStyle style) {
     const QString time = QLocale().toString(moment.time(), QLocale::ShortFormat);
     if (style == DateStyle::none)
         return time.toStdString();
-    return (dayText(moment, style) + QLatin1String(", ") + time).toStdString();
+    return localizedFormat("%1$@, %2$@", dayText(moment, style).toStdString(), time.toStdString());
 }
 
 } // namespace platform

@@ -95,13 +95,16 @@ std::string localized(std::string_view key) {
     return lookUp(key, -1);
 }
 
+std::string localizedNumber(long long number) {
+    return QLocale().toString(number).toStdString();
+}
+
 std::string localizedPlural(std::string_view key, long long count) {
     // The forms depend on the last digits and on small numbers only.
     const long long magnitude = std::llabs(count);
     const int chosen =
         static_cast<int>(magnitude > 1'000'000 ? magnitude % 1'000'000 + 1'000'000 : magnitude);
-    const std::string number = QLocale().toString(count).toStdString();
-    return replaceAll(lookUp(key, chosen), "%n", number);
+    return replaceAll(lookUp(key, chosen), "%n", localizedNumber(count));
 }
 
 std::string localizedPluralText(std::string_view key, double number, std::string_view text) {

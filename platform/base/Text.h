@@ -5,6 +5,7 @@
 #include <span>
 #include <string>
 #include <string_view>
+#include <type_traits>
 
 namespace platform {
 
@@ -25,11 +26,26 @@ std::string localizedPlural(std::string_view key, long long count);
 /// For ".DICT.….%g" keys.
 std::string localizedPluralText(std::string_view key, double number, std::string_view text);
 
+/// A whole number in the figures and groups of the user's language.
+std::string localizedNumber(long long number);
+
+/// What a localised format writes for an argument: a count in the language's own figures.
+template<class T>
+decltype(auto) localizedArgument(const T& value) {
+    if constexpr (std::is_integral_v<T> && !std::is_same_v<T, bool>)
+        return localizedNumber(static_cast<long long>(value));
+    else
+        return (value);
+}
+
 /// A localised format ("“%1$@” is %2$@") filled with the arguments.
 template<class... Args>
 std::string localizedFormat(std::string_view key, const Args&... args) {
-    const std::array<FormatArgument, sizeof...(Args)> arguments{makeFormatArgument(args)...};
-    return formatRuntime(localized(key), arguments);
+    const auto fill = [key](const auto&... shown) {
+        const std::array<FormatArgument, sizeof...(Args)> arguments{makeFormatArgument(shown)...};
+        return formatRuntime(localized(key), arguments);
+    };
+    return fill(localizedArgument(args)...);
 }
 
 } // namespace platform

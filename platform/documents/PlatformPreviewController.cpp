@@ -22,13 +22,12 @@ std::string typeOf(const Url& item) {
 
 /// "PDF document, 1.2 MB"
 std::string factsOf(const Url& item, const std::string& type) {
-    std::string facts = TypeRegistry::localizedDescription(type).value_or(std::string());
+    const std::string facts = TypeRegistry::localizedDescription(type).value_or(std::string());
     const auto attributes = FileManager::attributes(item.path(), FollowLinks::yes);
     if (!attributes || attributes->kind != FileKind::file)
         return facts;
-    if (!facts.empty())
-        facts += ", ";
-    return facts + byteCountText(attributes->size, ByteCountStyle::file);
+    const std::string size = byteCountText(attributes->size, ByteCountStyle::file);
+    return facts.empty() ? size : localizedFormat("%1$@, %2$@", facts, size);
 }
 
 } // namespace

@@ -1,0 +1,941 @@
+<?xml version="1.0" encoding="utf-8"?>
+<!DOCTYPE TS>
+<TS version="2.1" language="ar" sourcelanguage="en_US">
+<context>
+    <name>tavrin</name>
+    <message numerus="yes">
+        <source>.DICT.BYTES.%d</source>
+        <translation>
+            <numerusform>%n بايت</numerusform>
+            <numerusform>بايت واحد</numerusform>
+            <numerusform>بايتان</numerusform>
+            <numerusform>%n بايتات</numerusform>
+            <numerusform>%n بايتًا</numerusform>
+            <numerusform>%n بايت</numerusform>
+        </translation>
+    </message>
+    <message numerus="yes">
+        <source>.DICT.ITEMS.%d</source>
+        <translation>
+            <numerusform>لا عناصر</numerusform>
+            <numerusform>عنصر واحد</numerusform>
+            <numerusform>عنصران</numerusform>
+            <numerusform>%n عناصر</numerusform>
+            <numerusform>%n عنصرًا</numerusform>
+            <numerusform>%n عنصر</numerusform>
+        </translation>
+    </message>
+    <message numerus="yes">
+        <source>.DICT.ITEMS_SELECTED.%d</source>
+        <translation>
+            <numerusform>لم يُحدد أي عنصر</numerusform>
+            <numerusform>تم تحديد عنصر واحد</numerusform>
+            <numerusform>تم تحديد عنصرين</numerusform>
+            <numerusform>تم تحديد %n عناصر</numerusform>
+            <numerusform>تم تحديد %n عنصرًا</numerusform>
+            <numerusform>تم تحديد %n عنصر</numerusform>
+        </translation>
+    </message>
+    <message numerus="yes">
+        <source>.DICT.MOVE_ITEMS.%d</source>
+        <translation>
+            <numerusform>نقل %n عنصر</numerusform>
+            <numerusform>نقل عنصر واحد</numerusform>
+            <numerusform>نقل عنصرين</numerusform>
+            <numerusform>نقل %n عناصر</numerusform>
+            <numerusform>نقل %n عنصرًا</numerusform>
+            <numerusform>نقل %n عنصر</numerusform>
+        </translation>
+    </message>
+    <message numerus="yes">
+        <source>.DICT.CANNOT_MOVE_ITEMS.%d</source>
+        <translation>
+            <numerusform>تعذر نقل %n عنصر.</numerusform>
+            <numerusform>تعذر نقل عنصر واحد.</numerusform>
+            <numerusform>تعذر نقل عنصرين.</numerusform>
+            <numerusform>تعذر نقل %n عناصر.</numerusform>
+            <numerusform>تعذر نقل %n عنصرًا.</numerusform>
+            <numerusform>تعذر نقل %n عنصر.</numerusform>
+        </translation>
+    </message>
+    <message numerus="yes">
+        <source>.DICT.CANNOT_DELETE_ITEMS.%d</source>
+        <translation>
+            <numerusform>تعذر حذف %n عنصر.</numerusform>
+            <numerusform>تعذر حذف عنصر واحد.</numerusform>
+            <numerusform>تعذر حذف عنصرين.</numerusform>
+            <numerusform>تعذر حذف %n عناصر.</numerusform>
+            <numerusform>تعذر حذف %n عنصرًا.</numerusform>
+            <numerusform>تعذر حذف %n عنصر.</numerusform>
+        </translation>
+    </message>
+    <message numerus="yes">
+        <source>.DICT.AVAILABLE.%g</source>
+        <translation>
+            <numerusform>المتاح %@</numerusform>
+            <numerusform>المتاح %@</numerusform>
+            <numerusform>المتاح %@</numerusform>
+            <numerusform>المتاح %@</numerusform>
+            <numerusform>المتاح %@</numerusform>
+            <numerusform>المتاح %@</numerusform>
+        </translation>
+    </message>
+    <!-- Names, sizes, places -->
+    <message>
+        <source>%@ KB</source>
+        <translation>%@&#xa0;كيلوبايت</translation>
+    </message>
+    <message>
+        <source>%@ MB</source>
+        <translation>%@&#xa0;ميغابايت</translation>
+    </message>
+    <message>
+        <source>%@ GB</source>
+        <translation>%@&#xa0;غيغابايت</translation>
+    </message>
+    <message>
+        <source>%@ TB</source>
+        <translation>%@&#xa0;تيرابايت</translation>
+    </message>
+    <message>
+        <source>%@ PB</source>
+        <translation>%@&#xa0;بيتابايت</translation>
+    </message>
+    <message>
+        <source>%@ EB</source>
+        <translation>%@&#xa0;إكسابايت</translation>
+    </message>
+    <message>
+        <source>%1$@ of %2$@</source>
+        <translation>%1$@ من %2$@</translation>
+    </message>
+    <message>
+        <source>%1$@, %2$@</source>
+        <translation>%1$@، %2$@</translation>
+    </message>
+    <message>
+        <source>Documents</source>
+        <translation>المستندات</translation>
+    </message>
+    <message>
+        <source>Kind</source>
+        <translation>النوع</translation>
+    </message>
+    <message>
+        <source>Size</source>
+        <translation>الحجم</translation>
+    </message>
+    <message>
+        <source>Where</source>
+        <translation>الموقع</translation>
+    </message>
+    <message>
+        <source>Created</source>
+        <translation>تاريخ الإنشاء</translation>
+    </message>
+    <message>
+        <source>Modified</source>
+        <translation>تاريخ التعديل</translation>
+    </message>
+    <message>
+        <source>Tags</source>
+        <translation>الوسوم</translation>
+    </message>
+    <message>
+        <source>Shared</source>
+        <translation>مشترك</translation>
+    </message>
+    <!-- Kinds of documents -->
+    <message>
+        <source>Document</source>
+        <translation>مستند</translation>
+    </message>
+    <message>
+        <source>Folder</source>
+        <translation>مجلد</translation>
+    </message>
+    <message>
+        <source>Package</source>
+        <translation>حزمة</translation>
+    </message>
+    <message>
+        <source>Rich text document with attachments</source>
+        <translation>نص منسق مع مرفقات</translation>
+    </message>
+    <message>
+        <source>Document package</source>
+        <translation>حزمة مستند</translation>
+    </message>
+    <message>
+        <source>Text</source>
+        <translation>نص</translation>
+    </message>
+    <message>
+        <source>Source code</source>
+        <translation>شفرة مصدرية</translation>
+    </message>
+    <message>
+        <source>Image</source>
+        <translation>صورة</translation>
+    </message>
+    <message>
+        <source>Movie</source>
+        <translation>فيديو</translation>
+    </message>
+    <message>
+        <source>Audio</source>
+        <translation>صوت</translation>
+    </message>
+    <message>
+        <source>Audio or video</source>
+        <translation>صوت أو فيديو</translation>
+    </message>
+    <message>
+        <source>Archive</source>
+        <translation>أرشيف</translation>
+    </message>
+    <message>
+        <source>Font</source>
+        <translation>خط</translation>
+    </message>
+    <!-- Buttons and actions -->
+    <message>
+        <source>OK</source>
+        <translation>موافق</translation>
+    </message>
+    <message>
+        <source>Cancel</source>
+        <translation>إلغاء</translation>
+    </message>
+    <message>
+        <source>Done</source>
+        <translation>تم</translation>
+    </message>
+    <message>
+        <source>Create</source>
+        <translation>إنشاء</translation>
+    </message>
+    <message>
+        <source>Back</source>
+        <translation>رجوع</translation>
+    </message>
+    <message>
+        <source>More</source>
+        <translation>المزيد</translation>
+    </message>
+    <message>
+        <source>Info</source>
+        <translation>معلومات</translation>
+    </message>
+    <message>
+        <source>Select</source>
+        <translation>تحديد</translation>
+    </message>
+    <message>
+        <source>Select Items</source>
+        <translation>تحديد العناصر</translation>
+    </message>
+    <message>
+        <source>Move</source>
+        <translation>نقل</translation>
+    </message>
+    <message>
+        <source>Move Here</source>
+        <translation>نقل إلى هنا</translation>
+    </message>
+    <message>
+        <source>Move to Folder…</source>
+        <translation>نقل إلى مجلد…</translation>
+    </message>
+    <message>
+        <source>Move “%1$@”</source>
+        <translation>نقل «&#x2068;%1$@&#x2069;»</translation>
+    </message>
+    <message>
+        <source>Delete</source>
+        <translation>حذف</translation>
+    </message>
+    <message>
+        <source>Delete from Tavrin</source>
+        <translation>حذف من Tavrin</translation>
+    </message>
+    <message>
+        <source>Rename</source>
+        <translation>إعادة تسمية</translation>
+    </message>
+    <message>
+        <source>Rename Item</source>
+        <translation>إعادة تسمية العنصر</translation>
+    </message>
+    <message>
+        <source>Rename Item…</source>
+        <translation>إعادة تسمية العنصر…</translation>
+    </message>
+    <message>
+        <source>Share</source>
+        <translation>مشاركة</translation>
+    </message>
+    <message>
+        <source>Share Item…</source>
+        <translation>مشاركة العنصر…</translation>
+    </message>
+    <message>
+        <source>Copy</source>
+        <translation>نسخ</translation>
+    </message>
+    <message>
+        <source>Copy Path</source>
+        <translation>نسخ المسار</translation>
+    </message>
+    <message>
+        <source>Send by Mail</source>
+        <translation>إرسال بالبريد</translation>
+    </message>
+    <message>
+        <source>Open in “%@”</source>
+        <translation>فتح في «&#x2068;%@&#x2069;»</translation>
+    </message>
+    <message>
+        <source>Open in “%1$@”</source>
+        <translation>فتح في «&#x2068;%1$@&#x2069;»</translation>
+    </message>
+    <message>
+        <source>Search</source>
+        <translation>بحث</translation>
+    </message>
+    <message>
+        <source>Try Again</source>
+        <translation>إعادة المحاولة</translation>
+    </message>
+    <message>
+        <source>Clear text</source>
+        <translation>مسح النص</translation>
+    </message>
+    <message>
+        <source>Zoom in</source>
+        <translation>تكبير</translation>
+    </message>
+    <message>
+        <source>Zoom out</source>
+        <translation>تصغير</translation>
+    </message>
+    <!-- New folders and names -->
+    <message>
+        <source>New Folder</source>
+        <translation>مجلد جديد</translation>
+    </message>
+    <message>
+        <source>Folder Name</source>
+        <translation>اسم المجلد</translation>
+    </message>
+    <message>
+        <source>Enter a name for this folder.</source>
+        <translation>أدخل اسمًا لهذا المجلد.</translation>
+    </message>
+    <message>
+        <source>Enter a new name for this item.</source>
+        <translation>أدخل اسمًا جديدًا لهذا العنصر.</translation>
+    </message>
+    <message>
+        <source>Character not allowed in filename</source>
+        <translation>رمز غير مسموح به في اسم الملف</translation>
+    </message>
+    <message>
+        <source>Choose a different name.</source>
+        <translation>اختر اسمًا آخر.</translation>
+    </message>
+    <message>
+        <source>The name “%@” is already taken.</source>
+        <translation>الاسم «&#x2068;%@&#x2069;» مستخدم بالفعل.</translation>
+    </message>
+    <message>
+        <source>The name “%1$@” with extension “.%2$@” is already taken.</source>
+        <translation>الاسم «&#x2068;%1$@&#x2069;» بالامتداد «&#x2068;.%2$@&#x2069;» مستخدم بالفعل.</translation>
+    </message>
+    <message>
+        <source>The name “%@” can’t be used. Try using a name with fewer characters, or with no punctuation marks.</source>
+        <translation>لا يمكن استخدام الاسم «&#x2068;%@&#x2069;». جرّب اسمًا أقصر أو بلا علامات ترقيم.</translation>
+    </message>
+    <message>
+        <source>The folder could not be made.</source>
+        <translation>تعذر إنشاء المجلد.</translation>
+    </message>
+    <!-- Deleting -->
+    <message>
+        <source>%@ will be permanently deleted from Tavrin on all your devices. This action cannot be undone.</source>
+        <translation>سيُحذف نهائيًا من Tavrin على جميع أجهزتك: %@. لا يمكن التراجع عن هذا الإجراء.</translation>
+    </message>
+    <message>
+        <source>&quot;%@&quot; will be permanently deleted from Tavrin on all your devices. This action cannot be undone.</source>
+        <translation>سيُحذف «&#x2068;%@&#x2069;» نهائيًا من Tavrin على جميع أجهزتك. لا يمكن التراجع عن هذا الإجراء.</translation>
+    </message>
+    <message>
+        <source>The %@ app library, and all its documents, will be permanently deleted from Tavrin on all your devices. This action cannot be undone.</source>
+        <translation>ستُحذف مكتبة التطبيق «&#x2068;%@&#x2069;» وجميع مستنداتها نهائيًا من Tavrin على جميع أجهزتك. لا يمكن التراجع عن هذا الإجراء.</translation>
+    </message>
+    <!-- Lists and the search -->
+    <message>
+        <source>No documents here</source>
+        <translation>لا توجد مستندات هنا</translation>
+    </message>
+    <message>
+        <source>What applications keep in the cloud appears here.</source>
+        <translation>يظهر هنا ما تحفظه التطبيقات في السحابة.</translation>
+    </message>
+    <message>
+        <source>Documents that are added to this folder, here or on another device, appear here.</source>
+        <translation>تظهر هنا المستندات التي تُضاف إلى هذا المجلد من هذا الجهاز أو من جهاز آخر.</translation>
+    </message>
+    <message>
+        <source>This folder is no longer here</source>
+        <translation>لم يعد هذا المجلد هنا</translation>
+    </message>
+    <message>
+        <source>This folder cannot be shown</source>
+        <translation>لا يمكن عرض هذا المجلد</translation>
+    </message>
+    <message>
+        <source>Search all documents</source>
+        <translation>البحث في جميع المستندات</translation>
+    </message>
+    <message>
+        <source>Type a part of a name</source>
+        <translation>اكتب جزءًا من الاسم</translation>
+    </message>
+    <message>
+        <source>Documents and folders of the whole store are found, also those that are not downloaded.</source>
+        <translation>يشمل البحث مستندات المخزن ومجلداته كلها، حتى ما لم يُنزَّل منها.</translation>
+    </message>
+    <message>
+        <source>Nothing found</source>
+        <translation>لا توجد نتائج</translation>
+    </message>
+    <message>
+        <source>No name in the store contains “%1$@”.</source>
+        <translation>لا يوجد في المخزن اسم يحتوي على «&#x2068;%1$@&#x2069;».</translation>
+    </message>
+    <message>
+        <source>Downloading</source>
+        <translation>قيد التنزيل</translation>
+    </message>
+    <message>
+        <source>Not downloaded</source>
+        <translation>غير منزَّل</translation>
+    </message>
+    <!-- Choosing where to move -->
+    <message>
+        <source>Nothing here yet</source>
+        <translation>لا شيء هنا بعد</translation>
+    </message>
+    <message>
+        <source>An item with this name is here already.</source>
+        <translation>يوجد هنا بالفعل عنصر بهذا الاسم.</translation>
+    </message>
+    <message>
+        <source>Items with these names are here already.</source>
+        <translation>توجد هنا بالفعل عناصر بهذه الأسماء.</translation>
+    </message>
+    <message>
+        <source>Open the folder into which to move.</source>
+        <translation>افتح المجلد الذي تريد النقل إليه.</translation>
+    </message>
+    <message>
+        <source>This folder does not take documents.</source>
+        <translation>لا يقبل هذا المجلد المستندات.</translation>
+    </message>
+    <message>
+        <source>A folder cannot be moved into itself.</source>
+        <translation>لا يمكن نقل مجلد إلى داخل نفسه.</translation>
+    </message>
+    <message>
+        <source>“%1$@” is here already.</source>
+        <translation>«&#x2068;%1$@&#x2069;» موجود هنا بالفعل.</translation>
+    </message>
+    <message>
+        <source>These items are here already.</source>
+        <translation>هذه العناصر موجودة هنا بالفعل.</translation>
+    </message>
+    <message>
+        <source>“%1$@” does not take folders.</source>
+        <translation>لا يقبل «&#x2068;%1$@&#x2069;» المجلدات.</translation>
+    </message>
+    <message>
+        <source>“%1$@” does not take folders within folders.</source>
+        <translation>لا يقبل «&#x2068;%1$@&#x2069;» المجلدات داخل المجلدات.</translation>
+    </message>
+    <message>
+        <source>“%1$@” does not take documents of this kind.</source>
+        <translation>لا يقبل «&#x2068;%1$@&#x2069;» المستندات من هذا النوع.</translation>
+    </message>
+    <message>
+        <source>“%1$@” does not take all of these documents.</source>
+        <translation>لا يقبل «&#x2068;%1$@&#x2069;» جميع هذه المستندات.</translation>
+    </message>
+    <!-- Showing and downloading -->
+    <message>
+        <source>Loading…</source>
+        <translation>جارٍ التحميل…</translation>
+    </message>
+    <message>
+        <source>Waiting…</source>
+        <translation>قيد الانتظار…</translation>
+    </message>
+    <message>
+        <source>Download</source>
+        <translation>تنزيل</translation>
+    </message>
+    <message>
+        <source>Download to View</source>
+        <translation>تنزيل للعرض</translation>
+    </message>
+    <message>
+        <source>Cancel Download</source>
+        <translation>إلغاء التنزيل</translation>
+    </message>
+    <message>
+        <source>Downloading “%1$@”</source>
+        <translation>تنزيل «&#x2068;%1$@&#x2069;»</translation>
+    </message>
+    <message>
+        <source>This item is over %@.</source>
+        <translation>حجم هذا العنصر أكبر من %@.</translation>
+    </message>
+    <message>
+        <source>“%@” will not download until you connect to Wi-Fi.</source>
+        <translation>لن يتم تنزيل «&#x2068;%@&#x2069;» حتى تتصل بشبكة Wi-Fi.</translation>
+    </message>
+    <message>
+        <source>Unable to download file. You are no longer connected to the Internet.</source>
+        <translation>تعذر تنزيل الملف. لم تعد متصلًا بالإنترنت.</translation>
+    </message>
+    <message>
+        <source>Picture “%1$@”</source>
+        <translation>الصورة «&#x2068;%1$@&#x2069;»</translation>
+    </message>
+    <message>
+        <source>There is no document to show</source>
+        <translation>لا يوجد مستند لعرضه</translation>
+    </message>
+    <message>
+        <source>This kind of document cannot be shown here.</source>
+        <translation>لا يمكن عرض هذا النوع من المستندات هنا.</translation>
+    </message>
+    <message>
+        <source>This document cannot be shown.</source>
+        <translation>لا يمكن عرض هذا المستند.</translation>
+    </message>
+    <message>
+        <source>This document is protected by a password. It can be read in an application that asks for it.</source>
+        <translation>هذا المستند محمي بكلمة سر. يمكن قراءته في تطبيق يطلبها.</translation>
+    </message>
+    <message>
+        <source>This is a folder, not a document.</source>
+        <translation>هذا مجلد وليس مستندًا.</translation>
+    </message>
+    <message>
+        <source>There is nothing in this document.</source>
+        <translation>هذا المستند فارغ.</translation>
+    </message>
+    <message>
+        <source>This document is not on this device. Download it first.</source>
+        <translation>هذا المستند ليس على هذا الجهاز. نزّله أولًا.</translation>
+    </message>
+    <message>
+        <source>“%1$@” is damaged, or not what its name says.</source>
+        <translation>«&#x2068;%1$@&#x2069;» تالف أو لا يطابق ما يدل عليه اسمه.</translation>
+    </message>
+    <message>
+        <source>“%1$@” could not be opened</source>
+        <translation>تعذر فتح «&#x2068;%1$@&#x2069;»</translation>
+    </message>
+    <message>
+        <source>“%1$@” could not be copied</source>
+        <translation>تعذر نسخ «&#x2068;%1$@&#x2069;»</translation>
+    </message>
+    <message>
+        <source>“%1$@” could not be sent</source>
+        <translation>تعذر إرسال «&#x2068;%1$@&#x2069;»</translation>
+    </message>
+    <message>
+        <source>“%1$@” could not be started. %2$@</source>
+        <translation>تعذر تشغيل «&#x2068;%1$@&#x2069;». %2$@</translation>
+    </message>
+    <message>
+        <source>“%1$@” ended as soon as it had been started (exit status %2$@).</source>
+        <translation>انتهى «&#x2068;%1$@&#x2069;» فور تشغيله (رمز الخروج %2$@).</translation>
+    </message>
+    <!-- The account and the network -->
+    <message>
+        <source>Offline</source>
+        <translation>غير متصل</translation>
+    </message>
+    <message>
+        <source>Cellular</source>
+        <translation>شبكة خلوية</translation>
+    </message>
+    <message>
+        <source>Wi-Fi</source>
+        <translation>Wi-Fi</translation>
+    </message>
+    <message>
+        <source>Network activity</source>
+        <translation>نشاط الشبكة</translation>
+    </message>
+    <message>
+        <source>Not signed in</source>
+        <translation>لم يُسجَّل الدخول</translation>
+    </message>
+    <message>
+        <source>Pelmora is not enabled</source>
+        <translation>لم يتم تفعيل Pelmora</translation>
+    </message>
+    <message>
+        <source>Sign in to a folder that holds your documents, such as a disk or a network folder. In a terminal, type:</source>
+        <translation>سجّل الدخول إلى مجلد يحوي مستنداتك، كقرص أو مجلد على الشبكة. اكتب في نافذة الأوامر:</translation>
+    </message>
+    <message>
+        <source>PATH is that folder. The documents appear here as soon as you are signed in.</source>
+        <translation>&#x200f;PATH هو ذلك المجلد. تظهر المستندات هنا فور تسجيل دخولك.</translation>
+    </message>
+    <message>
+        <source>No Pelmora account is signed in.</source>
+        <translation>لم يُسجَّل الدخول إلى أي حساب Pelmora.</translation>
+    </message>
+    <message>
+        <source>No Pelmora account is signed in. Sign in with the command “pelmora sign-in”.</source>
+        <translation>لم يُسجَّل الدخول إلى أي حساب Pelmora. سجّل الدخول بالأمر «&#x2068;pelmora sign-in&#x2069;».</translation>
+    </message>
+    <message>
+        <source>The account is of the kind “%1$@”, which this version does not know. Update the program or sign in again.</source>
+        <translation>الحساب من النوع «&#x2068;%1$@&#x2069;» الذي لا يعرفه هذا الإصدار. حدّث البرنامج أو سجّل الدخول من جديد.</translation>
+    </message>
+    <message>
+        <source>This version cannot use accounts of the kind “%1$@” yet. Update the program or sign in to a folder.</source>
+        <translation>لا يستطيع هذا الإصدار بعد استخدام الحسابات من النوع «&#x2068;%1$@&#x2069;». حدّث البرنامج أو سجّل الدخول إلى مجلد.</translation>
+    </message>
+    <message>
+        <source>The account's folder “%1$@” is not an absolute path. Sign in again with the whole path.</source>
+        <translation>مجلد الحساب «&#x2068;%1$@&#x2069;» ليس مسارًا مطلقًا. سجّل الدخول من جديد بالمسار الكامل.</translation>
+    </message>
+    <message>
+        <source>The account file “%1$@” does not say who is signed in. Sign in again.</source>
+        <translation>لا يذكر ملف الحساب «&#x2068;%1$@&#x2069;» صاحب الحساب. سجّل الدخول من جديد.</translation>
+    </message>
+    <message>
+        <source>The account file “%1$@” cannot be read. Check its permissions.</source>
+        <translation>لا يمكن قراءة ملف الحساب «&#x2068;%1$@&#x2069;». تحقق من أذوناته.</translation>
+    </message>
+    <message>
+        <source>The account file “%1$@” is damaged. Sign in again.</source>
+        <translation>ملف الحساب «&#x2068;%1$@&#x2069;» تالف. سجّل الدخول من جديد.</translation>
+    </message>
+    <message>
+        <source>The folder “%1$@” of your Pelmora account is not there. Connect its disk, or sign in again if it has moved.</source>
+        <translation>المجلد «&#x2068;%1$@&#x2069;» لحسابك في Pelmora غير موجود. وصّل قرصه، أو سجّل الدخول من جديد إن كان قد نُقل.</translation>
+    </message>
+    <message>
+        <source>What is at “%1$@” now is not what this account was linked with. Connect the right disk, or sign in to another folder.</source>
+        <translation>الموجود الآن في «&#x2068;%1$@&#x2069;» ليس ما رُبط به هذا الحساب. وصّل القرص الصحيح، أو سجّل الدخول إلى مجلد آخر.</translation>
+    </message>
+    <message>
+        <source>The file “%1$@” of the account is damaged. Repair or remove it.</source>
+        <translation>الملف «&#x2068;%1$@&#x2069;» في الحساب تالف. أصلحه أو أزله.</translation>
+    </message>
+    <message>
+        <source>The account does not tell how much room is left.</source>
+        <translation>لا يُبلغ الحساب عن المساحة المتبقية.</translation>
+    </message>
+    <message>
+        <source>The Pelmora server cannot be reached. Check the connection and try again.</source>
+        <translation>لا يمكن الوصول إلى خادم Pelmora. تحقق من الاتصال وأعد المحاولة.</translation>
+    </message>
+    <message>
+        <source>The Pelmora server did not accept the user name or the password.</source>
+        <translation>لم يقبل خادم Pelmora اسم المستخدم أو كلمة السر.</translation>
+    </message>
+    <message>
+        <source>The Pelmora server refused the request for “%1$@”.</source>
+        <translation>رفض خادم Pelmora الطلب الخاص بـ«&#x2068;%1$@&#x2069;».</translation>
+    </message>
+    <message>
+        <source>The Pelmora server cannot store an item named “%1$@”. Choose a different name.</source>
+        <translation>لا يستطيع خادم Pelmora حفظ عنصر باسم «&#x2068;%1$@&#x2069;». اختر اسمًا آخر.</translation>
+    </message>
+    <message>
+        <source>There is no space left in your Pelmora account. Delete something to make room.</source>
+        <translation>لم تعد هناك مساحة في حسابك في Pelmora. احذف شيئًا لإفساح المجال.</translation>
+    </message>
+    <!-- The store and its documents -->
+    <message>
+        <source>The store has not been set up yet.</source>
+        <translation>لم يُجهَّز المخزن بعد.</translation>
+    </message>
+    <message>
+        <source>The store cannot be changed now.</source>
+        <translation>لا يمكن تغيير المخزن الآن.</translation>
+    </message>
+    <message>
+        <source>The store is in use by another program (process %1$@). Wait until it has finished, or close it.</source>
+        <translation>المخزن قيد الاستخدام من برنامج آخر (العملية %1$@). انتظر حتى ينتهي، أو أغلقه.</translation>
+    </message>
+    <message>
+        <source>The store was used by a later version of this program. Update the program to open it.</source>
+        <translation>استُخدم المخزن بإصدار أحدث من هذا البرنامج. حدّث البرنامج لفتحه.</translation>
+    </message>
+    <message>
+        <source>The store's records cannot be opened.</source>
+        <translation>لا يمكن فتح سجلات المخزن.</translation>
+    </message>
+    <message>
+        <source>The store's records were damaged. They were set aside as “%1$@” and are made anew from the disk and the account.</source>
+        <translation>كانت سجلات المخزن تالفة. وُضعت جانبًا باسم «&#x2068;%1$@&#x2069;» وتُنشأ من جديد من القرص والحساب.</translation>
+    </message>
+    <message>
+        <source>The folder “%1$@” is not the one that this store was made with. Put it back, or move “%2$@” away to begin anew; nothing was changed.</source>
+        <translation>المجلد «&#x2068;%1$@&#x2069;» ليس الذي أُنشئ به هذا المخزن. أعِد المجلد الأصلي، أو أبعد «&#x2068;%2$@&#x2069;» للبدء من جديد؛ لم يتغير شيء.</translation>
+    </message>
+    <message>
+        <source>“%1$@” belongs to the store itself and cannot be moved.</source>
+        <translation>«&#x2068;%1$@&#x2069;» جزء من المخزن نفسه ولا يمكن نقله.</translation>
+    </message>
+    <message>
+        <source>“%1$@” belongs to the store itself and cannot be deleted.</source>
+        <translation>«&#x2068;%1$@&#x2069;» جزء من المخزن نفسه ولا يمكن حذفه.</translation>
+    </message>
+    <message>
+        <source>“%1$@” has to be downloaded before it can leave your documents.</source>
+        <translation>يجب تنزيل «&#x2068;%1$@&#x2069;» قبل إخراجه من مستنداتك.</translation>
+    </message>
+    <message>
+        <source>“%1$@” stays on this device: your account does not have this version yet.</source>
+        <translation>يبقى «&#x2068;%1$@&#x2069;» على هذا الجهاز: لا يملك حسابك هذا الإصدار بعد.</translation>
+    </message>
+    <message>
+        <source>“%1$@” is no document that could be fetched again.</source>
+        <translation>«&#x2068;%1$@&#x2069;» ليس مستندًا يمكن تنزيله من جديد.</translation>
+    </message>
+    <message>
+        <source>“%1$@” has not been uploaded yet, so its copy on this device is kept.</source>
+        <translation>لم يُرفع «&#x2068;%1$@&#x2069;» بعد، لذلك تبقى نسخته على هذا الجهاز.</translation>
+    </message>
+    <message>
+        <source>“%1$@” was changed on another device. Both versions are kept.</source>
+        <translation>تغيّر «&#x2068;%1$@&#x2069;» على جهاز آخر. ستبقى النسختان.</translation>
+    </message>
+    <!-- Why an item is left out -->
+    <message>
+        <source>It is a symbolic link.</source>
+        <translation>إنه رابط رمزي.</translation>
+    </message>
+    <message>
+        <source>It is neither a file nor a folder.</source>
+        <translation>ليس ملفًا ولا مجلدًا.</translation>
+    </message>
+    <message>
+        <source>It lies on another disk than the account's folder.</source>
+        <translation>يقع على قرص غير قرص مجلد الحساب.</translation>
+    </message>
+    <message>
+        <source>It took the place of something else on the account.</source>
+        <translation>حلّ محل شيء آخر في الحساب.</translation>
+    </message>
+    <message>
+        <source>The disk cannot have an item of that name.</source>
+        <translation>لا يمكن أن يحوي القرص عنصرًا بهذا الاسم.</translation>
+    </message>
+    <message>
+        <source>The name is too long for the disk.</source>
+        <translation>الاسم أطول مما يسمح به القرص.</translation>
+    </message>
+    <message>
+        <source>The name is one that the store uses itself.</source>
+        <translation>يستخدم المخزن نفسه هذا الاسم.</translation>
+    </message>
+    <message>
+        <source>The name is one that the account uses itself.</source>
+        <translation>يستخدم الحساب نفسه هذا الاسم.</translation>
+    </message>
+    <message>
+        <source>Names that begin with “.” and end in “.promise” are kept for promises.</source>
+        <translation>الأسماء التي تبدأ بـ«&#x2068;.&#x2069;» وتنتهي بـ«&#x2068;.promise&#x2069;» محجوزة للعناصر النائبة.</translation>
+    </message>
+    <message>
+        <source>Files on the device have the names that its promise would need.</source>
+        <translation>تحمل ملفات على الجهاز الأسماء التي يحتاج إليها العنصر النائب.</translation>
+    </message>
+    <message>
+        <source>Something else has that name on the device.</source>
+        <translation>يحمل شيء آخر على الجهاز هذا الاسم.</translation>
+    </message>
+    <message>
+        <source>A folder on the device has that name.</source>
+        <translation>يحمل مجلد على الجهاز هذا الاسم.</translation>
+    </message>
+    <message>
+        <source>A file on the device has that name.</source>
+        <translation>يحمل ملف على الجهاز هذا الاسم.</translation>
+    </message>
+    <!-- What can go wrong with a file -->
+    <message>
+        <source>“%1$@” is no longer there. It may have been moved or deleted.</source>
+        <translation>لم يعد «&#x2068;%1$@&#x2069;» موجودًا. ربما نُقل أو حُذف.</translation>
+    </message>
+    <message>
+        <source>“%1$@” cannot be used here.</source>
+        <translation>لا يمكن استخدام «&#x2068;%1$@&#x2069;» هنا.</translation>
+    </message>
+    <message>
+        <source>You do not have permission to read “%1$@”.</source>
+        <translation>ليس لديك إذن بقراءة «&#x2068;%1$@&#x2069;».</translation>
+    </message>
+    <message>
+        <source>“%1$@” is damaged and cannot be read.</source>
+        <translation>«&#x2068;%1$@&#x2069;» تالف ولا يمكن قراءته.</translation>
+    </message>
+    <message>
+        <source>“%1$@” could not be read or written because of a disk error.</source>
+        <translation>تعذرت قراءة «&#x2068;%1$@&#x2069;» أو كتابته بسبب خطأ في القرص.</translation>
+    </message>
+    <message>
+        <source>You do not have permission to change “%1$@”.</source>
+        <translation>ليس لديك إذن بتغيير «&#x2068;%1$@&#x2069;».</translation>
+    </message>
+    <message>
+        <source>The name “%1$@” cannot be used. Choose a different name.</source>
+        <translation>لا يمكن استخدام الاسم «&#x2068;%1$@&#x2069;». اختر اسمًا آخر.</translation>
+    </message>
+    <message>
+        <source>An item named “%1$@” already exists. Choose a different name.</source>
+        <translation>يوجد بالفعل عنصر باسم «&#x2068;%1$@&#x2069;». اختر اسمًا آخر.</translation>
+    </message>
+    <message>
+        <source>The name “%1$@” is too long. Choose a shorter one.</source>
+        <translation>الاسم «&#x2068;%1$@&#x2069;» طويل جدًا. اختر اسمًا أقصر.</translation>
+    </message>
+    <message>
+        <source>The folder “%1$@” is not empty.</source>
+        <translation>المجلد «&#x2068;%1$@&#x2069;» ليس فارغًا.</translation>
+    </message>
+    <message>
+        <source>There is not enough free space on the disk for “%1$@”. Free some space and try again.</source>
+        <translation>لا توجد مساحة كافية على القرص لـ«&#x2068;%1$@&#x2069;». حرّر بعض المساحة وأعد المحاولة.</translation>
+    </message>
+    <message>
+        <source>“%1$@” cannot be changed because its disk is read-only.</source>
+        <translation>لا يمكن تغيير «&#x2068;%1$@&#x2069;» لأن قرصه للقراءة فقط.</translation>
+    </message>
+    <message>
+        <source>The operation was cancelled.</source>
+        <translation>أُلغيت العملية.</translation>
+    </message>
+    <message>
+        <source>A file cannot take the place of a folder, nor a folder that of a file.</source>
+        <translation>لا يمكن أن يحل ملف محل مجلد، ولا مجلد محل ملف.</translation>
+    </message>
+    <message>
+        <source>The operation on “%1$@” took too long. Try again.</source>
+        <translation>استغرقت العملية على «&#x2068;%1$@&#x2069;» وقتًا طويلًا. أعد المحاولة.</translation>
+    </message>
+    <message>
+        <source>“%1$@” is in use. Close it elsewhere and try again.</source>
+        <translation>«&#x2068;%1$@&#x2069;» قيد الاستخدام. أغلقه في مكان آخر وأعد المحاولة.</translation>
+    </message>
+    <message>
+        <source>“%1$@” was changed while it was being read. Try again.</source>
+        <translation>تغيّر «&#x2068;%1$@&#x2069;» أثناء قراءته. أعد المحاولة.</translation>
+    </message>
+    <message>
+        <source>“%1$@” lies on another disk and has to be copied there.</source>
+        <translation>يقع «&#x2068;%1$@&#x2069;» على قرص آخر ويجب نسخه إلى هناك.</translation>
+    </message>
+    <message>
+        <source>The disk cannot swap “%1$@” and “%2$@”.</source>
+        <translation>لا يستطيع القرص تبديل «&#x2068;%1$@&#x2069;» و«&#x2068;%2$@&#x2069;».</translation>
+    </message>
+    <message>
+        <source>The disk that holds “%1$@” cannot keep this information.</source>
+        <translation>لا يستطيع القرص الذي يحوي «&#x2068;%1$@&#x2069;» حفظ هذه المعلومات.</translation>
+    </message>
+    <!-- Starting, and being asked to open something -->
+    <message>
+        <source>Tavrin runs already and was asked to come forward.</source>
+        <translation>&#x200f;Tavrin قيد التشغيل بالفعل وطُلب منه الظهور في المقدمة.</translation>
+    </message>
+    <message>
+        <source>Tavrin runs already, but did not take the request: %1$@</source>
+        <translation>&#x200f;Tavrin قيد التشغيل بالفعل، لكنه لم يقبل الطلب: %1$@</translation>
+    </message>
+    <message>
+        <source>Tavrin runs already, but does not answer. Close its window or end it, and try again.</source>
+        <translation>&#x200f;Tavrin قيد التشغيل بالفعل، لكنه لا يستجيب. أغلق نافذته أو أنهِه، ثم أعد المحاولة.</translation>
+    </message>
+    <message>
+        <source>Tavrin is busy with other requests. Try again.</source>
+        <translation>&#x200f;Tavrin مشغول بطلبات أخرى. أعد المحاولة.</translation>
+    </message>
+    <message>
+        <source>Tavrin was started but does not answer.</source>
+        <translation>شُغّل Tavrin لكنه لا يستجيب.</translation>
+    </message>
+    <message>
+        <source>Tavrin could not start (exit status %1$@).</source>
+        <translation>تعذر تشغيل Tavrin (رمز الخروج %1$@).</translation>
+    </message>
+    <message>
+        <source>“%1$@” could not be started (%2$@). Install Tavrin again.</source>
+        <translation>تعذر تشغيل «&#x2068;%1$@&#x2069;» (&#x2068;%2$@&#x2069;). ثبّت Tavrin من جديد.</translation>
+    </message>
+    <message>
+        <source>“%1$@” is no address of the kind tavrinapp:…</source>
+        <translation>«&#x2068;%1$@&#x2069;» ليس عنوانًا من النوع &#x2068;tavrinapp:…&#x2069;</translation>
+    </message>
+    <message>
+        <source>More than %@ addresses at once are not taken.</source>
+        <translation>لا يُقبل أكثر من %@ عنوان دفعة واحدة.</translation>
+    </message>
+    <message>
+        <source>An address of more than %@ characters names no document.</source>
+        <translation>العنوان الذي يزيد على %@ حرف لا يدل على مستند.</translation>
+    </message>
+    <message>
+        <source>The request is damaged and was not taken.</source>
+        <translation>الطلب تالف ولم يُقبل.</translation>
+    </message>
+    <message>
+        <source>The folder “%1$@” belongs to somebody else. Remove it, or have it removed, and start again.</source>
+        <translation>المجلد «&#x2068;%1$@&#x2069;» يخص شخصًا آخر. أزله أو اطلب إزالته، ثم شغّل البرنامج من جديد.</translation>
+    </message>
+</context>
+<!-- The menu of a text field is the toolkit's own. -->
+<context>
+    <name>QLineEdit</name>
+    <message>
+        <source>&amp;Undo</source>
+        <translation>&amp;تراجع</translation>
+    </message>
+    <message>
+        <source>&amp;Redo</source>
+        <translation>إ&amp;عادة</translation>
+    </message>
+    <message>
+        <source>Cu&amp;t</source>
+        <translation>&amp;قص</translation>
+    </message>
+    <message>
+        <source>&amp;Copy</source>
+        <translation>&amp;نسخ</translation>
+    </message>
+    <message>
+        <source>&amp;Paste</source>
+        <translation>&amp;لصق</translation>
+    </message>
+    <message>
+        <source>Delete</source>
+        <translation>حذف</translation>
+    </message>
+    <message>
+        <source>Select All</source>
+        <translation>تحديد الكل</translation>
+    </message>
+</context>
+</TS>

@@ -1,0 +1,913 @@
+<?xml version="1.0" encoding="utf-8"?>
+<!DOCTYPE TS>
+<TS version="2.1" language="de_DE" sourcelanguage="en_US">
+<context>
+    <name>tavrin</name>
+    <message numerus="yes">
+        <source>.DICT.BYTES.%d</source>
+        <translation>
+            <numerusform>%n Byte</numerusform>
+            <numerusform>%n Byte</numerusform>
+        </translation>
+    </message>
+    <message numerus="yes">
+        <source>.DICT.ITEMS.%d</source>
+        <translation>
+            <numerusform>%n Objekt</numerusform>
+            <numerusform>%n Objekte</numerusform>
+        </translation>
+    </message>
+    <message numerus="yes">
+        <source>.DICT.ITEMS_SELECTED.%d</source>
+        <translation>
+            <numerusform>%n Objekt ausgewählt</numerusform>
+            <numerusform>%n Objekte ausgewählt</numerusform>
+        </translation>
+    </message>
+    <message numerus="yes">
+        <source>.DICT.MOVE_ITEMS.%d</source>
+        <translation>
+            <numerusform>%n Objekt verschieben</numerusform>
+            <numerusform>%n Objekte verschieben</numerusform>
+        </translation>
+    </message>
+    <message numerus="yes">
+        <source>.DICT.CANNOT_MOVE_ITEMS.%d</source>
+        <translation>
+            <numerusform>%n Objekt konnte nicht verschoben werden.</numerusform>
+            <numerusform>%n Objekte konnten nicht verschoben werden.</numerusform>
+        </translation>
+    </message>
+    <message numerus="yes">
+        <source>.DICT.CANNOT_DELETE_ITEMS.%d</source>
+        <translation>
+            <numerusform>%n Objekt konnte nicht gelöscht werden.</numerusform>
+            <numerusform>%n Objekte konnten nicht gelöscht werden.</numerusform>
+        </translation>
+    </message>
+    <message numerus="yes">
+        <source>.DICT.AVAILABLE.%g</source>
+        <translation>
+            <numerusform>%@ verfügbar</numerusform>
+            <numerusform>%@ verfügbar</numerusform>
+        </translation>
+    </message>
+    <!-- Names, sizes, places -->
+    <message>
+        <source>%@ KB</source>
+        <translation>%@&#xa0;KB</translation>
+    </message>
+    <message>
+        <source>%@ MB</source>
+        <translation>%@&#xa0;MB</translation>
+    </message>
+    <message>
+        <source>%@ GB</source>
+        <translation>%@&#xa0;GB</translation>
+    </message>
+    <message>
+        <source>%@ TB</source>
+        <translation>%@&#xa0;TB</translation>
+    </message>
+    <message>
+        <source>%@ PB</source>
+        <translation>%@&#xa0;PB</translation>
+    </message>
+    <message>
+        <source>%@ EB</source>
+        <translation>%@&#xa0;EB</translation>
+    </message>
+    <message>
+        <source>%1$@ of %2$@</source>
+        <translation>%1$@ von %2$@</translation>
+    </message>
+    <message>
+        <source>%1$@, %2$@</source>
+        <translation>%1$@, %2$@</translation>
+    </message>
+    <message>
+        <source>Documents</source>
+        <translation>Dokumente</translation>
+    </message>
+    <message>
+        <source>Kind</source>
+        <translation>Art</translation>
+    </message>
+    <message>
+        <source>Size</source>
+        <translation>Größe</translation>
+    </message>
+    <message>
+        <source>Where</source>
+        <translation>Ort</translation>
+    </message>
+    <message>
+        <source>Created</source>
+        <translation>Erstellt</translation>
+    </message>
+    <message>
+        <source>Modified</source>
+        <translation>Geändert</translation>
+    </message>
+    <message>
+        <source>Tags</source>
+        <translation>Tags</translation>
+    </message>
+    <message>
+        <source>Shared</source>
+        <translation>Freigegeben</translation>
+    </message>
+    <!-- Kinds of documents -->
+    <message>
+        <source>Document</source>
+        <translation>Dokument</translation>
+    </message>
+    <message>
+        <source>Folder</source>
+        <translation>Ordner</translation>
+    </message>
+    <message>
+        <source>Package</source>
+        <translation>Paket</translation>
+    </message>
+    <message>
+        <source>Rich text document with attachments</source>
+        <translation>Formatierter Text mit Anhängen</translation>
+    </message>
+    <message>
+        <source>Document package</source>
+        <translation>Dokumentpaket</translation>
+    </message>
+    <message>
+        <source>Text</source>
+        <translation>Text</translation>
+    </message>
+    <message>
+        <source>Source code</source>
+        <translation>Quelltext</translation>
+    </message>
+    <message>
+        <source>Image</source>
+        <translation>Bild</translation>
+    </message>
+    <message>
+        <source>Movie</source>
+        <translation>Film</translation>
+    </message>
+    <message>
+        <source>Audio</source>
+        <translation>Audio</translation>
+    </message>
+    <message>
+        <source>Audio or video</source>
+        <translation>Audio oder Video</translation>
+    </message>
+    <message>
+        <source>Archive</source>
+        <translation>Archiv</translation>
+    </message>
+    <message>
+        <source>Font</source>
+        <translation>Schrift</translation>
+    </message>
+    <!-- Buttons and actions -->
+    <message>
+        <source>OK</source>
+        <translation>OK</translation>
+    </message>
+    <message>
+        <source>Cancel</source>
+        <translation>Abbrechen</translation>
+    </message>
+    <message>
+        <source>Done</source>
+        <translation>Fertig</translation>
+    </message>
+    <message>
+        <source>Create</source>
+        <translation>Erstellen</translation>
+    </message>
+    <message>
+        <source>Back</source>
+        <translation>Zurück</translation>
+    </message>
+    <message>
+        <source>More</source>
+        <translation>Mehr</translation>
+    </message>
+    <message>
+        <source>Info</source>
+        <translation>Infos</translation>
+    </message>
+    <message>
+        <source>Select</source>
+        <translation>Auswählen</translation>
+    </message>
+    <message>
+        <source>Select Items</source>
+        <translation>Objekte auswählen</translation>
+    </message>
+    <message>
+        <source>Move</source>
+        <translation>Verschieben</translation>
+    </message>
+    <message>
+        <source>Move Here</source>
+        <translation>Hierher verschieben</translation>
+    </message>
+    <message>
+        <source>Move to Folder…</source>
+        <translation>In Ordner verschieben…</translation>
+    </message>
+    <message>
+        <source>Move “%1$@”</source>
+        <translation>„%1$@“ verschieben</translation>
+    </message>
+    <message>
+        <source>Delete</source>
+        <translation>Löschen</translation>
+    </message>
+    <message>
+        <source>Delete from Tavrin</source>
+        <translation>Aus Tavrin löschen</translation>
+    </message>
+    <message>
+        <source>Rename</source>
+        <translation>Umbenennen</translation>
+    </message>
+    <message>
+        <source>Rename Item</source>
+        <translation>Objekt umbenennen</translation>
+    </message>
+    <message>
+        <source>Rename Item…</source>
+        <translation>Objekt umbenennen…</translation>
+    </message>
+    <message>
+        <source>Share</source>
+        <translation>Teilen</translation>
+    </message>
+    <message>
+        <source>Share Item…</source>
+        <translation>Objekt teilen…</translation>
+    </message>
+    <message>
+        <source>Copy</source>
+        <translation>Kopieren</translation>
+    </message>
+    <message>
+        <source>Copy Path</source>
+        <translation>Pfad kopieren</translation>
+    </message>
+    <message>
+        <source>Send by Mail</source>
+        <translation>Per E-Mail senden</translation>
+    </message>
+    <message>
+        <source>Open in “%@”</source>
+        <translation>In „%@“ öffnen</translation>
+    </message>
+    <message>
+        <source>Open in “%1$@”</source>
+        <translation>In „%1$@“ öffnen</translation>
+    </message>
+    <message>
+        <source>Search</source>
+        <translation>Suchen</translation>
+    </message>
+    <message>
+        <source>Try Again</source>
+        <translation>Erneut versuchen</translation>
+    </message>
+    <message>
+        <source>Clear text</source>
+        <translation>Text löschen</translation>
+    </message>
+    <message>
+        <source>Zoom in</source>
+        <translation>Vergrößern</translation>
+    </message>
+    <message>
+        <source>Zoom out</source>
+        <translation>Verkleinern</translation>
+    </message>
+    <!-- New folders and names -->
+    <message>
+        <source>New Folder</source>
+        <translation>Neuer Ordner</translation>
+    </message>
+    <message>
+        <source>Folder Name</source>
+        <translation>Name des Ordners</translation>
+    </message>
+    <message>
+        <source>Enter a name for this folder.</source>
+        <translation>Geben Sie einen Namen für diesen Ordner ein.</translation>
+    </message>
+    <message>
+        <source>Enter a new name for this item.</source>
+        <translation>Geben Sie einen neuen Namen für dieses Objekt ein.</translation>
+    </message>
+    <message>
+        <source>Character not allowed in filename</source>
+        <translation>Zeichen im Dateinamen nicht erlaubt</translation>
+    </message>
+    <message>
+        <source>Choose a different name.</source>
+        <translation>Wählen Sie einen anderen Namen.</translation>
+    </message>
+    <message>
+        <source>The name “%@” is already taken.</source>
+        <translation>Der Name „%@“ wird bereits verwendet.</translation>
+    </message>
+    <message>
+        <source>The name “%1$@” with extension “.%2$@” is already taken.</source>
+        <translation>Der Name „%1$@“ mit der Endung „.%2$@“ wird bereits verwendet.</translation>
+    </message>
+    <message>
+        <source>The name “%@” can’t be used. Try using a name with fewer characters, or with no punctuation marks.</source>
+        <translation>Der Name „%@“ kann nicht verwendet werden. Versuchen Sie es mit einem Namen mit weniger Zeichen oder ohne Satzzeichen.</translation>
+    </message>
+    <message>
+        <source>The folder could not be made.</source>
+        <translation>Der Ordner konnte nicht erstellt werden.</translation>
+    </message>
+    <!-- Deleting -->
+    <message>
+        <source>%@ will be permanently deleted from Tavrin on all your devices. This action cannot be undone.</source>
+        <translation>%@ werden endgültig aus Tavrin auf all Ihren Geräten gelöscht. Dieser Vorgang kann nicht rückgängig gemacht werden.</translation>
+    </message>
+    <message>
+        <source>&quot;%@&quot; will be permanently deleted from Tavrin on all your devices. This action cannot be undone.</source>
+        <translation>„%@“ wird endgültig aus Tavrin auf all Ihren Geräten gelöscht. Dieser Vorgang kann nicht rückgängig gemacht werden.</translation>
+    </message>
+    <message>
+        <source>The %@ app library, and all its documents, will be permanently deleted from Tavrin on all your devices. This action cannot be undone.</source>
+        <translation>Die App-Bibliothek „%@“ und alle ihre Dokumente werden endgültig aus Tavrin auf all Ihren Geräten gelöscht. Dieser Vorgang kann nicht rückgängig gemacht werden.</translation>
+    </message>
+    <!-- Lists and the search -->
+    <message>
+        <source>No documents here</source>
+        <translation>Keine Dokumente</translation>
+    </message>
+    <message>
+        <source>What applications keep in the cloud appears here.</source>
+        <translation>Hier erscheint, was Apps in der Cloud aufbewahren.</translation>
+    </message>
+    <message>
+        <source>Documents that are added to this folder, here or on another device, appear here.</source>
+        <translation>Dokumente, die diesem Ordner hier oder auf einem anderen Gerät hinzugefügt werden, erscheinen hier.</translation>
+    </message>
+    <message>
+        <source>This folder is no longer here</source>
+        <translation>Dieser Ordner ist nicht mehr da</translation>
+    </message>
+    <message>
+        <source>This folder cannot be shown</source>
+        <translation>Dieser Ordner kann nicht angezeigt werden</translation>
+    </message>
+    <message>
+        <source>Search all documents</source>
+        <translation>Alle Dokumente durchsuchen</translation>
+    </message>
+    <message>
+        <source>Type a part of a name</source>
+        <translation>Geben Sie einen Teil eines Namens ein</translation>
+    </message>
+    <message>
+        <source>Documents and folders of the whole store are found, also those that are not downloaded.</source>
+        <translation>Gefunden werden Dokumente und Ordner der gesamten Ablage, auch nicht geladene.</translation>
+    </message>
+    <message>
+        <source>Nothing found</source>
+        <translation>Nichts gefunden</translation>
+    </message>
+    <message>
+        <source>No name in the store contains “%1$@”.</source>
+        <translation>Kein Name in der Ablage enthält „%1$@“.</translation>
+    </message>
+    <message>
+        <source>Downloading</source>
+        <translation>Wird geladen</translation>
+    </message>
+    <message>
+        <source>Not downloaded</source>
+        <translation>Nicht geladen</translation>
+    </message>
+    <!-- Choosing where to move -->
+    <message>
+        <source>Nothing here yet</source>
+        <translation>Noch nichts vorhanden</translation>
+    </message>
+    <message>
+        <source>An item with this name is here already.</source>
+        <translation>Ein Objekt mit diesem Namen ist bereits hier.</translation>
+    </message>
+    <message>
+        <source>Items with these names are here already.</source>
+        <translation>Objekte mit diesen Namen sind bereits hier.</translation>
+    </message>
+    <message>
+        <source>Open the folder into which to move.</source>
+        <translation>Öffnen Sie den Ordner, in den verschoben werden soll.</translation>
+    </message>
+    <message>
+        <source>This folder does not take documents.</source>
+        <translation>Dieser Ordner nimmt keine Dokumente auf.</translation>
+    </message>
+    <message>
+        <source>A folder cannot be moved into itself.</source>
+        <translation>Ein Ordner kann nicht in sich selbst verschoben werden.</translation>
+    </message>
+    <message>
+        <source>“%1$@” is here already.</source>
+        <translation>„%1$@“ ist bereits hier.</translation>
+    </message>
+    <message>
+        <source>These items are here already.</source>
+        <translation>Diese Objekte sind bereits hier.</translation>
+    </message>
+    <message>
+        <source>“%1$@” does not take folders.</source>
+        <translation>„%1$@“ nimmt keine Ordner auf.</translation>
+    </message>
+    <message>
+        <source>“%1$@” does not take folders within folders.</source>
+        <translation>„%1$@“ nimmt keine Ordner in Ordnern auf.</translation>
+    </message>
+    <message>
+        <source>“%1$@” does not take documents of this kind.</source>
+        <translation>„%1$@“ nimmt keine Dokumente dieser Art auf.</translation>
+    </message>
+    <message>
+        <source>“%1$@” does not take all of these documents.</source>
+        <translation>„%1$@“ nimmt nicht alle diese Dokumente auf.</translation>
+    </message>
+    <!-- Showing and downloading -->
+    <message>
+        <source>Loading…</source>
+        <translation>Wird geladen…</translation>
+    </message>
+    <message>
+        <source>Waiting…</source>
+        <translation>Bitte warten…</translation>
+    </message>
+    <message>
+        <source>Download</source>
+        <translation>Laden</translation>
+    </message>
+    <message>
+        <source>Download to View</source>
+        <translation>Zum Ansehen laden</translation>
+    </message>
+    <message>
+        <source>Cancel Download</source>
+        <translation>Laden abbrechen</translation>
+    </message>
+    <message>
+        <source>Downloading “%1$@”</source>
+        <translation>„%1$@“ wird geladen</translation>
+    </message>
+    <message>
+        <source>This item is over %@.</source>
+        <translation>Dieses Objekt ist größer als %@.</translation>
+    </message>
+    <message>
+        <source>“%@” will not download until you connect to Wi-Fi.</source>
+        <translation>„%@“ wird erst geladen, wenn Sie mit einem WLAN verbunden sind.</translation>
+    </message>
+    <message>
+        <source>Unable to download file. You are no longer connected to the Internet.</source>
+        <translation>Die Datei kann nicht geladen werden. Sie sind nicht mehr mit dem Internet verbunden.</translation>
+    </message>
+    <message>
+        <source>Picture “%1$@”</source>
+        <translation>Bild „%1$@“</translation>
+    </message>
+    <message>
+        <source>There is no document to show</source>
+        <translation>Kein Dokument zum Anzeigen</translation>
+    </message>
+    <message>
+        <source>This kind of document cannot be shown here.</source>
+        <translation>Dokumente dieser Art können hier nicht angezeigt werden.</translation>
+    </message>
+    <message>
+        <source>This document cannot be shown.</source>
+        <translation>Dieses Dokument kann nicht angezeigt werden.</translation>
+    </message>
+    <message>
+        <source>This document is protected by a password. It can be read in an application that asks for it.</source>
+        <translation>Dieses Dokument ist mit einem Passwort geschützt. Öffnen Sie es in einer App, die danach fragt.</translation>
+    </message>
+    <message>
+        <source>This is a folder, not a document.</source>
+        <translation>Dies ist ein Ordner, kein Dokument.</translation>
+    </message>
+    <message>
+        <source>There is nothing in this document.</source>
+        <translation>Dieses Dokument ist leer.</translation>
+    </message>
+    <message>
+        <source>This document is not on this device. Download it first.</source>
+        <translation>Dieses Dokument ist nicht auf diesem Gerät. Laden Sie es zuerst.</translation>
+    </message>
+    <message>
+        <source>“%1$@” is damaged, or not what its name says.</source>
+        <translation>„%1$@“ ist beschädigt oder nicht das, was der Name sagt.</translation>
+    </message>
+    <message>
+        <source>“%1$@” could not be opened</source>
+        <translation>„%1$@“ konnte nicht geöffnet werden</translation>
+    </message>
+    <message>
+        <source>“%1$@” could not be copied</source>
+        <translation>„%1$@“ konnte nicht kopiert werden</translation>
+    </message>
+    <message>
+        <source>“%1$@” could not be sent</source>
+        <translation>„%1$@“ konnte nicht gesendet werden</translation>
+    </message>
+    <message>
+        <source>“%1$@” could not be started. %2$@</source>
+        <translation>„%1$@“ konnte nicht gestartet werden. %2$@</translation>
+    </message>
+    <message>
+        <source>“%1$@” ended as soon as it had been started (exit status %2$@).</source>
+        <translation>„%1$@“ wurde sofort nach dem Start beendet (Exit-Status %2$@).</translation>
+    </message>
+    <!-- The account and the network -->
+    <message>
+        <source>Offline</source>
+        <translation>Offline</translation>
+    </message>
+    <message>
+        <source>Cellular</source>
+        <translation>Mobilfunk</translation>
+    </message>
+    <message>
+        <source>Wi-Fi</source>
+        <translation>WLAN</translation>
+    </message>
+    <message>
+        <source>Network activity</source>
+        <translation>Netzwerkaktivität</translation>
+    </message>
+    <message>
+        <source>Not signed in</source>
+        <translation>Nicht angemeldet</translation>
+    </message>
+    <message>
+        <source>Pelmora is not enabled</source>
+        <translation>Pelmora ist nicht aktiviert</translation>
+    </message>
+    <message>
+        <source>Sign in to a folder that holds your documents, such as a disk or a network folder. In a terminal, type:</source>
+        <translation>Melden Sie sich bei einem Ordner an, der Ihre Dokumente enthält, etwa auf einer Festplatte oder im Netzwerk. Geben Sie in einem Terminal ein:</translation>
+    </message>
+    <message>
+        <source>PATH is that folder. The documents appear here as soon as you are signed in.</source>
+        <translation>PATH ist dieser Ordner. Die Dokumente erscheinen hier, sobald Sie angemeldet sind.</translation>
+    </message>
+    <message>
+        <source>No Pelmora account is signed in.</source>
+        <translation>Kein Pelmora-Konto ist angemeldet.</translation>
+    </message>
+    <message>
+        <source>No Pelmora account is signed in. Sign in with the command “pelmora sign-in”.</source>
+        <translation>Kein Pelmora-Konto ist angemeldet. Melden Sie sich mit dem Befehl „pelmora sign-in“ an.</translation>
+    </message>
+    <message>
+        <source>The account is of the kind “%1$@”, which this version does not know. Update the program or sign in again.</source>
+        <translation>Das Konto ist von der Art „%1$@“, die diese Version nicht kennt. Aktualisieren Sie das Programm oder melden Sie sich neu an.</translation>
+    </message>
+    <message>
+        <source>This version cannot use accounts of the kind “%1$@” yet. Update the program or sign in to a folder.</source>
+        <translation>Diese Version kann Konten der Art „%1$@“ noch nicht verwenden. Aktualisieren Sie das Programm oder melden Sie sich bei einem Ordner an.</translation>
+    </message>
+    <message>
+        <source>The account's folder “%1$@” is not an absolute path. Sign in again with the whole path.</source>
+        <translation>Der Ordner „%1$@“ des Kontos ist kein absoluter Pfad. Melden Sie sich mit dem ganzen Pfad neu an.</translation>
+    </message>
+    <message>
+        <source>The account file “%1$@” does not say who is signed in. Sign in again.</source>
+        <translation>Die Kontodatei „%1$@“ sagt nicht, wer angemeldet ist. Melden Sie sich neu an.</translation>
+    </message>
+    <message>
+        <source>The account file “%1$@” cannot be read. Check its permissions.</source>
+        <translation>Die Kontodatei „%1$@“ kann nicht gelesen werden. Prüfen Sie ihre Zugriffsrechte.</translation>
+    </message>
+    <message>
+        <source>The account file “%1$@” is damaged. Sign in again.</source>
+        <translation>Die Kontodatei „%1$@“ ist beschädigt. Melden Sie sich neu an.</translation>
+    </message>
+    <message>
+        <source>The folder “%1$@” of your Pelmora account is not there. Connect its disk, or sign in again if it has moved.</source>
+        <translation>Der Ordner „%1$@“ Ihres Pelmora-Kontos ist nicht da. Schließen Sie sein Laufwerk an oder melden Sie sich neu an, wenn er verschoben wurde.</translation>
+    </message>
+    <message>
+        <source>What is at “%1$@” now is not what this account was linked with. Connect the right disk, or sign in to another folder.</source>
+        <translation>Was jetzt unter „%1$@“ liegt, ist nicht das, womit dieses Konto verknüpft wurde. Schließen Sie das richtige Laufwerk an oder melden Sie sich bei einem anderen Ordner an.</translation>
+    </message>
+    <message>
+        <source>The file “%1$@” of the account is damaged. Repair or remove it.</source>
+        <translation>Die Datei „%1$@“ des Kontos ist beschädigt. Reparieren oder entfernen Sie sie.</translation>
+    </message>
+    <message>
+        <source>The account does not tell how much room is left.</source>
+        <translation>Das Konto teilt nicht mit, wie viel Platz noch frei ist.</translation>
+    </message>
+    <message>
+        <source>The Pelmora server cannot be reached. Check the connection and try again.</source>
+        <translation>Der Pelmora-Server ist nicht erreichbar. Prüfen Sie die Verbindung und versuchen Sie es erneut.</translation>
+    </message>
+    <message>
+        <source>The Pelmora server did not accept the user name or the password.</source>
+        <translation>Der Pelmora-Server hat den Benutzernamen oder das Passwort nicht akzeptiert.</translation>
+    </message>
+    <message>
+        <source>The Pelmora server refused the request for “%1$@”.</source>
+        <translation>Der Pelmora-Server hat die Anfrage für „%1$@“ abgelehnt.</translation>
+    </message>
+    <message>
+        <source>The Pelmora server cannot store an item named “%1$@”. Choose a different name.</source>
+        <translation>Der Pelmora-Server kann kein Objekt mit dem Namen „%1$@“ speichern. Wählen Sie einen anderen Namen.</translation>
+    </message>
+    <message>
+        <source>There is no space left in your Pelmora account. Delete something to make room.</source>
+        <translation>In Ihrem Pelmora-Konto ist kein Platz mehr. Löschen Sie etwas, um Platz zu schaffen.</translation>
+    </message>
+    <!-- The store and its documents -->
+    <message>
+        <source>The store has not been set up yet.</source>
+        <translation>Die Ablage wurde noch nicht eingerichtet.</translation>
+    </message>
+    <message>
+        <source>The store cannot be changed now.</source>
+        <translation>Die Ablage kann derzeit nicht geändert werden.</translation>
+    </message>
+    <message>
+        <source>The store is in use by another program (process %1$@). Wait until it has finished, or close it.</source>
+        <translation>Die Ablage wird von einem anderen Programm verwendet (Prozess %1$@). Warten Sie, bis es fertig ist, oder beenden Sie es.</translation>
+    </message>
+    <message>
+        <source>The store was used by a later version of this program. Update the program to open it.</source>
+        <translation>Die Ablage wurde von einer neueren Version dieses Programms verwendet. Aktualisieren Sie das Programm, um sie zu öffnen.</translation>
+    </message>
+    <message>
+        <source>The store's records cannot be opened.</source>
+        <translation>Die Daten der Ablage können nicht geöffnet werden.</translation>
+    </message>
+    <message>
+        <source>The store's records were damaged. They were set aside as “%1$@” and are made anew from the disk and the account.</source>
+        <translation>Die Daten der Ablage waren beschädigt. Sie wurden als „%1$@“ beiseitegelegt und werden aus dem Laufwerk und dem Konto neu erstellt.</translation>
+    </message>
+    <message>
+        <source>The folder “%1$@” is not the one that this store was made with. Put it back, or move “%2$@” away to begin anew; nothing was changed.</source>
+        <translation>Der Ordner „%1$@“ ist nicht der, mit dem diese Ablage eingerichtet wurde. Legen Sie ihn zurück oder verschieben Sie „%2$@“ an einen anderen Ort, um neu zu beginnen; nichts wurde geändert.</translation>
+    </message>
+    <message>
+        <source>“%1$@” belongs to the store itself and cannot be moved.</source>
+        <translation>„%1$@“ gehört zur Ablage selbst und kann nicht verschoben werden.</translation>
+    </message>
+    <message>
+        <source>“%1$@” belongs to the store itself and cannot be deleted.</source>
+        <translation>„%1$@“ gehört zur Ablage selbst und kann nicht gelöscht werden.</translation>
+    </message>
+    <message>
+        <source>“%1$@” has to be downloaded before it can leave your documents.</source>
+        <translation>„%1$@“ muss geladen werden, bevor es Ihre Dokumente verlassen kann.</translation>
+    </message>
+    <message>
+        <source>“%1$@” stays on this device: your account does not have this version yet.</source>
+        <translation>„%1$@“ bleibt auf diesem Gerät: Ihr Konto hat diese Version noch nicht.</translation>
+    </message>
+    <message>
+        <source>“%1$@” is no document that could be fetched again.</source>
+        <translation>„%1$@“ ist kein Dokument, das erneut geladen werden könnte.</translation>
+    </message>
+    <message>
+        <source>“%1$@” has not been uploaded yet, so its copy on this device is kept.</source>
+        <translation>„%1$@“ wurde noch nicht hochgeladen, daher bleibt die Kopie auf diesem Gerät erhalten.</translation>
+    </message>
+    <message>
+        <source>“%1$@” was changed on another device. Both versions are kept.</source>
+        <translation>„%1$@“ wurde auf einem anderen Gerät geändert. Beide Versionen bleiben erhalten.</translation>
+    </message>
+    <!-- Why an item is left out -->
+    <message>
+        <source>It is a symbolic link.</source>
+        <translation>Es ist ein symbolischer Link.</translation>
+    </message>
+    <message>
+        <source>It is neither a file nor a folder.</source>
+        <translation>Es ist weder eine Datei noch ein Ordner.</translation>
+    </message>
+    <message>
+        <source>It lies on another disk than the account's folder.</source>
+        <translation>Es liegt auf einem anderen Laufwerk als der Ordner des Kontos.</translation>
+    </message>
+    <message>
+        <source>It took the place of something else on the account.</source>
+        <translation>Es hat im Konto die Stelle von etwas anderem eingenommen.</translation>
+    </message>
+    <message>
+        <source>The disk cannot have an item of that name.</source>
+        <translation>Das Laufwerk kann kein Objekt mit diesem Namen aufnehmen.</translation>
+    </message>
+    <message>
+        <source>The name is too long for the disk.</source>
+        <translation>Der Name ist zu lang für das Laufwerk.</translation>
+    </message>
+    <message>
+        <source>The name is one that the store uses itself.</source>
+        <translation>Die Ablage verwendet diesen Namen selbst.</translation>
+    </message>
+    <message>
+        <source>The name is one that the account uses itself.</source>
+        <translation>Das Konto verwendet diesen Namen selbst.</translation>
+    </message>
+    <message>
+        <source>Names that begin with “.” and end in “.promise” are kept for promises.</source>
+        <translation>Namen, die mit „.“ beginnen und auf „.promise“ enden, sind für Platzhalter reserviert.</translation>
+    </message>
+    <message>
+        <source>Files on the device have the names that its promise would need.</source>
+        <translation>Dateien auf dem Gerät haben bereits die Namen, die der Platzhalter bräuchte.</translation>
+    </message>
+    <message>
+        <source>Something else has that name on the device.</source>
+        <translation>Etwas anderes auf dem Gerät hat diesen Namen.</translation>
+    </message>
+    <message>
+        <source>A folder on the device has that name.</source>
+        <translation>Ein Ordner auf dem Gerät hat diesen Namen.</translation>
+    </message>
+    <message>
+        <source>A file on the device has that name.</source>
+        <translation>Eine Datei auf dem Gerät hat diesen Namen.</translation>
+    </message>
+    <!-- What can go wrong with a file -->
+    <message>
+        <source>“%1$@” is no longer there. It may have been moved or deleted.</source>
+        <translation>„%1$@“ ist nicht mehr da. Vielleicht wurde es verschoben oder gelöscht.</translation>
+    </message>
+    <message>
+        <source>“%1$@” cannot be used here.</source>
+        <translation>„%1$@“ kann hier nicht verwendet werden.</translation>
+    </message>
+    <message>
+        <source>You do not have permission to read “%1$@”.</source>
+        <translation>Sie haben keine Berechtigung, „%1$@“ zu lesen.</translation>
+    </message>
+    <message>
+        <source>“%1$@” is damaged and cannot be read.</source>
+        <translation>„%1$@“ ist beschädigt und kann nicht gelesen werden.</translation>
+    </message>
+    <message>
+        <source>“%1$@” could not be read or written because of a disk error.</source>
+        <translation>„%1$@“ konnte wegen eines Laufwerksfehlers nicht gelesen oder geschrieben werden.</translation>
+    </message>
+    <message>
+        <source>You do not have permission to change “%1$@”.</source>
+        <translation>Sie haben keine Berechtigung, „%1$@“ zu ändern.</translation>
+    </message>
+    <message>
+        <source>The name “%1$@” cannot be used. Choose a different name.</source>
+        <translation>Der Name „%1$@“ kann nicht verwendet werden. Wählen Sie einen anderen Namen.</translation>
+    </message>
+    <message>
+        <source>An item named “%1$@” already exists. Choose a different name.</source>
+        <translation>Ein Objekt mit dem Namen „%1$@“ ist bereits vorhanden. Wählen Sie einen anderen Namen.</translation>
+    </message>
+    <message>
+        <source>The name “%1$@” is too long. Choose a shorter one.</source>
+        <translation>Der Name „%1$@“ ist zu lang. Wählen Sie einen kürzeren.</translation>
+    </message>
+    <message>
+        <source>The folder “%1$@” is not empty.</source>
+        <translation>Der Ordner „%1$@“ ist nicht leer.</translation>
+    </message>
+    <message>
+        <source>There is not enough free space on the disk for “%1$@”. Free some space and try again.</source>
+        <translation>Auf dem Laufwerk ist nicht genug Platz für „%1$@“. Geben Sie Platz frei und versuchen Sie es erneut.</translation>
+    </message>
+    <message>
+        <source>“%1$@” cannot be changed because its disk is read-only.</source>
+        <translation>„%1$@“ kann nicht geändert werden, weil das Laufwerk schreibgeschützt ist.</translation>
+    </message>
+    <message>
+        <source>The operation was cancelled.</source>
+        <translation>Der Vorgang wurde abgebrochen.</translation>
+    </message>
+    <message>
+        <source>A file cannot take the place of a folder, nor a folder that of a file.</source>
+        <translation>Eine Datei kann keinen Ordner ersetzen und ein Ordner keine Datei.</translation>
+    </message>
+    <message>
+        <source>The operation on “%1$@” took too long. Try again.</source>
+        <translation>Der Vorgang mit „%1$@“ hat zu lange gedauert. Versuchen Sie es erneut.</translation>
+    </message>
+    <message>
+        <source>“%1$@” is in use. Close it elsewhere and try again.</source>
+        <translation>„%1$@“ wird verwendet. Schließen Sie es anderswo und versuchen Sie es erneut.</translation>
+    </message>
+    <message>
+        <source>“%1$@” was changed while it was being read. Try again.</source>
+        <translation>„%1$@“ wurde während des Lesens geändert. Versuchen Sie es erneut.</translation>
+    </message>
+    <message>
+        <source>“%1$@” lies on another disk and has to be copied there.</source>
+        <translation>„%1$@“ liegt auf einem anderen Laufwerk und muss dorthin kopiert werden.</translation>
+    </message>
+    <message>
+        <source>The disk cannot swap “%1$@” and “%2$@”.</source>
+        <translation>Das Laufwerk kann „%1$@“ und „%2$@“ nicht vertauschen.</translation>
+    </message>
+    <message>
+        <source>The disk that holds “%1$@” cannot keep this information.</source>
+        <translation>Das Laufwerk mit „%1$@“ kann diese Information nicht speichern.</translation>
+    </message>
+    <!-- Starting, and being asked to open something -->
+    <message>
+        <source>Tavrin runs already and was asked to come forward.</source>
+        <translation>Tavrin läuft bereits und wurde in den Vordergrund gebeten.</translation>
+    </message>
+    <message>
+        <source>Tavrin runs already, but did not take the request: %1$@</source>
+        <translation>Tavrin läuft bereits, hat die Anfrage aber nicht angenommen: %1$@</translation>
+    </message>
+    <message>
+        <source>Tavrin runs already, but does not answer. Close its window or end it, and try again.</source>
+        <translation>Tavrin läuft bereits, antwortet aber nicht. Schließen Sie das Fenster oder beenden Sie Tavrin, und versuchen Sie es erneut.</translation>
+    </message>
+    <message>
+        <source>Tavrin is busy with other requests. Try again.</source>
+        <translation>Tavrin ist mit anderen Anfragen beschäftigt. Versuchen Sie es erneut.</translation>
+    </message>
+    <message>
+        <source>Tavrin was started but does not answer.</source>
+        <translation>Tavrin wurde gestartet, antwortet aber nicht.</translation>
+    </message>
+    <message>
+        <source>Tavrin could not start (exit status %1$@).</source>
+        <translation>Tavrin konnte nicht starten (Exit-Status %1$@).</translation>
+    </message>
+    <message>
+        <source>“%1$@” could not be started (%2$@). Install Tavrin again.</source>
+        <translation>„%1$@“ konnte nicht gestartet werden (%2$@). Installieren Sie Tavrin neu.</translation>
+    </message>
+    <message>
+        <source>“%1$@” is no address of the kind tavrinapp:…</source>
+        <translation>„%1$@“ ist keine Adresse der Art tavrinapp:…</translation>
+    </message>
+    <message>
+        <source>More than %@ addresses at once are not taken.</source>
+        <translation>Mehr als %@ Adressen auf einmal werden nicht angenommen.</translation>
+    </message>
+    <message>
+        <source>An address of more than %@ characters names no document.</source>
+        <translation>Eine Adresse mit mehr als %@ Zeichen bezeichnet kein Dokument.</translation>
+    </message>
+    <message>
+        <source>The request is damaged and was not taken.</source>
+        <translation>Die Anfrage ist beschädigt und wurde nicht angenommen.</translation>
+    </message>
+    <message>
+        <source>The folder “%1$@” belongs to somebody else. Remove it, or have it removed, and start again.</source>
+        <translation>Der Ordner „%1$@“ gehört jemand anderem. Entfernen Sie ihn oder lassen Sie ihn entfernen, und starten Sie erneut.</translation>
+    </message>
+</context>
+<!-- The menu of a text field is the toolkit's own. -->
+<context>
+    <name>QLineEdit</name>
+    <message>
+        <source>&amp;Undo</source>
+        <translation>&amp;Rückgängig</translation>
+    </message>
+    <message>
+        <source>&amp;Redo</source>
+        <translation>&amp;Wiederherstellen</translation>
+    </message>
+    <message>
+        <source>Cu&amp;t</source>
+        <translation>&amp;Ausschneiden</translation>
+    </message>
+    <message>
+        <source>&amp;Copy</source>
+        <translation>&amp;Kopieren</translation>
+    </message>
+    <message>
+        <source>&amp;Paste</source>
+        <translation>&amp;Einfügen</translation>
+    </message>
+    <message>
+        <source>Delete</source>
+        <translation>Löschen</translation>
+    </message>
+    <message>
+        <source>Select All</source>
+        <translation>Alles auswählen</translation>
+    </message>
+</context>
+</TS>
