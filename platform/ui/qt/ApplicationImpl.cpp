@@ -72,6 +72,9 @@ Application::Impl::Impl(Application& theOwner, int& argc, char** argv)
     QApplication::setFont(toQt(Font::preferred(TextStyle::body)));
     chooseIconTheme();
     QApplication::setWindowIcon(QIcon(QStringLiteral(":/icons/Tavrin.svg")));
+    if (toolkitTexts.load(QLocale(), QStringLiteral("tavrin"), QStringLiteral("_"),
+                          QStringLiteral(":/i18n")))
+        QCoreApplication::installTranslator(&toolkitTexts);
     QGuiApplication::setLayoutDirection(QLocale().textDirection());
     installAccessibility();
     application.installEventFilter(this);

@@ -3,6 +3,7 @@
 #include "platform/ui/Application.h"
 
 #include <QApplication>
+#include <QTranslator>
 
 #include <memory>
 #include <optional>
@@ -37,6 +38,8 @@ struct Application::Impl : public QObject {
 
     Application& owner;
     QApplication application;
+    /// The words of the toolkit's own menus.
+    QTranslator toolkitTexts;
     std::shared_ptr<MainQueueWaker> waker;
     MainQueue* attachedQueue = nullptr;
     std::shared_ptr<ApplicationDelegate> delegate;
