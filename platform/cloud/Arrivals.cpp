@@ -4,12 +4,11 @@
 #include "platform/cloud/ContainerFile.h"
 #include "platform/cloud/ContainerSet.h"
 #include "platform/cloud/ContentHash.h"
+#include "platform/cloud/Sidecar.h"
 #include "platform/cloud/StoreFileSystem.h"
 
 namespace platform {
 namespace {
-
-constexpr std::size_t longestName = 255;
 
 /// Why a disk cannot have an item of that name; none when it can.
 std::optional<std::string> nameProblem(const std::string& name, const Arrivals::Spot& spot) {

@@ -16,7 +16,6 @@ namespace platform {
 namespace {
 
 constexpr std::string_view suffix = ".promise";
-constexpr std::size_t longestName = 255;
 /// Bytes of the document's name that the cut form keeps: room for the dot, "~", sixteen digits of
 /// the hash and the suffix.
 constexpr std::size_t keptBytes = 200;

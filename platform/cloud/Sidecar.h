@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
 #include <optional>
 #include <string>
@@ -9,6 +10,9 @@ namespace platform {
 
 /// Identity of an item of a store: never used again, also not by a database that was made anew.
 using ItemId = std::int64_t;
+
+/// Bytes of a name that disks of this system can hold.
+inline constexpr std::size_t longestName = 255;
 
 /// A promise is a hidden, empty file beside the place of the document that it promises. Its mark
 /// says whose promise it is: the store, the item and, where the sidecar's own name had to be

@@ -60,6 +60,9 @@ Failure StoreMoves::movePromise(const Url& from, const Url& to, const FoundSidec
     const std::optional<std::string> target = relative(to);
     if (!target)
         return notYetHere(from);
+    // The promise's own file would have room for it; the content could then never come.
+    if (nameOf(to.path()).size() > longestName)
+        return makeError(ErrorCode::nameTooLong, to.lastPathComponent());
     const Result<FoundSidecar> moved =
         renameSidecar(promise, std::string(folderOf(to.path())), std::string(nameOf(to.path())));
     if (!moved)

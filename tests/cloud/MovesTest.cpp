@@ -51,6 +51,9 @@ TEST_F(Moves, LongNamesComeAndGo) {
     EXPECT_TRUE(isPromised("A/short"));
     EXPECT_EQ(fetch("A/short"), std::nullopt);
     EXPECT_EQ(local("A/short"), "1");
+    EXPECT_TRUE(move("A/two.txt", "A/" + std::string(256, 'n'))->is(ErrorCode::nameTooLong))
+        << "its content could never have that name";
+    EXPECT_TRUE(isPromised("A/two.txt"));
 }
 
 TEST_F(Moves, AFolderTakesItsPromisesAlongButNotOutOfTheStore) {
