@@ -136,6 +136,10 @@ bool DocumentListController::performKeyCommand(KeyCommand command) {
         impl_->openSearch();
         return true;
     }
+    if (command == KeyCommand::down && impl_->model->count() > 0) {
+        impl_->list->takeFocus();
+        return true;
+    }
     return command == KeyCommand::cancel && impl_->leaveEditing();
 }
 

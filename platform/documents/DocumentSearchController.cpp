@@ -94,12 +94,16 @@ struct DocumentSearchController::Impl final : ListClient {
         page = std::make_shared<SearchPage>(results, [this] { self->dismissViewController(true); });
         page->field->setEditingChangedHandler(
             [this](TextField& field) { model->find(field.text()); });
-        page->field->setReturnHandler([this](TextField&) {
-            if (model->count() > 0)
-                results->takeFocus();
-        });
+        page->field->setReturnHandler([this](TextField&) { enterResults(); });
         update();
         return page;
+    }
+
+    bool enterResults() {
+        if (model->count() == 0)
+            return false;
+        results->takeFocus();
+        return true;
     }
 
     void rowsChanged() {
@@ -195,6 +199,8 @@ void DocumentSearchController::viewDidAppear(bool animated) {
 }
 
 bool DocumentSearchController::performKeyCommand(KeyCommand command) {
+    if (command == KeyCommand::down)
+        return impl_->enterResults();
     if (command != KeyCommand::cancel)
         return false;
     dismissViewController(true);

@@ -34,7 +34,9 @@ enum class KeyCommand {
     /// Alt+Left, or a keyboard's or mouse's own back key.
     back,
     /// Ctrl+F.
-    find
+    find,
+    /// The arrow, while the focus is in a field or on a button: leads to what the screen shows.
+    down
 };
 
 /// Keys and values of state restoration.

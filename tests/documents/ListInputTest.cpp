@@ -3,9 +3,11 @@
 #include "platform/ui/AlertController.h"
 #include "tests/documents/ListFixture.h"
 
+#include <QApplication>
 #include <QContextMenuEvent>
 #include <QCoreApplication>
 #include <QMouseEvent>
+#include <QTest>
 #include <QWheelEvent>
 
 using namespace platform;
@@ -57,6 +59,12 @@ TEST_F(Input, arrowsAndPagesMoveTheCurrentRowAndKeepItInView) {
     EXPECT_EQ(currentName(), "File 38.txt");
     press(Qt::Key_Home);
     EXPECT_EQ(state().scrolling.offset(), 0);
+}
+
+TEST_F(Input, aPressOnTheEmptyBarLeavesTheKeysToTheList) {
+    press(Qt::Key_Home);
+    QTest::mouseClick(widget().window(), Qt::LeftButton, {}, QPoint(200, 30));
+    ASSERT_EQ(QApplication::focusWidget(), &widget());
 }
 
 TEST_F(Input, enterOpensAndF2AndDeleteAskForTheirActions) {

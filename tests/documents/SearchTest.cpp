@@ -159,6 +159,16 @@ TEST_F(SearchScreen, reportsWhatIsTappedThroughTheListWhileItIsPresented) {
     EXPECT_FALSE(searches());
 }
 
+TEST_F(SearchScreen, theArrowLeadsFromTheFieldIntoTheResults) {
+    ASSERT_TRUE(list->performKeyCommand(KeyCommand::find));
+    house.advance(1s);
+    search("needle", 2);
+    QTest::keyClick(QApplication::focusWidget(), Qt::Key_Down);
+    ASSERT_EQ(QApplication::focusWidget(), results());
+    QTest::keyClick(results(), Qt::Key_Return);
+    EXPECT_THAT(delegate->files, ElementsAre(house.url("Trip/needle.txt")));
+}
+
 TEST_F(SearchScreen, opensByTheFieldAboveTheListAndClosesByEscape) {
     QWidget* const above = widget().parentWidget()->childAt(100, 30);
     ASSERT_TRUE(above);

@@ -10,6 +10,7 @@
 #include <QCoreApplication>
 #include <QKeyEvent>
 #include <QKeySequence>
+#include <QLineEdit>
 #include <QResizeEvent>
 
 #include <optional>
@@ -32,6 +33,8 @@ std::optional<KeyCommand> commandOf(const QKeyEvent& event) {
         return std::nullopt;
     if (event.key() == Qt::Key_Escape)
         return KeyCommand::cancel;
+    if (event.key() == Qt::Key_Down)
+        return KeyCommand::down;
     if (event.key() == Qt::Key_Return || event.key() == Qt::Key_Enter)
         return KeyCommand::confirm;
     return std::nullopt;
@@ -87,8 +90,10 @@ void WindowWidget::keyPressEvent(QKeyEvent* event) {
 void WindowWidget::mousePressEvent(QMouseEvent* event) {
     if (event->button() == Qt::BackButton && window_)
         window_->impl().sendKeyCommand(KeyCommand::back);
-    else if (QWidget* const focused = focusWidget(); focused && event->button() == Qt::LeftButton)
-        focused->clearFocus();
+    else if (auto* const field = qobject_cast<QLineEdit*>(focusWidget());
+             field && event->button() == Qt::LeftButton)
+        // Ends typing; a list keeps its keys.
+        field->clearFocus();
 }
 
 void WindowWidget::closeEvent(QCloseEvent* event) {
