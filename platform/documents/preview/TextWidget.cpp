@@ -227,6 +227,11 @@ void TextWidget::wheelEvent(QWheelEvent* event) {
 }
 
 void TextWidget::keyPressEvent(QKeyEvent* event) {
+    // Alt+Left, for one, is the screen's.
+    if (event->modifiers() & (Qt::AltModifier | Qt::MetaModifier)) {
+        QWidget::keyPressEvent(event);
+        return;
+    }
     const double page = std::max(keyStep, height() - 2 * keyStep);
     switch (event->key()) {
     case Qt::Key_Down:

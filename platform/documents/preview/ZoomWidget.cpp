@@ -221,6 +221,11 @@ void ZoomWidget::wheelEvent(QWheelEvent* event) {
 }
 
 void ZoomWidget::keyPressEvent(QKeyEvent* event) {
+    // Alt+Left, for one, is the screen's.
+    if (event->modifiers() & (Qt::AltModifier | Qt::MetaModifier)) {
+        QWidget::keyPressEvent(event);
+        return;
+    }
     const double page = std::max(keyStep, height() - keyStep);
     switch (event->key()) {
     case Qt::Key_Plus:
