@@ -105,7 +105,7 @@ struct PlatformPreviewController::Impl {
     }
 
     void showPage(const std::string& message) {
-        const std::string type = typeOf(*shown);
+        const std::string type = TypeRegistry::identifierForFile(shown->path());
         view->showPage({DocumentIcons::forType(type, pageIconEdge),
                         displayName(shown->lastPathComponent()), factsOf(*shown, type), message});
     }
@@ -172,6 +172,9 @@ void PlatformPreviewController::loadView() {
 
 void PlatformPreviewController::viewWillAppear(bool animated) {
     ViewController::viewWillAppear(animated);
+    // All that can be done here stands in the bar above.
+    if (NavigationController* const stack = navigationController())
+        stack->setToolbarHidden(true, false);
     if (!impl_->shown)
         impl_->reload();
 }
