@@ -13,6 +13,7 @@
 #include <QStandardPaths>
 #include <QTextBoundaryFinder>
 
+#include <algorithm>
 #include <cmath>
 #include <functional>
 #include <map>
@@ -27,6 +28,8 @@ constexpr auto fallbackTheme = "breeze";
 constexpr int largestPlainSize = 32;
 constexpr int fullDrawingSize = 64;
 constexpr std::size_t mostIcons = 512;
+/// Characters that a page has room for; a type that prefers more is told by a shorter extension.
+constexpr qsizetype longestLabel = 5;
 
 /// Where no desktop told the toolkit of its icons, the places that every desktop uses.
 void findThemes() {
@@ -64,7 +67,12 @@ QString extensionOf(std::string_view typeIdentifier) {
     const std::string mime = TypeRegistry::mimeTypeForIdentifier(typeIdentifier);
     if (mime == "application/octet-stream")
         return {};
-    return QMimeDatabase().mimeTypeForName(toQt(mime)).preferredSuffix();
+    const QMimeType known = QMimeDatabase().mimeTypeForName(toQt(mime));
+    const QString preferred = known.preferredSuffix();
+    if (preferred.size() <= longestLabel)
+        return preferred;
+    const QStringList all = known.suffixes();
+    return *std::ranges::min_element(all, {}, [](const QString& each) { return each.size(); });
 }
 
 QImage drawType(std::string_view typeIdentifier, int pixels) {
