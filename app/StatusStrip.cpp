@@ -41,6 +41,8 @@ StatusStrip::StatusStrip(platform::Window& window)
     const auto changed = [this](const platform::Notification&) { update(); };
     accountChanged_ =
         platform.notifications().observe(platform::cloudIdentityDidChangeNotification, changed);
+    problemChanged_ =
+        platform.notifications().observe(platform::cloudProblemDidChangeNotification, changed);
     activityChanged_ = platform.notifications().observe(
         platform::networkActivityIndicatorDidChangeNotification, changed);
     target_ = platform.reachability().createTarget(watchedHost);
@@ -68,9 +70,14 @@ StatusStrip::~StatusStrip() {
 }
 
 void StatusStrip::update() {
-    const auto account = Platform::current().accounts().account();
-    window_.setStatusStrip({account ? account->name : localized("Not signed in"),
-                            account ? networkText(reports_->flags) : std::string(),
+    const platform::CloudAccountService& accounts = Platform::current().accounts();
+    const auto account = accounts.account();
+    std::string text = account ? account->name : localized("Not signed in");
+    // What keeps the store from its work, or what had to be done to it; without an account the
+    // screen says so itself.
+    if (const auto problem = accounts.problem(); problem && accounts.identityToken())
+        text += " – " + *problem;
+    window_.setStatusStrip({text, account ? networkText(reports_->flags) : std::string(),
                             Platform::current().networkActivityIndicator().isVisible()});
 }
 

@@ -27,6 +27,7 @@ private:
     std::shared_ptr<Reports> reports_;
     std::unique_ptr<platform::ReachabilityTarget> target_;
     platform::Observation accountChanged_;
+    platform::Observation problemChanged_;
     platform::Observation activityChanged_;
 };
 

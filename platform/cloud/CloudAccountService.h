@@ -12,6 +12,10 @@ namespace platform {
 inline constexpr std::string_view cloudIdentityDidChangeNotification =
     "CloudIdentityDidChangeNotification";
 
+/// Posted on the main thread when CloudAccountService::problem may answer something else.
+inline constexpr std::string_view cloudProblemDidChangeNotification =
+    "CloudProblemDidChangeNotification";
+
 /// Who is signed in: opaque, comparable, and storable as bytes.
 class IdentityToken {
 public:

@@ -21,7 +21,8 @@ std::optional<IdentityToken> IdentityToken::deserialized(const Bytes& bytes) {
 struct CloudService::State final : CloudAccountService,
                                    ContentProvider,
                                    CloudDatabase,
-                                   KeyValueCloudStore {
+                                   KeyValueCloudStore,
+                                   std::enable_shared_from_this<CloudService::State> {
     explicit State(Parts given)
         : parts(std::move(given)), documents(slot, [this] { return current(); }) {
         if (!parts.disk)
@@ -82,6 +83,22 @@ struct CloudService::State final : CloudAccountService,
         });
     }
 
+    void tellOfAccount() {
+        told = identityToken();
+        parts.notifications.post(cloudIdentityDidChangeNotification);
+    }
+    /// A store that could not be opened at first makes an account of one that was none.
+    void tellOfCondition() {
+        parts.main.async([weak = weak_from_this()] {
+            const std::shared_ptr<State> self = weak.lock();
+            if (!self)
+                return;
+            if (self->identityToken() != self->told)
+                self->tellOfAccount();
+            self->parts.notifications.post(cloudProblemDidChangeNotification);
+        });
+    }
+
     // CloudDatabase
     void addOperation(std::shared_ptr<QuotaOperation> operation) override {
         const auto answer = [operation](const Result<std::uint64_t>& bytes) {
@@ -124,10 +141,14 @@ struct CloudService::State final : CloudAccountService,
             platformLog(LogLevel::warning, "cloud: no account: %@", *unsupported);
             return;
         }
-        const StoreEngine::Services services{
-            parts.clock, parts.watcher, parts.progress, parts.folders, *parts.disk, slot, [this] {
-                tellOfValues();
-            }};
+        const StoreEngine::Services services{parts.clock,
+                                             parts.watcher,
+                                             parts.progress,
+                                             parts.folders,
+                                             *parts.disk,
+                                             slot,
+                                             [this] { tellOfValues(); },
+                                             [this] { tellOfCondition(); }};
         auto next = std::make_shared<StoreEngine>(services, *now.account, std::move(remote));
         next->open(parts.readOnly);
         const std::lock_guard lock(mutex);
@@ -142,17 +163,20 @@ struct CloudService::State final : CloudAccountService,
     std::optional<std::string> unsupported; // the kind of the account, and what to do
     std::shared_ptr<StoreEngine> engine;
     std::unique_ptr<AccountMonitor> monitor;
+    std::optional<IdentityToken> told; // what the last notice was about; main thread
 };
 
-CloudService::CloudService(Parts parts) : state_(std::make_unique<State>(std::move(parts))) {
+CloudService::CloudService(Parts parts) : state_(std::make_shared<State>(std::move(parts))) {
     State& state = *state_;
     state.monitor = std::make_unique<AccountMonitor>(
         state.parts.folders, state.parts.main, state.parts.watcher, [&state] {
             state.follow(state.monitor->reading());
-            state.parts.notifications.post(cloudIdentityDidChangeNotification);
+            state.tellOfAccount();
+            state.parts.notifications.post(cloudProblemDidChangeNotification);
             state.tellOfValues(); // those of another account
         });
     state.follow(state.monitor->reading());
+    state.told = state.identityToken();
 }
 
 CloudService::~CloudService() {

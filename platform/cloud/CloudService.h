@@ -83,7 +83,7 @@ public:
 
 private:
     struct State;
-    std::unique_ptr<State> state_;
+    std::shared_ptr<State> state_; // shared with nobody but what waits on the main queue
 };
 
 } // namespace platform

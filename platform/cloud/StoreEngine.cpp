@@ -126,8 +126,11 @@ void StoreEngine::openForReading() {
         listed_ = complete;
     }
     readContainers();
-    const std::lock_guard lock(mutex_);
-    usable_ = true;
+    {
+        const std::lock_guard lock(mutex_);
+        usable_ = true;
+    }
+    services_.conditionChanged();
 }
 
 void StoreEngine::begin(OpenedStore store) {
@@ -237,8 +240,11 @@ void StoreEngine::setProblem(const Failure& failure) {
         return;
     if (failure && failure->is(ErrorCode::readCorrupt) && store_)
         store_->lock.keepCrashMark();
-    const std::lock_guard lock(mutex_);
-    problem_ = failure ? failure->localizedDescription : std::nullopt;
+    {
+        const std::lock_guard lock(mutex_);
+        problem_ = failure ? failure->localizedDescription : std::nullopt;
+    }
+    services_.conditionChanged();
 }
 
 std::shared_ptr<Transfers> StoreEngine::transfers() const {

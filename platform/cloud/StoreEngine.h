@@ -37,6 +37,8 @@ public:
         StoreViewSlot& slot;
         /// Called on a thread of the engine's when another device set values.
         std::function<void()> valuesChanged;
+        /// The same when `problem` or `usable` may answer something else.
+        std::function<void()> conditionChanged;
     };
     using Done = std::function<void(const Failure& failure)>;
 

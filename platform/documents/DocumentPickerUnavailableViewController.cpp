@@ -1,10 +1,13 @@
 #include "platform/documents/DocumentPickerUnavailableViewController.h"
 
+#include "platform/base/NotificationCenter.h"
 #include "platform/base/Text.h"
 #include "platform/cloud/CloudAccountService.h"
 #include "platform/documents/CenteredColumn.h"
 #include "platform/documents/DocumentServices.h"
 #include "platform/ui/Theme.h"
+
+#include <array>
 
 namespace platform {
 namespace {
@@ -36,6 +39,13 @@ struct DocumentPickerUnavailableViewController::Content : public CenteredColumn 
                                 "signed in."));
     }
 
+    /// The cause may change while there is still no account.
+    void follow() {
+        const auto changed = [this](const Notification&) { refresh(); };
+        observations = {services.notifications.observe(cloudIdentityDidChangeNotification, changed),
+                        services.notifications.observe(cloudProblemDidChangeNotification, changed)};
+    }
+
     void refresh() {
         const std::optional<std::string> problem = services.accounts.problem();
         cause->setText(problem.value_or(std::string()));
@@ -49,6 +59,7 @@ struct DocumentPickerUnavailableViewController::Content : public CenteredColumn 
     std::shared_ptr<Label> advice;
     std::shared_ptr<Label> command;
     std::shared_ptr<Label> rest;
+    std::array<Observation, 2> observations;
 };
 
 DocumentPickerUnavailableViewController::DocumentPickerUnavailableViewController() = default;
@@ -58,6 +69,7 @@ void DocumentPickerUnavailableViewController::loadView() {
     content_ = std::make_shared<Content>(DocumentServices::current());
     setView(content_);
     content_->refresh();
+    content_->follow();
 }
 
 void DocumentPickerUnavailableViewController::viewWillAppear(bool animated) {

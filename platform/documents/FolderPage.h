@@ -1,11 +1,13 @@
 #pragma once
 
 #include "platform/base/MainQueue.h"
+#include "platform/base/NotificationCenter.h"
 #include "platform/documents/DocumentServices.h"
 #include "platform/documents/list/StatusPage.h"
 
 #include <memory>
 #include <optional>
+#include <string>
 
 namespace platform {
 
@@ -26,7 +28,9 @@ public:
 private:
     std::optional<StatusPage::Content> content() const;
     StatusPage::Content failure(const Error& error) const;
+    StatusPage::Content failure(const std::string& cause) const;
     bool storeIsStillListing() const;
+    bool storeIsListed() const;
 
     const DocumentServices services_;
     const std::shared_ptr<FolderModel> model_;
@@ -36,6 +40,7 @@ private:
     Timer loading_;
     bool showsLoading_ = false;
     Timer listingCheck_;
+    Observation problemChanged_;
 };
 
 } // namespace platform

@@ -56,6 +56,21 @@ TEST_F(Account, ARemoteThatIsGoneIsAProblemAndTheStoreStaysReadable) {
     EXPECT_FALSE(FileManager::exists(shelfroot + "/Strange"));
 }
 
+TEST_F(Account, SaysWhenTheProblemChanges) {
+    givenRemote("Letters/a.txt", "a");
+    givenStore();
+    std::vector<std::string> told;
+    const Observation problems = notifications.observe(
+        cloudProblemDidChangeNotification, [&](const Notification&) { told.push_back(problem()); });
+    ASSERT_EQ(rename((home / "remote").c_str(), (home / "elsewhere").c_str()), 0);
+    EXPECT_TRUE(readAll());
+    runUntil([&] { return !told.empty() && !told.back().empty(); });
+    ASSERT_EQ(rename((home / "elsewhere").c_str(), (home / "remote").c_str()), 0);
+    EXPECT_EQ(readAll(), std::nullopt);
+    runUntil([&] { return told.back().empty(); });
+    EXPECT_EQ(changes, 0) << "it was the same account all the time";
+}
+
 TEST_F(Account, ChangesOfTheFileArriveOnceOnTheMainThread) {
     start(); // neither the file nor its folder is there
     EXPECT_FALSE(cloud->accounts().identityToken());
