@@ -12,6 +12,9 @@
 #include <array>
 #include <climits>
 #include <mutex>
+#include <source_location>
+#include <utility>
+#include <vector>
 
 namespace tavrin {
 namespace {
@@ -29,6 +32,22 @@ constexpr int fileLevel = 6;
 constexpr const char* quotaVariable = "JOT_QUOTA_DISABLED";
 constexpr const char* markerFile = "/etc/vx_hella_logging";
 constexpr std::string_view levelPreference = "VXLogLevel";
+
+struct EarlyMessage {
+    int level;
+    std::string text;
+    std::source_location where;
+};
+
+std::mutex earlyMutex;
+std::vector<EarlyMessage> early; // guarded by earlyMutex
+
+void writePlatformMessage(int level, const std::string& message,
+                          const std::source_location& where) {
+    const std::array<platform::FormatArgument, 1> arguments{platform::makeFormatArgument(message)};
+    VXLogv(where.file_name(), where.function_name(), where.line(), "VX", level, nullptr, "%@",
+           arguments);
+}
 
 const char* levelText(int level) {
     static constexpr std::array<const char*, 8> texts = {"0", "1", "2", "3", "4", "5", "6", "7"};
@@ -225,15 +244,19 @@ void TavrinLogTest() {
         VXLog(__FILE__, __func__, __LINE__, "VX", level, "%@", name);
 }
 
+void keepPlatformLog() {
+    platform::setLogSink({[](int level) { return level <= vxInfo; },
+                          [](int level, std::string message, const std::source_location& where) {
+                              const std::lock_guard lock(earlyMutex);
+                              early.push_back({level, std::move(message), where});
+                          }});
+}
+
 void connectPlatformLog() {
-    platform::setLogSink(
-        {[](int level) { return VXShouldLog(level); },
-         [](int level, const std::string& message, const std::source_location& where) {
-             const std::array<platform::FormatArgument, 1> arguments{
-                 platform::makeFormatArgument(message)};
-             VXLogv(where.file_name(), where.function_name(), where.line(), "VX", level, nullptr,
-                    "%@", arguments);
-         }});
+    platform::setLogSink({[](int level) { return VXShouldLog(level); }, writePlatformMessage});
+    // Nobody adds to them any more.
+    for (const EarlyMessage& each : std::exchange(early, {}))
+        writePlatformMessage(each.level, each.text, each.where);
 }
 
 } // namespace tavrin

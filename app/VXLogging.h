@@ -92,6 +92,8 @@ void VXLog(const char* file, const char* function, unsigned line, const char* ca
 /// Writes the six levels once each; for trying out the log by hand.
 void TavrinLogTest();
 
+/// Keeps what the platform logs while it is being put together, for connectPlatformLog to write.
+void keepPlatformLog();
 /// Sends what the platform logs through the same client, under the file and line where it stands.
 void connectPlatformLog();
 

@@ -13,6 +13,7 @@ int main(int argc, char** argv) {
     platform::ApplicationEntry entry(argc, argv);
     if (const std::optional<int> status = entry.exitStatus())
         return *status;
+    tavrin::keepPlatformLog();
     platform::Platform services;
     tavrin::connectPlatformLog();
     const std::string program = argc > 0 ? argv[0] : "";
