@@ -99,10 +99,10 @@ TEST_F(Browse, comesBackWithThePreviewItHadAndWithoutAVanishedOne) {
     open("Documents");
     open("Milk.txt");
     ASSERT_TRUE(untilTitled("Milk.txt"));
-    advance(1s); // it may be killed from here on
+    advance(3s); // it may be killed from here on
     relaunch();
     ASSERT_TRUE(untilTitled("Milk.txt"));
-    advance(1s);
+    advance(3s);
     remove("Milk.txt");
     relaunch();
     calmDown();
@@ -215,6 +215,23 @@ TEST_F(Browse, opensTheScreensDownToADeepAddressForKnownCallersOnly) {
     EXPECT_EQ(titles()[2], "Notes");
     EXPECT_EQ(nav().itemManager()->mode(), 1);
     EXPECT_EQ(list(), nullptr);
+}
+
+TEST_F(Browse, comesBackToItsPreviewWhenItWasKilledButNotToAListNorInACircle) {
+    signIn();
+    givenFile("Plan.txt");
+    launch();
+    nav().showPreview(std::make_shared<tavrin::VXItem>(url("Plan.txt")), 1);
+    advance(3s);
+    relaunch(); // without a word to the one before
+    ASSERT_NE(nav().itemManager(), nullptr);
+    EXPECT_EQ(nav().itemManager()->item()->url(), url("Plan.txt"));
+    EXPECT_EQ(nav().itemManager()->mode(), 1);
+    relaunch(); // the screen had not stood for long
+    EXPECT_EQ(nav().itemManager(), nullptr);
+    advance(3s);
+    relaunch();
+    EXPECT_EQ(nav().itemManager(), nullptr);
 }
 
 TEST_F(Browse, takesTheWholePathOfAFolderTappedInTheSearch) {

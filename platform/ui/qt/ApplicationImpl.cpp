@@ -25,14 +25,15 @@
 #include <QStandardPaths>
 
 #include <algorithm>
+#include <utility>
 
 namespace platform {
 namespace {
 
 constexpr double smallestTextScale = 0.5;
 constexpr double largestTextScale = 4;
-/// Joins the saves of screens that come quickly one after the other.
-constexpr auto saveDelay = std::chrono::milliseconds(500);
+/// How long a screen is at the top before the program comes back to it.
+constexpr Duration stateSettlingTime = std::chrono::seconds(2);
 
 /// Runs before QApplication reads the desktop's look.
 char** withoutDesktopLook(char** argv) {
@@ -138,6 +139,8 @@ void Application::Impl::attachMainQueue() {
     if (!Runtime::installed() || attachedQueue == &Runtime::current().mainQueue)
         return;
     attachedQueue = &Runtime::current().mainQueue;
+    savesSoon = false;
+    savedState.reset();
     attachedQueue->setWake([shared = waker] { shared->wake(); });
 }
 
@@ -192,19 +195,6 @@ Window* Application::Impl::visibleWindow() const {
     return found == windows.rend() ? nullptr : *found;
 }
 
-void Application::Impl::screensChanged() {
-    if (saveWaits || !delegate || !Runtime::installed())
-        return;
-    saveWaits = true;
-    Runtime::current().mainQueue.after(saveDelay, [] {
-        Impl* const impl = applicationImpl();
-        if (!impl)
-            return;
-        impl->saveWaits = false;
-        impl->saveState();
-    });
-}
-
 void Application::Impl::saveState() {
     Window* const window = delegate ? delegate->mainWindow() : nullptr;
     const auto root = window ? window->rootViewController() : nullptr;
@@ -216,8 +206,22 @@ void Application::Impl::saveState() {
         root->encodeRestorableStateWithCoder(coder);
         file.emplace(root->restorationIdentifier(), std::move(coder));
     }
+    if (savedState == file)
+        return;
+    savedState.reset();
     if (const Failure failure = writeRestorationFile(restorationPath(), file))
         platformLog(LogLevel::warning, "Could not save the state of the screens: %@", *failure);
+    else
+        savedState = std::move(file);
+}
+
+void Application::Impl::saveStateSoon() {
+    if (!Runtime::installed() || std::exchange(savesSoon, true))
+        return;
+    Runtime::current().mainQueue.after(stateSettlingTime, [] {
+        if (Impl* const impl = applicationImpl(); impl && std::exchange(impl->savesSoon, false))
+            impl->saveState();
+    });
 }
 
 void Application::Impl::restoreState() {
@@ -226,6 +230,13 @@ void Application::Impl::restoreState() {
     if (!root || root->restorationIdentifier().empty())
         return;
     const Value::Map file = readRestorationFile(restorationPath());
+    // A screen that ends the program must not do so at every start: what is shown for a while is
+    // saved again.
+    savedState.reset();
+    if (!file.empty())
+        if (const Failure failure = writeRestorationFile(restorationPath(), {}))
+            platformLog(LogLevel::warning, "Could not reset the state of the screens: %@",
+                        *failure);
     const auto found = file.find(root->restorationIdentifier());
     if (found != file.end() && found->second.map())
         root->decodeRestorableStateWithCoder(*found->second.map());

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "platform/base/Value.h"
 #include "platform/ui/Application.h"
 
 #include <QApplication>
@@ -31,9 +32,9 @@ struct Application::Impl : public QObject {
     void showKeyboardFocus(bool shown);
     /// The latest of those in view; none when there is none.
     Window* visibleWindow() const;
-    /// Saves the state soon: a program that is killed has no other moment for it.
-    void screensChanged();
     void saveState();
+    /// After a screen came to the top, so that a program that is killed comes back there as well.
+    void saveStateSoon();
     void restoreState();
 
     Application& owner;
@@ -46,7 +47,6 @@ struct Application::Impl : public QObject {
     std::vector<Window*> windows;
     bool active = false;
     bool keyboardFocus = false;
-    bool saveWaits = false;
     bool pointerHovers = true;
     bool motionReduced = false;
     double scale = 1;
@@ -54,6 +54,8 @@ struct Application::Impl : public QObject {
     bool motionDecided = false;
     bool scaleDecided = false;
     std::optional<DeviceIdiom> idiom;
+    bool savesSoon = false;
+    std::optional<Value::Map> savedState; // what the file holds; none when that is not known
 };
 
 /// None before and after the application's life.

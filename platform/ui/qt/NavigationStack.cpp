@@ -173,7 +173,7 @@ void NavigationController::Stack::didShow(bool animated) {
     if (const Screen screen = top(); screen && listener)
         listener->navigationControllerDidShowViewController(owner, *screen, animated);
     if (Application::Impl* const application = applicationImpl())
-        application->screensChanged();
+        application->saveStateSoon();
 }
 
 } // namespace platform
