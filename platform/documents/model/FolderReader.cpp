@@ -62,32 +62,33 @@ Result<std::vector<DocumentEntry>> FolderReader::readAll(const CancelFlag& cance
         return names.error();
     std::vector<DocumentEntry> entries;
     entries.reserve(names->plain.size() + names->sidecars.size());
-    for (const DirectoryEntry& found : names->plain)
-        entries.push_back(entryFor(found));
+    for (DirectoryEntry& found : names->plain)
+        entries.push_back(entryFor(std::move(found)));
     shortened_.clear();
     if (!names->sidecars.empty())
-        addPromises(*names, entries, cancel);
+        addPromises(names->sidecars, entries, cancel);
     return entries;
 }
 
-void FolderReader::addPromises(const Names& names, std::vector<DocumentEntry>& entries,
-                               const CancelFlag& cancel) {
+/// There must be room in `entries`: their names are looked at while more are added.
+void FolderReader::addPromises(const std::vector<std::string>& sidecars,
+                               std::vector<DocumentEntry>& entries, const CancelFlag& cancel) {
     // Each mark is a system call on a file of its own, which is most of the work for a store whose
     // contents are still in the cloud.
-    const std::size_t count = names.sidecars.size();
+    const std::size_t count = sidecars.size();
     std::vector<std::optional<std::string>> promised(count);
     const std::size_t pieces = parallelPieces(count);
     inParallel(pieces, [&](std::size_t piece) {
         const std::size_t end = count * (piece + 1) / pieces;
         for (std::size_t i = count * piece / pieces; i < end && !cancel.isCancelled(); ++i)
-            promised[i] = promisedBy(names.sidecars[i]);
+            promised[i] = promisedBy(sidecars[i]);
     });
     // A document that has arrived a moment ago may have its promise still beside it.
     std::unordered_set<std::string_view> present;
-    for (const DirectoryEntry& each : names.plain)
+    for (const DocumentEntry& each : entries)
         present.insert(each.name);
     for (std::size_t i = 0; i < count; ++i) {
-        const std::string& sidecar = names.sidecars[i];
+        const std::string& sidecar = sidecars[i];
         if (!promised[i])
             entries.push_back({sidecar, EntryKind::file, false, nullptr});
         else if (!isHidden(*promised[i]) && !present.contains(*promised[i]))
@@ -104,7 +105,7 @@ std::optional<std::string> FolderReader::promisedBy(const std::string& sidecar) 
     return std::string(document->lastPathComponent());
 }
 
-DocumentEntry FolderReader::entryFor(const DirectoryEntry& found) const {
+DocumentEntry FolderReader::entryFor(DirectoryEntry found) const {
     FileKind kind = found.kind;
     if (kind == FileKind::symbolicLink || kind == FileKind::other) {
         // A link is what it leads to; one that leads nowhere is a document that cannot be opened.
@@ -112,7 +113,8 @@ DocumentEntry FolderReader::entryFor(const DirectoryEntry& found) const {
             FileManager::attributes(folder_.appending(found.name).path(), FollowLinks::yes);
         kind = attributes ? attributes->kind : FileKind::file;
     }
-    return {found.name, kindOf(kind, found.name), false, nullptr};
+    const EntryKind shown = kindOf(kind, found.name);
+    return {std::move(found.name), shown, false, nullptr};
 }
 
 /// What stands under a name now, whichever notice led to it.

@@ -31,9 +31,9 @@ private:
     class Notices;
 
     Result<Names> readNames(const CancelFlag& cancel) const;
-    void addPromises(const Names& names, std::vector<DocumentEntry>& entries,
+    void addPromises(const std::vector<std::string>& sidecars, std::vector<DocumentEntry>& entries,
                      const CancelFlag& cancel);
-    DocumentEntry entryFor(const DirectoryEntry& found) const;
+    DocumentEntry entryFor(DirectoryEntry found) const;
     EntryFact factFor(const std::string& name) const;
     std::optional<std::string> promisedBy(const std::string& sidecar) const;
 
