@@ -48,8 +48,8 @@
     <message numerus="yes">
         <source>.DICT.AVAILABLE.%g</source>
         <translation>
-            <numerusform>%@ verfügbar</numerusform>
-            <numerusform>%@ verfügbar</numerusform>
+            <numerusform>%@ frei</numerusform>
+            <numerusform>%@ frei</numerusform>
         </translation>
     </message>
     <!-- Names, sizes, places -->
@@ -298,7 +298,7 @@
     </message>
     <message>
         <source>Folder Name</source>
-        <translation>Name des Ordners</translation>
+        <translation>Ordnername</translation>
     </message>
     <message>
         <source>Enter a name for this folder.</source>
