@@ -74,6 +74,8 @@ void DownloadView::buildButtons() {
     cancelButton_ = std::make_shared<Button>(ButtonType::system);
     cancelButton_->setTitle(localized("Cancel Download"));
     cancelButton_->setHidden(true);
+    for (const auto& button : {downloadButton_, cancelButton_})
+        button->setTitleWraps(true);
 
     const auto touch = platform::ControlEvent::touchUpInside;
     for (const auto& button : {cloudButton_, downloadButton_})

@@ -233,6 +233,11 @@ void Button::setTitleFont(Font font) {
     implOf(*this).changed();
 }
 
+void Button::setTitleWraps(bool wraps) {
+    implOf(*this).wraps = wraps;
+    implOf(*this).changed();
+}
+
 void Button::setTitleColor(Color color) {
     implOf(*this).titleColor = color;
     setNeedsDisplay();

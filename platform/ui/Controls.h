@@ -55,6 +55,8 @@ public:
     const std::string& title() const;
     void setTitle(std::string_view title);
     void setTitleFont(Font font);
+    /// A title that is wider than the button goes on in a second line instead of eliding.
+    void setTitleWraps(bool wraps);
     /// The colour of the title of a destructive or otherwise special button.
     void setTitleColor(Color color);
     void setImage(const Image& image);

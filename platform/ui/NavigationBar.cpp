@@ -25,7 +25,7 @@ double edgeInset() {
 
 constexpr double gap = 8;
 /// A back button with a title takes no more of the bar than this.
-constexpr double widestBack = 0.4;
+constexpr double widestBack = 0.45;
 constexpr double widestRightSide = 0.6;
 /// How far a title travels while the pages change.
 constexpr double titleTravel = 48;

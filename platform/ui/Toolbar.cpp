@@ -4,6 +4,7 @@
 #include "platform/ui/Direction.h"
 #include "platform/ui/Theme.h"
 #include "platform/ui/Window.h"
+#include "platform/ui/qt/Settings.h"
 #include "platform/ui/qt/ViewImpl.h"
 
 #include <algorithm>
@@ -41,8 +42,10 @@ protected:
     void layoutSubviews() override {
         const double room = bounds().width - 2 * edgeInset();
         double scale = barTitleScale();
-        while (scale > smallestTitleScale && naturalWidth(scale) > room)
-            scale -= 0.05;
+        // With large text it may go down to the usual size.
+        const double smallest = std::min(smallestTitleScale, 1 / textScale());
+        while (scale > smallest && naturalWidth(scale) > room)
+            scale = std::max(smallest, scale - 0.05);
         scaleBarTitles(views_, scale);
         // What still does not fit is shared out; labels and titles elide.
         const double wanted = naturalWidth(scale);
