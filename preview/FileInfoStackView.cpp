@@ -19,6 +19,20 @@ constexpr int locationLines = 3;
 /// Points between a tag's dot and its name.
 constexpr double dotGap = 2;
 
+/// The folders from the outermost on, the arrows between them along the reading direction; each
+/// name runs in its own.
+std::optional<std::string> locationText(const platform::Url& url) {
+    std::optional<std::string> text = FileUtils::displayableLocationForURL(url);
+    if (!text || !platform::Application::shared().isRightToLeft())
+        return text;
+    constexpr std::string_view arrow = " \u25B8 ";
+    constexpr std::string_view mirrored = "\u2069 \u25C2 \u2068";
+    for (std::size_t at = 0; (at = text->find(arrow, at)) != std::string::npos;
+         at += mirrored.size())
+        text->replace(at, arrow.size(), mirrored);
+    return "\u2067\u2068" + *text + "\u2069\u2069";
+}
+
 void showText(const std::shared_ptr<FileInfoCell>& cell, const VXItem::Text& text) {
     if (cell && text && cell->valueLabel()->text() != *text)
         cell->valueLabel()->setText(*text);
@@ -73,7 +87,7 @@ void FileInfoStackView::setItem(const std::shared_ptr<VXItem>& item) {
     addRow("Kind", item->localizedTypeDescription());
     addRow("Size", item->friendlyFileSize());
     if (item->url())
-        addRow("Where", FileUtils::displayableLocationForURL(*item->url()), locationLines);
+        addRow("Where", locationText(*item->url()), locationLines);
     if (const auto created = item->friendlyCreationDate(DateStyle::longStyle))
         creationDateCell_ = addCell(localized("Created"), *created, 1);
     if (const auto modified = item->friendlyContentModificationDate(DateStyle::longStyle))

@@ -93,6 +93,8 @@ void LabelImpl::paintStyled(QPainter& painter, const QRectF& bounds) const {
     const QFontMetricsF metrics(toQt(font));
     painter.setFont(toQt(font));
     painter.setPen(toQt(color));
+    // A run's space before the next one stays between them.
+    painter.setLayoutDirection(rightToLeft ? Qt::RightToLeft : Qt::LeftToRight);
     for (const StyledRun& run : styled.runs) {
         const double room = bounds.width() - at;
         const double width = std::min(boxOf(run, font).width, room);

@@ -5,6 +5,7 @@
 #include "platform/base/Text.h"
 #include "platform/documents/DisplayName.h"
 #include "platform/ui/qt/Bridge.h"
+#include "platform/ui/qt/Settings.h"
 
 #include <QStringList>
 
@@ -22,6 +23,16 @@ QString sizeText(std::uint64_t bytes) {
 
 QString countText(std::size_t items) {
     return toQt(localizedPlural(".DICT.ITEMS.%d", static_cast<long long>(items)));
+}
+
+/// "Documents › Trips", with each name in its own direction and their order in the program's.
+QString placeText(const std::string& place) {
+    const QString arrow = QStringLiteral(" › ");
+    const QChar outer(isRightToLeft() ? 0x2067 : 0x2066);
+    QStringList names = shownName(place).split(arrow);
+    for (QString& name : names)
+        name = isolated(name);
+    return outer + names.join(arrow) + QChar(0x2069);
 }
 
 } // namespace
@@ -59,7 +70,7 @@ std::vector<QString> rowDetails(const DocumentEntry& entry, const EntryDetails* 
         shorter.append(isolated(brief));
     };
     if (!place.empty())
-        add(shownName(place), shownName(place));
+        add(placeText(place), placeText(place));
     if (details && !isDocument(entry.kind) && details->itemCount)
         add(countText(*details->itemCount), countText(*details->itemCount));
     if (details && isDocument(entry.kind)) {
