@@ -20,7 +20,8 @@ namespace {
 struct Look {
     std::string name;
     platform::Size size;
-    bool rightToLeft = false;
+    /// Every text, figure and name of a library is in it, and the screens run in its direction.
+    std::string language = "en_US";
     double scale = 1;
 };
 
@@ -39,14 +40,20 @@ void makeSample(const std::string& root) {
     sampleFolder = root;
 }
 
+/// The language that the program finds when it starts.
+void speak(const std::string& language) {
+    setenv("LC_ALL", (language + ".UTF-8").c_str(), 1);
+    platform::loadLocalizedTexts(platform::systemLanguage());
+}
+
 /// The program on the sample, in one form of the window.
 struct Tour : test::ProgramHouse {
     explicit Tour(Look look, std::optional<std::uint64_t> rate = {}) : look_(std::move(look)) {
         remote = sampleFolder;
         rateLimit = rate;
+        speak(look_.language);
         signIn();
         launch(look_.size);
-        application->setRightToLeft(look_.rightToLeft);
         untilShows("Travel");
     }
 
@@ -143,7 +150,7 @@ void download(const Look& look) {
     Tour tour(look, 6'291'456 / 10);
     tour.open("Documents");
     tour.open("Coast Panorama.png");
-    tour.tap(*tour.button("Download to View"));
+    tour.tap(*tour.button(platform::localized("Download to View")));
     tour.calmDown();
     tour.advance(3s);
     tour.picture("download-running");
@@ -152,6 +159,7 @@ void download(const Look& look) {
 }
 
 void signedOut(const Look& look) {
+    speak(look.language);
     test::ProgramHouse house;
     house.launch(look.size);
     house.calmDown();
@@ -171,19 +179,21 @@ void show(const Look& look) {
 int main(int argc, char** argv) {
     if (argc > 1)
         folder = argv[1];
-    platform::loadLocalizedTexts("en_US");
     const test::TemporaryFolder sample;
     makeSample(sample / "Sample");
     const Look phone{"phone", test::phone};
     const Look tablet{"tablet", test::tablet};
+    const Look german{"phone-german", {360, 640}, "de_DE"};
+    const Look arabic{"phone-arabic", test::phone, "ar_EG", 2};
     show(phone);
     show(tablet);
     show({"phone-landscape", {844, 390}});
-    show({"tablet-portrait", {768, 1024}});
-    show({"phone-rtl", test::phone, true, 2});
-    download(phone);
-    download(tablet);
-    signedOut(phone);
-    signedOut(tablet);
+    show(german);
+    show({"tablet-russian", {768, 1024}, "ru_RU"});
+    show(arabic);
+    for (const Look& look : {phone, tablet, german, arabic}) {
+        download(look);
+        signedOut(look);
+    }
     return 0;
 }
