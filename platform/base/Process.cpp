@@ -6,7 +6,9 @@
 
 namespace platform {
 
-std::uint64_t processIdentifier() { return static_cast<std::uint64_t>(getpid()); }
+std::uint64_t processIdentifier() {
+    return static_cast<std::uint64_t>(getpid());
+}
 
 std::optional<std::string> hostName() {
     std::array<char, 256> buffer{};

@@ -36,7 +36,7 @@ FileDescriptor newSocket() {
     return FileDescriptor(::socket(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC | SOCK_NONBLOCK, 0));
 }
 
-/// The user's alone, as the specification of that folder has it.
+/// The user's alone, as the rules for that folder want it.
 bool isPrivateFolder(const std::string& path) {
     struct stat found {};
     return ::stat(PathText(path).c_str(), &found) == 0 && S_ISDIR(found.st_mode) &&

@@ -151,10 +151,10 @@ TEST_F(ControlsTest, WordsAreCapitalisedAsTheyAreTypedButNotAgainstTheUser) {
     type("new folder");
     EXPECT_EQ(field->text(), "New Folder");
     field->setText("");
-    type("i");
+    type("k");
     press(Key::backspace);
-    type("iPad");
-    EXPECT_EQ(field->text(), "iPad") << "a capital that was taken back stays so";
+    type("kWatt");
+    EXPECT_EQ(field->text(), "kWatt") << "a capital that was taken back stays so";
     field->setText("");
     commit("naïve");
     EXPECT_EQ(field->text(), "naïve") << "what an input method hands over is final";
