@@ -9,4 +9,8 @@ PrivateBus::PrivateBus(const std::string& folder)
       address_(daemon_->readLine().value_or("")) {
 }
 
+bool PrivateBus::hasCaller() {
+    return run({{"/bin/sh", "-c", "command -v busctl"}}).status == 0;
+}
+
 } // namespace test

@@ -15,6 +15,8 @@ public:
     /// False where no bus daemon is installed; then the case is skipped.
     bool works() const { return !address_.empty(); }
     const std::string& address() const { return address_; }
+    /// Whether the caller that tests use on the bus (busctl, of the package systemd) is installed.
+    static bool hasCaller();
     /// Ends the bus, as a desk that goes away does.
     void end() { daemon_.reset(); }
 
