@@ -30,7 +30,7 @@ public:
         const auto token = Platform::current().fileProgress().publish(item, progress);
         progress->update(500'000, 2'000'000);
         cancel.setHandler([this] { answer.set_value(makeError(ErrorCode::userCancelled)); });
-        Failure failure = answer.get_future().get();
+        Failure failure = answered.get();
         cancel.setHandler({});
         arrived = !failure;
         return failure;
@@ -42,6 +42,8 @@ public:
     Url promised;
     std::atomic<bool> arrived{false};
     std::promise<Failure> answer;
+    /// For as many fetches as there are: a coordinated read may ask again.
+    std::shared_future<Failure> answered = answer.get_future().share();
 };
 
 struct Listener : DocumentInteractionControllerDelegate {
