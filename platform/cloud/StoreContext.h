@@ -44,4 +44,15 @@ inline BaseRow baseRowOf(const Place& place, const std::string& etag, std::uint6
     return {place, etag, size, std::move(hash), here.identity, here.modified, here.changed};
 }
 
+/// An error of the disk about a file of the store's own (a promise, a staged content, the records),
+/// said of what people know: the document or the store. Others stay as they are.
+inline Error namedForPeople(const Error& error, std::string_view subject) {
+    for (const ErrorCode code :
+         {ErrorCode::outOfSpace, ErrorCode::readOnlyVolume, ErrorCode::writeNoPermission,
+          ErrorCode::readNoPermission, ErrorCode::unknownIo})
+        if (error.is(code))
+            return makeError(code, subject);
+    return error;
+}
+
 } // namespace platform

@@ -94,13 +94,15 @@ void StoreEngine::openForChanges() {
         return;
     }
     platformLog(LogLevel::error, "cloud: cannot open the store: %@", store.error());
-    const bool passing =
-        store.error().is(ErrorCode::itemBusy) || store.error().is(ErrorCode::outOfSpace);
+    const Error problem = namedForPeople(store.error(), layout_.folder);
+    const bool passing = problem.is(ErrorCode::itemBusy) || problem.is(ErrorCode::outOfSpace) ||
+                         problem.is(ErrorCode::writeNoPermission) ||
+                         problem.is(ErrorCode::readOnlyVolume);
     if (passing) {
         openForReading();
         retryLater([](StoreEngine& engine) { engine.openForChanges(); });
     }
-    setProblem(store.error());
+    setProblem(problem);
 }
 
 void StoreEngine::openForReading() {

@@ -1,5 +1,6 @@
 #include "platform/cloud/StoreMoves.h"
 
+#include "platform/base/Log.h"
 #include "platform/base/Text.h"
 #include "platform/cloud/StoreFileSystem.h"
 #include "platform/files/PathText.h"
@@ -53,7 +54,10 @@ Failure StoreMoves::movePresent(const Url& from, const Url& to, bool directory) 
     const Result<FileAttributes> attributes = context_.disk.attributes(to.path());
     if (!item || !attributes)
         return context_.database.takeFault();
-    return recordMove(*item, *target, *attributes, false);
+    if (Failure failure = recordMove(*item, *target, *attributes, false))
+        return undone(*failure, from, to,
+                      [&] { return context_.disk.rename(to.path(), from.path()); });
+    return std::nullopt;
 }
 
 Failure StoreMoves::movePromise(const Url& from, const Url& to, const FoundSidecar& promise) {
@@ -66,14 +70,29 @@ Failure StoreMoves::movePromise(const Url& from, const Url& to, const FoundSidec
     const Result<FoundSidecar> moved =
         renameSidecar(promise, std::string(folderOf(to.path())), std::string(nameOf(to.path())));
     if (!moved)
-        return moved.error();
+        return namedForPeople(moved.error(), from.lastPathComponent());
     // A copy of a promise has no row of its own that could follow.
     if (context_.database.pathOf(promise.mark.item) != relative(from))
         return context_.database.takeFault();
     const Result<FileAttributes> attributes = context_.disk.attributes(moved->path);
     if (!attributes)
         return attributes.error();
-    return recordMove(promise.mark.item, *target, *attributes, true);
+    if (Failure failure = recordMove(promise.mark.item, *target, *attributes, true))
+        return undone(*failure, from, to, [&]() -> Failure {
+            const Result<FoundSidecar> back = renameSidecar(
+                *moved, std::string(folderOf(from.path())), std::string(nameOf(from.path())));
+            return back ? Failure() : Failure(back.error());
+        });
+    return std::nullopt;
+}
+
+Error StoreMoves::undone(const Error& cause, const Url& from, const Url& to,
+                         const std::function<Failure()>& undo) {
+    platformLog(LogLevel::warning, "cloud: the move of “%@” to “%@” is undone: %@", from, to,
+                cause);
+    if (const Failure failure = undo())
+        platformLog(LogLevel::error, "cloud: “%@” stays under its new name: %@", to, *failure);
+    return namedForPeople(cause, from.lastPathComponent());
 }
 
 Result<FoundSidecar> StoreMoves::renameSidecar(const FoundSidecar& promise,

@@ -2,6 +2,8 @@
 
 #include "platform/cloud/StoreContext.h"
 
+#include <functional>
+
 namespace platform {
 
 /// The move that works for documents, promises and folders alike, on the store's queue: the disk
@@ -23,6 +25,10 @@ private:
                                        const std::string& name);
     Failure recordMove(ItemId item, const std::string& to, const FileAttributes& attributes,
                        bool promise);
+    /// Puts back on the disk what could not be recorded, so that the answer is true; the error for
+    /// people.
+    static Error undone(const Error& cause, const Url& from, const Url& to,
+                        const std::function<Failure()>& undo);
     /// The item of a folder of the disk, made where the store did not know it yet.
     Result<ItemId> folderItem(const std::string& relative);
 

@@ -47,7 +47,7 @@ Failure StoreRemovals::remove(const std::string& relative) {
     }
     if (promise) {
         if (Failure failure = context_.disk.removeFile(promise->path))
-            return failure;
+            return namedForPeople(*failure, nameOf(relative));
         // The sidecar of a copied promise says less of the place than the record does.
         if (!item && context_.database.pathOf(promise->mark.item) == relative)
             item = promise->mark.item;

@@ -149,7 +149,7 @@ Failure Transfers::run(Transfer& transfer) {
     }
     if (failure && !failure->is(ErrorCode::userCancelled))
         platformLog(LogLevel::warning, "cloud: cannot download “%@”: %@", *remotePath, *failure);
-    return failure;
+    return failure ? namedForPeople(*failure, transfer.url.lastPathComponent()) : failure;
 }
 
 Failure Transfers::attempt(Transfer& transfer, const std::string& remotePath, std::uint64_t size) {

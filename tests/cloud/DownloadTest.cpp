@@ -141,7 +141,10 @@ TEST_F(Download, AFullDiskSaysSo) {
     close();
     disk = test::fullFileSystem();
     ASSERT_EQ(open(), std::nullopt);
-    EXPECT_TRUE(fetch("A/one.txt")->is(ErrorCode::outOfSpace));
+    const Failure refused = fetch("A/one.txt");
+    ASSERT_TRUE(refused && refused->is(ErrorCode::outOfSpace));
+    EXPECT_NE(refused->localizedDescription->find("one.txt"), std::string::npos)
+        << "not the name of what was staged";
     expectPromiseAlone("A/one.txt");
 }
 

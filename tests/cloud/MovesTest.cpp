@@ -1,5 +1,7 @@
 #include "tests/cloud/StoreFixture.h"
 
+#include <sqlite3.h>
+
 using namespace platform;
 
 namespace {
@@ -68,6 +70,25 @@ TEST_F(Moves, AFolderTakesItsPromisesAlongButNotOutOfTheStore) {
     ASSERT_EQ(fetch("Made by hand/Inner/two.txt"), std::nullopt);
     EXPECT_EQ(move("Made by hand/Inner/two.txt", home / "two.txt"), std::nullopt);
     EXPECT_EQ(home.read("two.txt"), "2");
+}
+
+TEST_F(Moves, WhatCannotBeRecordedStaysUnderItsName) {
+    givenListed();
+    ASSERT_EQ(fetch("A/two.txt"), std::nullopt);
+    sqlite3* other = nullptr;
+    ASSERT_EQ(sqlite3_open(layout.database().c_str(), &other), SQLITE_OK);
+    ASSERT_EQ(sqlite3_exec(other,
+                           "CREATE TRIGGER refuse BEFORE UPDATE ON item BEGIN "
+                           "SELECT RAISE(ABORT, 'refused'); END",
+                           nullptr, nullptr, nullptr),
+              SQLITE_OK);
+    sqlite3_close(other);
+    EXPECT_TRUE(move("A/one.txt", "B/uno.txt"));
+    EXPECT_TRUE(move("A/two.txt", "B/due.txt"));
+    EXPECT_TRUE(isPromised("A/one.txt"));
+    EXPECT_FALSE(isPromised("B/uno.txt"));
+    EXPECT_EQ(local("A/two.txt"), "2");
+    EXPECT_FALSE(local("B/due.txt"));
 }
 
 TEST_F(Moves, StoppedAtAnyStepThePromiseIsAtOneOfItsTwoPlaces) {
