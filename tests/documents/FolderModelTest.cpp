@@ -90,6 +90,16 @@ TEST_F(Folder, readsDetailsOfTheRowsInViewAndCountsFolders) {
     EXPECT_EQ(details(2)->typeIdentifier, "public.plain-text");
 }
 
+TEST_F(Folder, countsAFolderAnewWhenSomethingWentIntoIt) {
+    house.signIn();
+    house.givenFolder("Box");
+    house.givenFile("a.txt");
+    show();
+    ASSERT_EQ(details(0)->itemCount, 0U);
+    house.rename("a.txt", "Box/a.txt");
+    EXPECT_TRUE(house.until([this] { return model->detailsAt(0)->itemCount == 1U; }));
+}
+
 TEST_F(Folder, keepsTheRowOfAPromiseThatArrives) {
     house.givenRemote("Report.pdf");
     house.signIn();

@@ -113,11 +113,17 @@ void FolderModel::takeChanges(const std::vector<EntryChanges>& changes) {
         return;
     if (observer_)
         observer_->rowsWillChange();
+    const std::size_t before = count();
     bool changed = false;
     for (const EntryChanges& each : changes)
         changed = table_.apply(each) || changed;
     endInView_ = std::min(endInView_, count());
     firstInView_ = std::min(firstInView_, endInView_);
+    // What has gone from here may be in one of the folders now, which tell nothing of their items.
+    if (count() < before)
+        for (std::size_t i = firstInView_; i < endInView_; ++i)
+            if (!isDocument(entryAt(i).kind))
+                table_.markDetailsStale(idAt(i));
     if (observer_ && changed)
         observer_->rowsDidChange();
     wantDetails();
