@@ -16,7 +16,9 @@ Failure checkContents(const Url& file) {
         return attributes.error();
     if (attributes->kind != FileKind::file)
         return makeErrorWithText(ErrorCode::unsupportedOperation,
-                                 localized("This is a folder, not a document."));
+                                 attributes->kind == FileKind::directory
+                                     ? localized("This is a folder, not a document.")
+                                     : localized("This kind of document cannot be shown here."));
     if (attributes->size == 0)
         return makeErrorWithText(ErrorCode::readCorrupt,
                                  localized("There is nothing in this document."));
