@@ -6,6 +6,12 @@
 #include "platform/files/FileCoordinator.h"
 #include "platform/files/FileManager.h"
 
+#include <QCoreApplication>
+
+#include <atomic>
+#include <utility>
+#include <vector>
+
 namespace platform {
 namespace {
 
@@ -25,6 +31,44 @@ Failure checkContents(const Url& file) {
     return std::nullopt;
 }
 
+/// The queues of workers that have gone, until what they were doing is done. Nobody waits for that
+/// but the end of the toolkit, whose threads and locks a decoder may be using. Of the main thread.
+class Leftovers {
+public:
+    static Leftovers& shared() {
+        static Leftovers* const leftovers = new Leftovers(); // lives as long as the process
+        return *leftovers;
+    }
+
+    void take(std::unique_ptr<WorkQueue> queue, Job last) {
+        std::erase_if(queues_, [](const Entry& each) { return each.over->load(); });
+        const auto over = std::make_shared<std::atomic<bool>>(false);
+        queue->async([last = std::move(last), over] {
+            if (last)
+                last();
+            *over = true;
+        });
+        queues_.push_back({std::move(queue), over});
+        if (!std::exchange(known_, true))
+            qAddPostRoutine([] { shared().finish(); });
+    }
+
+private:
+    struct Entry {
+        std::unique_ptr<WorkQueue> queue;
+        std::shared_ptr<std::atomic<bool>> over;
+    };
+
+    void finish() {
+        queues_.clear();
+        known_ = false;
+    }
+
+    std::vector<Entry> queues_;
+    /// The toolkit will call at its end.
+    bool known_ = false;
+};
+
 } // namespace
 
 void PreviewToken::cancel() {
@@ -40,17 +84,12 @@ void PreviewToken::ifWanted(const Job& job) {
 
 PreviewWorker::PreviewWorker(MainQueue& main)
     : main_(main),
-      queue_(std::make_shared<WorkQueue>("platform.preview", WorkPriority::userInitiated)) {
+      queue_(std::make_unique<WorkQueue>("platform.preview", WorkPriority::userInitiated)) {
 }
 
 PreviewWorker::~PreviewWorker() {
     token_->cancel();
-    // The queue's own last job lets go of it, so that its thread ends by itself.
-    const std::shared_ptr<WorkQueue> queue = std::move(queue_);
-    queue->async([queue, last = std::move(lastJob_)] {
-        if (last)
-            last();
-    });
+    Leftovers::shared().take(std::move(queue_), std::move(lastJob_));
 }
 
 void PreviewWorker::run(Work work) {

@@ -28,8 +28,9 @@ private:
     std::mutex mutex_;
 };
 
-/// Where a renderer does what takes time. Never waited for: a decoder cannot be stopped in the
-/// middle of a picture, and nobody who goes back wants to wait for it. Belongs to the main thread.
+/// Where a renderer does what takes time. Waited for by the end of the application alone: a decoder
+/// cannot be stopped in the middle of a picture, and nobody who goes back wants to wait for it.
+/// Belongs to the main thread.
 class PreviewWorker {
 public:
     /// Runs on the queue and answers what is then to be done on the main thread (may be nothing).
@@ -50,7 +51,7 @@ public:
 private:
     MainQueue& main_;
     std::shared_ptr<PreviewToken> token_ = std::make_shared<PreviewToken>();
-    std::shared_ptr<WorkQueue> queue_;
+    std::unique_ptr<WorkQueue> queue_;
     Job lastJob_;
 };
 
