@@ -103,6 +103,15 @@ void Program::kill(int signal) const {
         ::kill(group_ ? -pid_ : pid_, signal);
 }
 
+void Program::stop() const {
+    kill(SIGSTOP);
+    siginfo_t stopped{};
+    while (pid_ > 0 && !status_ &&
+           ::waitid(P_PID, static_cast<id_t>(pid_), &stopped, WSTOPPED | WEXITED | WNOWAIT) != 0 &&
+           errno == EINTR)
+        ;
+}
+
 int Program::wait() {
     int status = 0;
     while (!status_ && (::waitpid(pid_, &status, 0) == pid_ || errno != EINTR))

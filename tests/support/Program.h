@@ -30,6 +30,9 @@ public:
     void writeLine(const std::string& line) const;
     void closeInput();
     void kill(int signal) const;
+    /// Stops it, and answers once the kernel has: a signal alone leaves its threads running a
+    /// while.
+    void stop() const;
     /// Waits for its end; a signal N counts as 128 + N.
     int wait();
 

@@ -160,7 +160,7 @@ TEST_F(Instances, WithNoPlaceForTheLockItStartsAllTheSame) {
 TEST_F(Instances, OneThatDoesNotAnswerIsNamedAndNotDoubled) {
     Program first(peer("claim"));
     ASSERT_EQ(first.readLine(), "first");
-    first.kill(SIGSTOP);
+    first.stop();
     options.patience = std::chrono::milliseconds(50);
     const auto second = SingleInstance::claim(options, {{url}});
     first.kill(SIGCONT);
