@@ -21,7 +21,11 @@ constexpr off_t fileLimit = 4096;
 /// Tells whether a file's state changed since it was asked last; false the first time.
 class FileChanges {
 public:
-    explicit FileChanges(std::string path) : path_(std::move(path)) {}
+    /// What makes a change: a file that only grows has one with each new size. Its date would tell
+    /// of the same write twice, because the kernel sets it a moment before the size.
+    enum class By { size, sizeAndDate };
+
+    FileChanges(std::string path, By by) : path_(std::move(path)), by_(by) {}
 
     bool happened() {
         const std::lock_guard lock(mutex_);
@@ -39,10 +43,13 @@ private:
 
     State read() const {
         const auto found = FileManager::attributes(path_, FollowLinks::yes);
-        return found ? State{found->identity, found->size, found->modified} : State{};
+        if (!found)
+            return {};
+        return {found->identity, found->size, by_ == By::sizeAndDate ? found->modified : Date()};
     }
 
     std::string path_;
+    By by_;
     std::mutex mutex_;
     std::optional<State> known_;
 };
@@ -65,9 +72,9 @@ public:
         auto observer = std::make_shared<Observer>();
         observer->watcher = watcher_;
         const auto shared = std::make_shared<const Job>(std::move(handler));
-        observer->watch(path, queue, shared);
+        observer->watch(path, FileChanges::By::size, queue, shared);
         if (name == managedSettingsChangedNotice)
-            observer->watch(managedFile_, queue, shared);
+            observer->watch(managedFile_, FileChanges::By::sizeAndDate, queue, shared);
         const std::lock_guard lock(mutex_);
         std::erase_if(observers_, [](const auto& each) { return each.expired(); });
         observers_.push_back(observer);
@@ -90,9 +97,9 @@ private:
         std::shared_ptr<DirectoryWatcher> watcher;
         std::vector<std::unique_ptr<ItemWatch>> watches;
 
-        void watch(const std::string& path, Executor& queue,
+        void watch(const std::string& path, FileChanges::By by, Executor& queue,
                    const std::shared_ptr<const Job>& handler) {
-            const auto file = std::make_shared<FileChanges>(path);
+            const auto file = std::make_shared<FileChanges>(path, by);
             watches.push_back(std::make_unique<ItemWatch>(*watcher, path, ItemWatch::Scope::item,
                                                           queue, [file, handler] {
                                                               if (file->happened())
