@@ -3,8 +3,8 @@
 #
 #   bench/peers/start-to-listing.sh [ENTRIES] [ROUNDS]      10000 entries and 7 rounds without
 #
-# Wants a release build of tavrin and pelmora. Installs the peer (pcmanfm-qt), Xvfb and
-# xdotool when they are missing. Both programs show the same folder on the same virtual screen. A
+# Wants a release build of tavrin and pelmora. Installs the peer (pcmanfm-qt), Xvfb, xdotool and
+# D-Bus when they are missing: the peer ends at once where there is no session bus. Both programs show the same folder on the same virtual screen. A
 # Tavrin starts with its libraries; the one that is the folder is opened at once by the keyboard. A
 # listing counts as complete when the window is there and the process has used no processor time for
 # half a second; that half second is not counted. Memory is the proportional set size at that moment.
@@ -17,7 +17,7 @@ bin=$root/build/${TAVRIN_PRESET:-release}/bin
 quiet=50 # hundredths of a second
 
 missing=()
-for package in pcmanfm-qt xvfb xdotool; do
+for package in pcmanfm-qt xvfb xdotool dbus; do
     dpkg -s "$package" >/dev/null 2>&1 || missing+=("$package")
 done
 if ((${#missing[@]})); then
@@ -35,7 +35,11 @@ unset DBUS_SESSION_BUS_ADDRESS WAYLAND_DISPLAY
 export DISPLAY=:97
 Xvfb "$DISPLAY" -screen 0 1280x900x24 >/dev/null 2>&1 &
 screen=$!
-trap 'kill "$screen" 2>/dev/null; rm -rf "$home"' EXIT
+exec 3< <(exec dbus-daemon --session --nofork --print-address)
+bus=$!
+trap 'kill "$screen" "$bus" 2>/dev/null; rm -rf "$home"' EXIT
+read -r DBUS_SESSION_BUS_ADDRESS <&3
+export DBUS_SESSION_BUS_ADDRESS
 until xdotool getmouselocation >/dev/null 2>&1; do sleep 0.05; done
 
 mkdir -p "$home/remote/Documents"
