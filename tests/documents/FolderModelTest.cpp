@@ -90,14 +90,30 @@ TEST_F(Folder, readsDetailsOfTheRowsInViewAndCountsFolders) {
     EXPECT_EQ(details(2)->typeIdentifier, "public.plain-text");
 }
 
-TEST_F(Folder, countsAFolderAnewWhenSomethingWentIntoIt) {
+TEST_F(Folder, countsAFolderAnewWhenSomethingGoesIntoIt) {
     house.signIn();
     house.givenFolder("Box");
     house.givenFile("a.txt");
     show();
     ASSERT_EQ(details(0)->itemCount, 0U);
+    // Items that follow one another quickly are counted together, a moment later.
+    const auto untilBoxHas = [this](std::size_t items) {
+        return house.until([&] {
+            house.clock->advance(std::chrono::seconds(1));
+            model->setRowsInView(0, model->count());
+            return model->count() > 0 && model->detailsAt(0) &&
+                   model->detailsAt(0)->itemCount == items;
+        });
+    };
     house.rename("a.txt", "Box/a.txt");
-    EXPECT_TRUE(house.until([this] { return model->detailsAt(0)->itemCount == 1U; }));
+    EXPECT_TRUE(untilBoxHas(1));
+    house.givenFile("Box/b.txt");
+    EXPECT_TRUE(untilBoxHas(2));
+    house.remove("Box");
+    house.givenFile("Box/c.txt");
+    EXPECT_TRUE(untilBoxHas(1));
+    house.givenFile("Box/d.txt");
+    EXPECT_TRUE(untilBoxHas(2));
 }
 
 TEST_F(Folder, keepsTheRowOfAPromiseThatArrives) {

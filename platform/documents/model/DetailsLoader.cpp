@@ -43,12 +43,17 @@ EntryDetails readDetails(const Url& url, EntryKind kind, const CloudDocumentServ
 }
 
 struct DetailsLoader::State : std::enable_shared_from_this<DetailsLoader::State> {
-    State(CloudDocumentService& theDocuments, MainQueue& theMain, Receiver theReceiver)
-        : documents(theDocuments), main(theMain), receiver(std::move(theReceiver)) {}
+    State(CloudDocumentService& theDocuments, MainQueue& theMain, Receiver theReceiver,
+          Counting theCounting)
+        : documents(theDocuments),
+          main(theMain),
+          receiver(std::move(theReceiver)),
+          willCount(std::move(theCounting)) {}
 
     CloudDocumentService& documents;
     MainQueue& main;
     const Receiver receiver;
+    const Counting willCount;
     std::unique_ptr<WorkQueue> queue =
         std::make_unique<WorkQueue>("platform.details", WorkPriority::userInitiated);
     std::mutex mutex;
@@ -132,17 +137,20 @@ struct DetailsLoader::State : std::enable_shared_from_this<DetailsLoader::State>
             reading = next.first;
             counting = cancel;
         }
+        if (willCount)
+            willCount(next.first.row, next.first.url);
         const auto count = FolderReader::count(next.first.url, documents, *cancel);
         {
             const std::lock_guard lock(mutex);
             reading.reset();
             counting.reset();
         }
-        if (count && count != next.second.itemCount) {
-            next.second.itemCount = count;
-            tell({{next.first.row, next.first.version,
-                   std::make_shared<const EntryDetails>(std::move(next.second))}});
-        }
+        if (cancel->isCancelled())
+            return true;
+        next.second.itemCount = count;
+        next.second.counted = true;
+        tell({{next.first.row, next.first.version,
+               std::make_shared<const EntryDetails>(std::move(next.second))}});
         return true;
     }
 
@@ -155,8 +163,9 @@ struct DetailsLoader::State : std::enable_shared_from_this<DetailsLoader::State>
     }
 };
 
-DetailsLoader::DetailsLoader(CloudDocumentService& documents, MainQueue& main, Receiver receiver)
-    : state_(std::make_shared<State>(documents, main, std::move(receiver))) {
+DetailsLoader::DetailsLoader(CloudDocumentService& documents, MainQueue& main, Receiver receiver,
+                             Counting counting)
+    : state_(std::make_shared<State>(documents, main, std::move(receiver), std::move(counting))) {
 }
 
 DetailsLoader::~DetailsLoader() {

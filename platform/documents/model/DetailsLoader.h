@@ -33,8 +33,11 @@ public:
     };
     /// Called on the main queue, not any more once the loader is gone.
     using Receiver = std::function<void(std::vector<Answer> answers)>;
+    /// Called on the loader's queue before a folder is counted.
+    using Counting = std::function<void(RowId row, const Url& folder)>;
 
-    DetailsLoader(CloudDocumentService& documents, MainQueue& main, Receiver receiver);
+    DetailsLoader(CloudDocumentService& documents, MainQueue& main, Receiver receiver,
+                  Counting counting = {});
     /// Waits for the look that is under way.
     ~DetailsLoader();
     DetailsLoader(const DetailsLoader&) = delete;

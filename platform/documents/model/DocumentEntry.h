@@ -46,8 +46,10 @@ struct EntryDetails {
     std::string typeIdentifier;
     bool promised = false;
     bool shared = false;
-    /// Of a folder, once it was counted.
+    /// Of a folder, once it was counted; none where that cannot be done.
     std::optional<std::size_t> itemCount;
+    /// False while the number is an earlier one, or none yet.
+    bool counted = false;
 };
 
 /// Tells a row from all others of its list for as long as it lives, through renames and re-reads.

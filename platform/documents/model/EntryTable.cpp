@@ -222,8 +222,10 @@ bool EntryTable::setDetails(RowId id, std::uint32_t version,
 }
 
 void EntryTable::markDetailsStale(RowId id) {
-    if (Row* const row = rowOf(id))
+    if (Row* const row = rowOf(id)) {
         row->detailsStale = true;
+        ++row->version; // what is being read may be older
+    }
 }
 
 EntryTable::Slot EntryTable::takeSlot(DocumentEntry entry) {

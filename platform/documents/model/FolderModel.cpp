@@ -4,6 +4,7 @@
 #include "platform/documents/model/StoreRootReader.h"
 
 #include <algorithm>
+#include <unordered_set>
 
 namespace platform {
 namespace {
@@ -16,16 +17,19 @@ std::unique_ptr<EntrySource> sourceFor(const Url& folder, const CloudDocumentSer
 }
 
 bool isComplete(const EntryTable::Row& row) {
-    return row.details && !row.detailsStale &&
-           (isDocument(row.entry.kind) || row.details->itemCount);
+    return row.details && !row.detailsStale && (isDocument(row.entry.kind) || row.details->counted);
 }
 
 } // namespace
 
 FolderModel::FolderModel(const Url& folder, const DocumentServices& services)
     : folder_(folder),
-      details_(services.documents, services.mainQueue,
-               [this](const auto& answers) { takeDetails(answers); }),
+      folders_(services.watcher, services.mainQueue,
+               [this](const auto& rows) { takeFolderChanges(rows); }),
+      details_(
+          services.documents, services.mainQueue,
+          [this](const auto& answers) { takeDetails(answers); },
+          [this](RowId row, const Url& url) { folders_.follow(row, url); }),
       feed_(sourceFor(folder, services.documents), services.mainQueue, services.watcher,
             {[this](std::vector<DocumentEntry> sorted, bool replaced) {
                  takeReading(std::move(sorted), replaced);
@@ -82,7 +86,24 @@ void FolderModel::setRowsInView(std::size_t first, std::size_t end) {
     wantDetails();
 }
 
+/// Those that come into view again are counted again.
+void FolderModel::followFoldersInView() {
+    std::unordered_set<RowId> inView;
+    for (std::size_t i = firstInView_; i < endInView_; ++i)
+        if (!isDocument(entryAt(i).kind))
+            inView.insert(idAt(i));
+    for (const RowId left : folders_.keepOnly(inView))
+        table_.markDetailsStale(left);
+}
+
+void FolderModel::takeFolderChanges(const std::vector<RowId>& rows) {
+    for (const RowId row : rows)
+        table_.markDetailsStale(row);
+    wantDetails();
+}
+
 void FolderModel::wantDetails() {
+    followFoldersInView();
     std::vector<DetailsLoader::Request> requests;
     for (std::size_t i = firstInView_; i < endInView_; ++i) {
         const EntryTable::Row& row = table_.at(i);
@@ -113,17 +134,11 @@ void FolderModel::takeChanges(const std::vector<EntryChanges>& changes) {
         return;
     if (observer_)
         observer_->rowsWillChange();
-    const std::size_t before = count();
     bool changed = false;
     for (const EntryChanges& each : changes)
         changed = table_.apply(each) || changed;
     endInView_ = std::min(endInView_, count());
     firstInView_ = std::min(firstInView_, endInView_);
-    // What has gone from here may be in one of the folders now, which tell nothing of their items.
-    if (count() < before)
-        for (std::size_t i = firstInView_; i < endInView_; ++i)
-            if (!isDocument(entryAt(i).kind))
-                table_.markDetailsStale(idAt(i));
     if (observer_ && changed)
         observer_->rowsDidChange();
     wantDetails();

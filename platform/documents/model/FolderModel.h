@@ -4,6 +4,7 @@
 #include "platform/documents/model/DetailsLoader.h"
 #include "platform/documents/model/EntryTable.h"
 #include "platform/documents/model/FolderFeed.h"
+#include "platform/documents/model/FolderWatches.h"
 #include "platform/documents/model/RowModel.h"
 
 #include <functional>
@@ -50,7 +51,9 @@ private:
     void takeFailure(const Error& error);
     void takeDetails(const std::vector<DetailsLoader::Answer>& answers);
     void setState(ModelState state, std::optional<Error> error);
+    void takeFolderChanges(const std::vector<RowId>& rows);
     void wantDetails();
+    void followFoldersInView();
 
     Url folder_;
     EntryTable table_;
@@ -58,6 +61,7 @@ private:
     std::optional<Error> error_;
     std::size_t firstInView_ = 0;
     std::size_t endInView_ = 0;
+    FolderWatches folders_; // used on the queue of the details
     DetailsLoader details_;
     FolderFeed feed_;
 };
