@@ -46,7 +46,8 @@ public:
 /// limit of the rate (none: the machine's) and outlives the service.
 std::unique_ptr<JotService> makeJotService(std::string stateFolder, const Clock* clock = nullptr);
 
-/// Writes one line to the console (standard error) with time and process before it.
+/// Writes one line to the console (standard error) with time and process before it, and what would
+/// end the line or steer a terminal as "\n", "\t" or "\x1B".
 void writeConsoleLine(std::string_view line);
 
 } // namespace platform

@@ -204,4 +204,11 @@ TEST(ConsoleLine, CarriesTimeAndProcess) {
                                         "system_tests\\[[0-9]+\\]: text\n"));
 }
 
+TEST(ConsoleLine, IsOneLineThatSteersNoTerminal) {
+    ::testing::internal::CaptureStderr();
+    platform::writeConsoleLine("a\nb\tc\x1B[31m \xC2\x9Bm \xC2\xA9 \x7F");
+    EXPECT_THAT(::testing::internal::GetCapturedStderr(),
+                ::testing::EndsWith(": a\\nb\\tc\\x1B[31m \\x9Bm \xC2\xA9 \\x7F\n"));
+}
+
 } // namespace
