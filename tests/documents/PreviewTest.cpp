@@ -1,14 +1,9 @@
 #include "platform/documents/DocumentPickerUnavailableViewController.h"
-#include "platform/documents/PlatformPreviewController.h"
-#include "platform/documents/preview/PreviewRenderer.h"
-#include "platform/documents/preview/PreviewView.h"
 #include "platform/documents/preview/TextWidget.h"
 #include "platform/documents/preview/ZoomWidget.h"
+#include "tests/documents/PreviewFixture.h"
 #include "tests/documents/SampleDocuments.h"
-#include "tests/documents/ScreenHouse.h"
 
-#include <QApplication>
-#include <QImage>
 #include <QWheelEvent>
 #include <QtTest/QTest>
 
@@ -24,61 +19,7 @@ using ::testing::HasSubstr;
 
 namespace {
 
-struct Documents : PlatformPreviewController, PlatformPreviewDataSource, PlatformPreviewDelegate {
-    Documents() {
-        setDataSource(this);
-        setDelegate(this);
-    }
-    std::size_t numberOfPreviewItemsInPreviewController(PlatformPreviewController&) override {
-        return items.size();
-    }
-    std::optional<Url> previewControllerPreviewItemAtIndex(PlatformPreviewController&,
-                                                           std::size_t index) override {
-        return items[index];
-    }
-    void previewControllerDidShowItem(PlatformPreviewController&, const Url& item) override {
-        seen.push_back(item);
-    }
-    std::vector<Url> items;
-    std::vector<Url> seen;
-};
-
-struct Preview : ::testing::Test {
-    test::ScreenHouse house;
-    std::shared_ptr<Documents> screen = std::make_shared<Documents>();
-
-    void SetUp() override {
-        house.givenRemote("Promised.txt");
-        house.signIn();
-        house.openWindow();
-    }
-    PreviewView& view() const { return static_cast<PreviewView&>(*screen->view()); }
-    void show(const std::string& name) {
-        screen->items = {house.url(name)};
-        screen->reloadData();
-        house.show({screen});
-    }
-    bool untilShown(std::size_t times = 1) {
-        return house.until([&] { return screen->seen.size() >= times; });
-    }
-    bool untilPage(const std::string& text) {
-        return house.until([&] {
-            return view().showsPage() && view().pageText().find(text) != std::string::npos;
-        });
-    }
-    template<class Widget>
-    Widget* find() const {
-        for (QWidget* const each : QApplication::allWidgets())
-            if (auto* const found = dynamic_cast<Widget*>(each); found && found->isVisible())
-                return found;
-        return nullptr;
-    }
-    QColor colorAt(QWidget& widget, double x, double y) const {
-        const QImage picture = widget.grab().toImage();
-        return picture.pixelColor(static_cast<int>(picture.width() * x),
-                                  static_cast<int>(picture.height() * y));
-    }
-};
+using test::Preview;
 
 TEST_F(Preview, knowsByTheNameAloneWhatItCanShow) {
     for (const char* const name : {"a.png", "a.JPG", "a.pdf", "a.txt", "notes.md", "a.csv"})
