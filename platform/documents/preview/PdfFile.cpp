@@ -7,6 +7,7 @@
 #include <QPdfDocument>
 #include <QString>
 
+#include <algorithm>
 #include <cmath>
 
 namespace platform {
@@ -42,12 +43,15 @@ Failure PdfFile::open(const Url& file, const std::string& path) {
     return std::nullopt;
 }
 
-std::vector<QSizeF> PdfFile::pageSizes() const {
+std::size_t PdfFile::pageCount() const {
+    return static_cast<std::size_t>(document_->pageCount());
+}
+
+std::vector<QSizeF> PdfFile::pageSizes(std::size_t from, std::size_t count) const {
     std::vector<QSizeF> sizes;
-    const int count = document_->pageCount();
-    sizes.reserve(static_cast<std::size_t>(count));
-    for (int page = 0; page < count; ++page) {
-        const QSizeF size = document_->pagePointSize(page);
+    const std::size_t end = std::min(pageCount(), from + count);
+    for (std::size_t page = from; page < end; ++page) {
+        const QSizeF size = document_->pagePointSize(static_cast<int>(page));
         sizes.push_back(size.isEmpty() ? QSizeF(595, 842)
                                        : size.boundedTo({largestPagePoints, largestPagePoints}));
     }

@@ -27,6 +27,12 @@ constexpr double sizeStep = 1.25;
 constexpr double mostPagePixels = 12e6;
 /// Of rendered pages, beside those in view.
 constexpr double mostCachedPixels = 24e6;
+/// Measured before the first of a document is shown, and then at a time between pages that are
+/// drawn; 30 milliseconds.
+constexpr std::size_t measuredAtOnce = 200;
+/// The pages behind these are taken to be like the last: to measure them all would take 60 MB and
+/// seconds.
+constexpr std::size_t mostMeasured = 20'000;
 
 struct RenderedPage {
     QImage image;
@@ -41,19 +47,26 @@ public:
 
     explicit PagesContent(Wish wish) : wish_(std::move(wish)) {}
 
-    void set(std::vector<QSizeF> sizes) {
+    /// So many pages, of which the first are of these sizes and the others like the last of them.
+    void set(std::vector<QSizeF> sizes, std::size_t pageCount) {
         sizes_ = std::move(sizes);
-        tops_.clear();
+        sizes_.resize(pageCount, sizes_.back());
         rendered_.clear();
         asked_.clear();
-        width_ = 1;
-        double y = 0;
-        for (const QSizeF& size : sizes_) {
-            tops_.push_back(y);
-            y += size.height() + pageGap;
-            width_ = std::max(width_, size.width());
-        }
-        height_ = std::max(1.0, y - pageGap);
+        arrange();
+    }
+
+    /// Those pages are of these sizes, and those behind them like the last. Answers whether that
+    /// changes anything.
+    bool correct(std::size_t from, const std::vector<QSizeF>& sizes) {
+        if (std::all_of(sizes.begin(), sizes.end(),
+                        [&](const QSizeF& size) { return size == sizes_.back(); }))
+            return false;
+        std::copy(sizes.begin(), sizes.end(), sizes_.begin() + static_cast<std::ptrdiff_t>(from));
+        std::fill(sizes_.begin() + static_cast<std::ptrdiff_t>(from + sizes.size()), sizes_.end(),
+                  sizes.back());
+        arrange();
+        return true;
     }
 
     void setRendered(int page, QImage image) {
@@ -92,6 +105,18 @@ public:
     }
 
 private:
+    void arrange() {
+        tops_.clear();
+        width_ = 1;
+        double y = 0;
+        for (const QSizeF& size : sizes_) {
+            tops_.push_back(y);
+            y += size.height() + pageGap;
+            width_ = std::max(width_, size.width());
+        }
+        height_ = std::max(1.0, y - pageGap);
+    }
+
     std::size_t pageAt(double y) const {
         const auto above = std::upper_bound(tops_.begin(), tops_.end(), y);
         return above == tops_.begin() ? 0 : static_cast<std::size_t>(above - tops_.begin()) - 1;
@@ -109,7 +134,17 @@ private:
         const QRectF page(QPointF((width_ - size.width()) / 2, tops_[index]), size);
         if (rendered) {
             rendered->lastUse = ++uses_;
-            painter.drawImage(page, rendered->image);
+            // One that was never measured may have another shape than its place.
+            const QSizeF shape =
+                QSizeF(rendered->image.size()).scaled(page.size(), Qt::KeepAspectRatio);
+            QRectF target(QPointF(), shape);
+            target.moveCenter(page.center());
+            if (std::abs(shape.width() - size.width()) < 1 &&
+                std::abs(shape.height() - size.height()) < 1)
+                target = page;
+            else
+                painter.fillRect(page, Qt::white);
+            painter.drawImage(target, rendered->image);
         } else {
             painter.fillRect(page, Qt::white);
         }
@@ -194,16 +229,22 @@ public:
 
     void reload() override {
         worker_.cancel();
-        worker_.run([this, file = file_, slot = slot_](PreviewToken& token) -> Job {
+        // As far as one has looked, so that the place is found again.
+        const std::size_t first =
+            measuredAtOnce + (content_->pageCount() ? content_->pageIn(widget_->visibleRect()) : 0);
+        worker_.run([this, file = file_, slot = slot_, first](PreviewToken& token) -> Job {
             slot->file = std::make_unique<PdfFile>();
             const auto sizes = std::make_shared<std::vector<QSizeF>>();
+            std::size_t count = 0;
             const Failure failure = readDocument(file, token, [&](const std::string& path) {
                 Failure fault = slot->file->open(file, path);
-                if (!fault)
-                    *sizes = slot->file->pageSizes();
-                return fault;
+                if (fault)
+                    return fault;
+                count = slot->file->pageCount();
+                *sizes = slot->file->pageSizes(0, std::min(first, mostMeasured));
+                return Failure();
             });
-            return [this, sizes, failure] { take(std::move(*sizes), failure); };
+            return [this, sizes, count, failure] { take(std::move(*sizes), count, failure); };
         });
     }
 
@@ -212,14 +253,29 @@ public:
     }
 
 private:
-    void take(std::vector<QSizeF> sizes, const Failure& failure) {
+    void take(std::vector<QSizeF> sizes, std::size_t count, const Failure& failure) {
         if (failure) {
             reports_.failed(*failure);
             return;
         }
-        content_->set(std::move(sizes));
+        const std::size_t measured = sizes.size();
+        content_->set(std::move(sizes), count);
         widget_->contentChanged();
         reports_.shown();
+        measureFrom(measured);
+    }
+
+    void measureFrom(std::size_t page) {
+        if (page >= std::min(content_->pageCount(), mostMeasured))
+            return;
+        worker_.run([this, slot = slot_, page](PreviewToken&) -> Job {
+            auto sizes = slot->file->pageSizes(page, measuredAtOnce);
+            return [this, page, sizes = std::move(sizes)] {
+                if (content_->correct(page, sizes))
+                    widget_->contentChanged();
+                measureFrom(page + sizes.size());
+            };
+        });
     }
 
     void render(std::vector<std::pair<int, int>> pages) {
