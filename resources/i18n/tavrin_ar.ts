@@ -521,6 +521,10 @@
         <translation>لا يمكن عرض هذا النوع من المستندات هنا.</translation>
     </message>
     <message>
+        <source>“%1$@” is too large to be shown here.</source>
+        <translation>«%1$@» كبير جدًا بحيث لا يمكن عرضه هنا.</translation>
+    </message>
+    <message>
         <source>This document cannot be shown.</source>
         <translation>لا يمكن عرض هذا المستند.</translation>
     </message>

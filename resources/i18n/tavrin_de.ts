@@ -493,6 +493,10 @@
         <translation>Dokumente dieser Art können hier nicht angezeigt werden.</translation>
     </message>
     <message>
+        <source>“%1$@” is too large to be shown here.</source>
+        <translation>„%1$@“ ist zu groß, um hier angezeigt zu werden.</translation>
+    </message>
+    <message>
         <source>This document cannot be shown.</source>
         <translation>Dieses Dokument kann nicht angezeigt werden.</translation>
     </message>

@@ -500,6 +500,10 @@
         <translation>Документы этого типа нельзя показать здесь.</translation>
     </message>
     <message>
+        <source>“%1$@” is too large to be shown here.</source>
+        <translation>Документ «%1$@» слишком велик, чтобы показать его здесь.</translation>
+    </message>
+    <message>
         <source>This document cannot be shown.</source>
         <translation>Не удаётся показать этот документ.</translation>
     </message>

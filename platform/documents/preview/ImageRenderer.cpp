@@ -1,5 +1,6 @@
 #include "platform/base/Text.h"
 #include "platform/documents/DisplayName.h"
+#include "platform/documents/preview/PictureFile.h"
 #include "platform/documents/preview/PreviewKinds.h"
 #include "platform/documents/preview/PreviewWorker.h"
 #include "platform/documents/preview/ZoomWidget.h"
@@ -9,7 +10,6 @@
 #include <QImageReader>
 #include <QPainter>
 
-#include <cmath>
 #include <vector>
 
 namespace platform {
@@ -97,31 +97,19 @@ private:
         worker_.cancel();
         worker_.run([this, file = file_](PreviewToken& token) -> Job {
             const auto pyramid = std::make_shared<Pyramid>();
-            const Failure failure = readDocument(
-                file, token, [&](const std::string& path) { return decode(file, path, *pyramid); });
+            const Failure failure = readDocument(file, token, [&](const std::string& path) {
+                return decode(file, path, token, *pyramid);
+            });
             return [this, pyramid, failure] { take(std::move(*pyramid), failure); };
         });
     }
 
-    static Failure decode(const Url& file, const std::string& path, Pyramid& into) {
-        QImageReader reader(QString::fromStdString(path));
-        // The content says what it is: a picture with a wrong extension still is one.
-        reader.setDecideFormatFromContent(true);
-        reader.setAutoTransform(true);
-        QSize size = reader.size();
-        const double pixels = static_cast<double>(size.width()) * size.height();
-        if (pixels > mostPixels)
-            reader.setScaledSize(size * std::sqrt(mostPixels / pixels));
-        QImage image = reader.read();
-        if (image.isNull())
-            return damagedDocument(file, reader.errorString().toStdString());
-        const bool turned =
-            reader.transformation().testFlag(QImageIOHandler::TransformationRotate90);
-        if (turned)
-            size.transpose();
-        into = buildPyramid(std::move(image), size);
-        if (size.isEmpty())
-            into.fullSize = into.levels.front().size();
+    static Failure decode(const Url& file, const std::string& path, const PreviewToken& token,
+                          Pyramid& into) {
+        Result<Picture> picture = readPicture(file, path, mostPixels, token);
+        if (!picture)
+            return picture.error();
+        into = buildPyramid(std::move(picture->image), picture->fullSize);
         return std::nullopt;
     }
 
