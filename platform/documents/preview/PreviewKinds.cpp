@@ -6,7 +6,12 @@ namespace platform {
 namespace {
 
 /// The first that fits is taken: special kinds before general ones.
-constexpr std::array kinds{&pdfPreview, &imagePreview, &textPreview};
+constexpr std::array kinds{
+    &pdfPreview,    //
+    &imagePreview,  //
+    &sourcePreview, //
+    &textPreview    //
+};
 
 } // namespace
 

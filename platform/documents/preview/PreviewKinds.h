@@ -6,6 +6,7 @@ namespace platform {
 
 extern const PreviewKind imagePreview;
 extern const PreviewKind pdfPreview;
+extern const PreviewKind sourcePreview;
 extern const PreviewKind textPreview;
 
 } // namespace platform

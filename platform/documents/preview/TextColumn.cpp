@@ -1,5 +1,9 @@
 #include "platform/documents/preview/TextColumn.h"
 
+#include "platform/documents/preview/SyntaxColors.h"
+#include "platform/ui/Theme.h"
+#include "platform/ui/qt/Bridge.h"
+
 #include <QFontMetricsF>
 #include <QPainter>
 
@@ -14,9 +18,21 @@ constexpr int tabColumns = 4;
 /// Lines kept on either side of the view; more are dropped and read again when they are wanted.
 constexpr std::size_t mostLinesAside = 4000;
 
+QList<QTextLayout::FormatRange> formatsOf(const std::vector<SyntaxSpan>& spans) {
+    QList<QTextLayout::FormatRange> formats;
+    for (const SyntaxSpan& span : spans) {
+        QTextLayout::FormatRange& range = formats.emplaceBack();
+        range.start = span.start;
+        range.length = span.length;
+        range.format.setForeground(toQt(syntaxColor(span.kind, Theme::page)));
+    }
+    return formats;
+}
+
 } // namespace
 
-TextColumn::TextColumn() = default;
+TextColumn::TextColumn(Qt::LayoutDirection direction) : direction_(direction) {
+}
 TextColumn::~TextColumn() = default;
 
 bool TextColumn::holds(std::uint64_t offset) const {
@@ -70,8 +86,10 @@ void TextColumn::layOut(Laid& laid) const {
     option.setWrapMode(QTextOption::WrapAtWordBoundaryOrAnywhere);
     const QFontMetricsF metrics(font_);
     option.setTabStopDistance(tabColumns * metrics.horizontalAdvance(QLatin1Char(' ')));
+    option.setTextDirection(direction_);
     laid.layout->setTextOption(option);
-    const double step = std::round(font_.pixelSize() * lineHeightFactor);
+    laid.layout->setFormats(formatsOf(laid.line.spans));
+    const double step = rowHeight();
     double y = 0;
     laid.layout->beginLayout();
     for (QTextLine line = laid.layout->createLine(); line.isValid();
@@ -82,6 +100,17 @@ void TextColumn::layOut(Laid& laid) const {
     }
     laid.layout->endLayout();
     laid.height = std::max(step, y);
+}
+
+double TextColumn::rowHeight() const {
+    return std::round(font_.pixelSize() * lineHeightFactor);
+}
+
+std::uint64_t TextColumn::largestNumber() const {
+    for (auto laid = lines_.rbegin(); laid != lines_.rend(); ++laid)
+        if (laid->line.number)
+            return laid->line.number;
+    return 0;
 }
 
 double TextColumn::heightOf(std::size_t index) {
@@ -139,11 +168,13 @@ std::uint64_t TextColumn::bottomOffset() {
     return end;
 }
 
-void TextColumn::paint(QPainter& painter, QPointF corner, double bottom) {
+void TextColumn::paint(QPainter& painter, QPointF corner, double bottom, const Aside& aside) {
     double y = corner.y() - above_;
     for (std::size_t i = top_; i < lines_.size() && y < bottom; ++i) {
         const double height = heightOf(i);
         lines_[i].layout->draw(&painter, {corner.x(), y});
+        if (aside)
+            aside(lines_[i].line, y, rowHeight());
         y += height;
     }
 }

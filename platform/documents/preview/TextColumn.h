@@ -6,6 +6,7 @@
 #include <QTextLayout>
 
 #include <deque>
+#include <functional>
 #include <memory>
 #include <vector>
 
@@ -17,7 +18,8 @@ namespace platform {
 /// view; and which of them is at its top. Points; the view is as high as what text may fill.
 class TextColumn {
 public:
-    TextColumn();
+    /// The direction that lines begin in; LayoutDirectionAuto for each as its letters say.
+    explicit TextColumn(Qt::LayoutDirection direction = Qt::LayoutDirectionAuto);
     ~TextColumn();
 
     bool isEmpty() const { return lines_.empty(); }
@@ -46,8 +48,12 @@ public:
     bool scrollBy(double distance);
     /// The line that holds the offset, which must be held, comes to the top.
     void goTo(std::uint64_t offset);
+    /// The highest number of the lines that are known; 0 when they have none.
+    std::uint64_t largestNumber() const;
+    /// Paints something beside a line whose first row is at `y` and that high.
+    using Aside = std::function<void(const TextLine& line, double y, double height)>;
     /// From the top of the view down to `bottom` below it.
-    void paint(QPainter& painter, QPointF corner, double bottom);
+    void paint(QPainter& painter, QPointF corner, double bottom, const Aside& aside = {});
 
 private:
     struct Laid {
@@ -60,7 +66,9 @@ private:
     double heightOf(std::size_t index);
     void layOut(Laid& laid) const;
     void keepEndInView();
+    double rowHeight() const;
 
+    const Qt::LayoutDirection direction_;
     std::deque<Laid> lines_;
     std::size_t top_ = 0;
     /// How much of the top line is above the view.

@@ -117,10 +117,12 @@ std::vector<TextLine> TextFile::split(std::string_view bytes, std::uint64_t offs
     while (at < bytes.size()) {
         std::size_t end = behindLineEnd(bytes, at);
         const bool open = end == std::string_view::npos;
+        bool goesOn = open && !toEnd;
         if (open)
             end = bytes.size();
         if (end - at > longestLine) {
             end = at + longestLine;
+            goesOn = true;
             // Not within a character.
             while (unit() == 1 && end > at + 1 &&
                    (static_cast<unsigned char>(bytes[end]) & 0xC0) == 0x80)
@@ -128,7 +130,7 @@ std::vector<TextLine> TextFile::split(std::string_view bytes, std::uint64_t offs
         } else if (open && !toEnd && at > 0) {
             break; // the rest of the line is in the next window
         }
-        lines.push_back({offset + at, offset + end, decode(bytes.substr(at, end - at))});
+        lines.push_back({offset + at, offset + end, decode(bytes.substr(at, end - at)), goesOn});
         at = end;
     }
     return lines;
@@ -164,6 +166,21 @@ std::vector<TextLine> TextFile::linesAround(std::uint64_t offset) const {
     for (TextLine& line : linesFrom(from))
         before.push_back(std::move(line));
     return before;
+}
+
+std::uint64_t TextFile::lineEndsBetween(std::uint64_t from, std::uint64_t to) const {
+    std::uint64_t count = 0;
+    while (from < to) {
+        const std::string bytes =
+            read(from, static_cast<std::size_t>(std::min<std::uint64_t>(windowSize, to - from)));
+        if (bytes.empty())
+            break;
+        for (std::size_t at = behindLineEnd(bytes, 0); at != std::string_view::npos;
+             at = behindLineEnd(bytes, at))
+            ++count;
+        from += bytes.size();
+    }
+    return count;
 }
 
 QString TextFile::decode(std::string_view bytes) const {

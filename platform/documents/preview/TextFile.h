@@ -2,6 +2,7 @@
 
 #include "platform/base/Result.h"
 #include "platform/base/Url.h"
+#include "platform/documents/preview/SyntaxScanner.h"
 #include "platform/files/FileDescriptor.h"
 
 #include <QString>
@@ -30,6 +31,12 @@ struct TextLine {
     /// Where the next one begins.
     std::uint64_t end = 0;
     QString text;
+    /// The next piece belongs to the same line.
+    bool goesOn = false;
+    /// From 1 on; 0 for one that is not counted, as the later pieces of a line.
+    std::uint64_t number = 0;
+    /// What is coloured in it.
+    std::vector<SyntaxSpan> spans = {};
 };
 
 /// An open text file, read by windows: its length does not matter. Belongs to one queue.
@@ -45,6 +52,7 @@ public:
     /// The lines around any place.
     std::vector<TextLine> linesAround(std::uint64_t offset) const;
     std::uint64_t start() const { return encoding_.markLength; }
+    std::uint64_t lineEndsBetween(std::uint64_t from, std::uint64_t to) const;
 
 private:
     TextFile() = default;

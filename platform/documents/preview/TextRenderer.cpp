@@ -1,6 +1,7 @@
 #include "platform/documents/DisplayName.h"
 #include "platform/documents/preview/PreviewKinds.h"
 #include "platform/documents/preview/PreviewWorker.h"
+#include "platform/documents/preview/SourceIndex.h"
 #include "platform/documents/preview/TextWidget.h"
 #include "platform/launch/TypeRegistry.h"
 #include "platform/ui/qt/Bridge.h"
@@ -13,23 +14,39 @@ namespace {
 /// The open file; of the worker's queue alone.
 struct TextSlot {
     std::optional<TextFile> file;
+    /// None for prose.
+    std::optional<SourceIndex> index;
+
+    void open(TextFile text, const SyntaxLanguage* language) {
+        index.reset();
+        file.emplace(std::move(text));
+        if (language)
+            index.emplace(*file, *language);
+    }
+    std::vector<TextLine> described(std::vector<TextLine> lines) {
+        if (index)
+            index->describe(lines);
+        return lines;
+    }
 };
 
-/// Plain text of any length: windows of it are read as one comes near them.
+/// Text of any length, plain or of a program: windows of it are read as one comes near them.
 class TextRenderer final : public PreviewRenderer {
 public:
-    TextRenderer(MainQueue& main, PreviewReports reports)
+    TextRenderer(MainQueue& main, PreviewReports reports, TextWidget::Style style)
         : reports_(std::move(reports)), worker_(main) {
-        auto widget = std::make_unique<TextWidget>(TextWidget::Wishes{
-            [this](std::uint64_t offset) {
-                read([offset](const TextFile& file) { return file.linesFrom(offset); },
-                     [this](auto lines) { widget_->appendLines(std::move(lines)); });
-            },
-            [this](std::uint64_t offset) {
-                read([offset](const TextFile& file) { return file.linesBefore(offset); },
-                     [this](auto lines) { widget_->prependLines(std::move(lines)); });
-            },
-            [this](std::uint64_t offset) { show(offset); }});
+        auto widget = std::make_unique<TextWidget>(
+            TextWidget::Wishes{
+                [this](std::uint64_t offset) {
+                    read([offset](const TextFile& file) { return file.linesFrom(offset); },
+                         [this](auto lines) { widget_->appendLines(std::move(lines)); });
+                },
+                [this](std::uint64_t offset) {
+                    read([offset](const TextFile& file) { return file.linesBefore(offset); },
+                         [this](auto lines) { widget_->prependLines(std::move(lines)); });
+                },
+                [this](std::uint64_t offset) { show(offset); }},
+            style);
         widget_ = widget.get();
         view_ = std::make_shared<WidgetView>(std::move(widget));
     }
@@ -38,6 +55,8 @@ public:
 
     void load(const Url& file) override {
         file_ = file;
+        language_ =
+            syntaxLanguageFor(TypeRegistry::identifierForFileName(file.lastPathComponent()));
         view_->setAccessibleName(displayName(file.lastPathComponent()));
         open(0);
     }
@@ -53,37 +72,39 @@ private:
 
     void open(std::uint64_t top) {
         worker_.cancel();
-        worker_.run(
-            [this, file = file_, slot = slot_, widget = widget_, top](PreviewToken& token) -> Job {
-                slot->file.reset();
-                const Failure failure = readDocument(file, token, [&](const std::string& path) {
-                    Result<TextFile> text = TextFile::open(file, path);
-                    if (!text)
-                        return Failure(text.error());
-                    slot->file.emplace(std::move(*text));
-                    return Failure();
-                });
-                if (failure || !slot->file)
-                    return [this, failure] {
-                        if (failure)
-                            reports_.failed(*failure);
-                    };
-                return [this, lines = linesAround(*slot->file, top, widget)] {
-                    lines();
-                    reports_.shown();
-                };
+        worker_.run([this, file = file_, slot = slot_, widget = widget_, language = language_,
+                     top](PreviewToken& token) -> Job {
+            slot->index.reset();
+            slot->file.reset();
+            const Failure failure = readDocument(file, token, [&](const std::string& path) {
+                Result<TextFile> text = TextFile::open(file, path);
+                if (!text)
+                    return Failure(text.error());
+                slot->open(std::move(*text), language);
+                return Failure();
             });
+            if (failure || !slot->file)
+                return [this, failure] {
+                    if (failure)
+                        reports_.failed(*failure);
+                };
+            return [this, lines = linesAround(*slot, top, widget)] {
+                lines();
+                reports_.shown();
+            };
+        });
     }
 
     void show(std::uint64_t place) {
         worker_.run([slot = slot_, widget = widget_, place](PreviewToken&) -> Job {
-            return slot->file ? linesAround(*slot->file, place, widget) : Job();
+            return slot->file ? linesAround(*slot, place, widget) : Job();
         });
     }
 
     /// Reads them; the answer, on the main thread, puts them into the widget.
-    static Job linesAround(const TextFile& file, std::uint64_t place, TextWidget* widget) {
-        const auto lines = std::make_shared<Lines>(file.linesAround(place));
+    static Job linesAround(TextSlot& slot, std::uint64_t place, TextWidget* widget) {
+        const TextFile& file = *slot.file;
+        const auto lines = std::make_shared<Lines>(slot.described(file.linesAround(place)));
         return [widget, lines, place, start = file.start(), size = file.size()] {
             widget->setLines(std::move(*lines), start, size, place);
         };
@@ -94,13 +115,14 @@ private:
             [slot = slot_, what = std::move(what), take = std::move(take)](PreviewToken&) -> Job {
                 if (!slot->file)
                     return {};
-                const auto lines = std::make_shared<Lines>(what(*slot->file));
+                const auto lines = std::make_shared<Lines>(slot->described(what(*slot->file)));
                 return [lines, take] { take(std::move(*lines)); };
             });
     }
 
     PreviewReports reports_;
     Url file_;
+    const SyntaxLanguage* language_ = nullptr;
     const std::shared_ptr<TextSlot> slot_ = std::make_shared<TextSlot>();
     TextWidget* widget_ = nullptr;
     std::shared_ptr<View> view_;
@@ -112,7 +134,13 @@ private:
 const PreviewKind textPreview{
     [](std::string_view identifier) { return TypeRegistry::conformsTo(identifier, types::text); },
     [](MainQueue& main, PreviewReports reports) -> std::unique_ptr<PreviewRenderer> {
-        return std::make_unique<TextRenderer>(main, std::move(reports));
+        return std::make_unique<TextRenderer>(main, std::move(reports), TextWidget::Style::prose);
+    }};
+
+const PreviewKind sourcePreview{
+    [](std::string_view identifier) { return syntaxLanguageFor(identifier) != nullptr; },
+    [](MainQueue& main, PreviewReports reports) -> std::unique_ptr<PreviewRenderer> {
+        return std::make_unique<TextRenderer>(main, std::move(reports), TextWidget::Style::code);
     }};
 
 } // namespace platform

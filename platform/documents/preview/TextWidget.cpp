@@ -13,6 +13,8 @@
 
 #include <algorithm>
 #include <cmath>
+#include <string>
+#include <utility>
 
 namespace platform {
 namespace {
@@ -28,6 +30,9 @@ constexpr int scrollBarSteps = 1'000'000;
 /// More is asked for when fewer are left.
 constexpr std::size_t fewLines = 200;
 constexpr double narrowestLine = 40;
+/// Between the numbers of lines and what stands beside them.
+constexpr double gutterGap = 8;
+constexpr int fewestFigures = 3;
 constexpr double smallestZoom = 0.6;
 constexpr double largestZoom = 4;
 
@@ -41,8 +46,10 @@ QFont textFont(double zoom) {
 
 } // namespace
 
-TextWidget::TextWidget(Wishes wishes)
+TextWidget::TextWidget(Wishes wishes, Style style)
     : wishes_(std::move(wishes)),
+      style_(style),
+      column_(style == Style::code ? Qt::LeftToRight : Qt::LayoutDirectionAuto),
       scrollBar_(new QScrollBar(Qt::Vertical, this)),
       flinger_([this](Point stretch) { return scrollBy(-stretch.y); }) {
     setFocusPolicy(Qt::StrongFocus);
@@ -63,23 +70,20 @@ void TextWidget::setLines(std::vector<TextLine> lines, std::uint64_t start, std:
     size_ = size;
     asksBefore_ = asksAfter_ = false;
     column_.set(std::move(lines), top);
-    updateScrollBar();
+    linesChanged();
     askForMore();
-    update();
 }
 
 void TextWidget::appendLines(std::vector<TextLine> lines) {
     asksAfter_ = false;
     column_.append(std::move(lines));
-    updateScrollBar();
-    update();
+    linesChanged();
 }
 
 void TextWidget::prependLines(std::vector<TextLine> lines) {
     asksBefore_ = false;
     column_.prepend(std::move(lines));
-    updateScrollBar();
-    update();
+    linesChanged();
 }
 
 std::uint64_t TextWidget::topOffset() const {
@@ -92,8 +96,37 @@ void TextWidget::zoomBy(double factor) {
     update();
 }
 
+void TextWidget::linesChanged() {
+    if (style_ == Style::code) {
+        const std::size_t figures = std::to_string(column_.largestNumber()).size();
+        const int wanted = std::max(fewestFigures, static_cast<int>(figures));
+        // Never narrower again: the text would jump at each turn.
+        if (wanted > std::exchange(figures_, std::max(wanted, figures_)))
+            shape();
+    }
+    updateScrollBar();
+    update();
+}
+
+double TextWidget::gutterWidth() const {
+    if (style_ == Style::prose)
+        return 0;
+    const QFontMetricsF metrics(textFont(zoom_));
+    return std::ceil(figures_ * metrics.horizontalAdvance(QLatin1Char('0')) + 2 * gutterGap);
+}
+
+double TextWidget::textLeft() const {
+    if (style_ == Style::prose)
+        return mirrored({pageMargin(), 0, lineWidth(), 0}, width()).x;
+    // A scroll bar at the left has its place between.
+    const bool rightToLeft = layoutDirection() == Qt::RightToLeft;
+    return gutterWidth() + gutterGap + (rightToLeft ? scrollBarWidth : 0);
+}
+
 double TextWidget::lineWidth() const {
-    return std::max(narrowestLine, width() - 2 * pageMargin());
+    const double taken =
+        style_ == Style::prose ? 2 * pageMargin() : gutterWidth() + 2 * gutterGap + scrollBarWidth;
+    return std::max(narrowestLine, width() - taken);
 }
 
 void TextWidget::shape() {
@@ -154,9 +187,36 @@ void TextWidget::jumpTo(std::uint64_t offset) {
 void TextWidget::paintEvent(QPaintEvent* /*event*/) {
     QPainter painter(this);
     painter.fillRect(rect(), toQt(Theme::page));
+    paintGutter(painter);
+    TextColumn::Aside aside;
+    if (style_ == Style::code)
+        aside = [&](const TextLine& line, double y, double height) {
+            paintNumber(painter, line, y, height);
+        };
     painter.setPen(toQt(Theme::text));
-    const double x = mirrored({pageMargin(), 0, lineWidth(), 0}, width()).x;
-    column_.paint(painter, {x, edge}, height());
+    column_.paint(painter, {textLeft(), edge}, height(), aside);
+}
+
+void TextWidget::paintGutter(QPainter& painter) const {
+    if (style_ == Style::prose || column_.isEmpty())
+        return;
+    const double width = gutterWidth();
+    painter.fillRect(QRectF(0, 0, width, height()), toQt(Theme::bar));
+    painter.fillRect(QRectF(width - 1, 0, 1, height()), toQt(Theme::hairline));
+}
+
+void TextWidget::paintNumber(QPainter& painter, const TextLine& line, double y,
+                             double height) const {
+    if (line.number == 0)
+        return;
+    painter.save();
+    painter.setFont(textFont(zoom_));
+    painter.setPen(toQt(Theme::secondaryText));
+    const double top = y + std::floor((height - painter.fontMetrics().height()) / 2);
+    painter.drawText(QRectF(0, top, gutterWidth() - gutterGap, height),
+                     Qt::AlignTop | Qt::AlignRight | Qt::TextDontClip,
+                     QString::number(line.number));
+    painter.restore();
 }
 
 void TextWidget::resizeEvent(QResizeEvent* event) {

@@ -21,7 +21,12 @@ public:
         std::function<void(std::uint64_t offset)> linesBefore;
         std::function<void(std::uint64_t offset)> linesAround;
     };
-    explicit TextWidget(Wishes wishes);
+    enum class Style {
+        prose,
+        /// Numbered lines that always run to the right.
+        code
+    };
+    TextWidget(Wishes wishes, Style style);
     ~TextWidget() override;
 
     /// Puts these lines in place of all; the first that holds `top` is the first in view.
@@ -45,7 +50,13 @@ protected:
 
 private:
     void shape();
+    void linesChanged();
+    /// The strip of the numbers.
+    double gutterWidth() const;
+    double textLeft() const;
     double lineWidth() const;
+    void paintGutter(QPainter& painter) const;
+    void paintNumber(QPainter& painter, const TextLine& line, double y, double height) const;
     /// Answers whether the whole way was free.
     bool scrollBy(double distance);
     void askForMore();
@@ -55,12 +66,15 @@ private:
     void drag(QPointF point, bool first, bool last);
 
     Wishes wishes_;
+    const Style style_;
     TextColumn column_;
     std::uint64_t start_ = 0;
     std::uint64_t size_ = 0;
     bool asksBefore_ = false;
     bool asksAfter_ = false;
     double zoom_ = 1;
+    /// Room for that many figures of a line's number.
+    int figures_ = 0;
     QScrollBar* scrollBar_;
     QPointF dragged_;
     Flinger flinger_;
