@@ -42,12 +42,17 @@ std::vector<std::string> environmentOf(const ProgramStart& start) {
 /// What a new program is to find, as posix_spawn wants it.
 class SpawnSetup {
 public:
-    explicit SpawnSetup(const std::string& folder) {
+    explicit SpawnSetup(const ProgramStart& start) {
         ::posix_spawn_file_actions_init(&files);
         ::posix_spawnattr_init(&attributes);
-        const bool there = ::access(PathText(folder).c_str(), X_OK) == 0;
-        ::posix_spawn_file_actions_addchdir_np(&files, there ? folder.c_str() : "/");
-        ::posix_spawn_file_actions_addopen(&files, 0, "/dev/null", O_RDONLY, 0);
+        const bool there = ::access(PathText(start.folder).c_str(), X_OK) == 0;
+        ::posix_spawn_file_actions_addchdir_np(&files, there ? start.folder.c_str() : "/");
+        if (start.output >= 0)
+            ::posix_spawn_file_actions_adddup2(&files, start.output, 1);
+        if (start.input >= 0)
+            ::posix_spawn_file_actions_adddup2(&files, start.input, 0);
+        else
+            ::posix_spawn_file_actions_addopen(&files, 0, "/dev/null", O_RDONLY, 0);
         sigset_t none;
         sigset_t all;
         ::sigemptyset(&none);
@@ -82,7 +87,7 @@ int StartedProgram::wait() const {
 Result<StartedProgram> startProgram(const ProgramStart& start) {
     std::vector<std::string> arguments = start.arguments;
     std::vector<std::string> environment = environmentOf(start);
-    const SpawnSetup setup(start.folder);
+    const SpawnSetup setup(start);
     StartedProgram started;
     const int number =
         ::posix_spawnp(&started.pid, arguments.front().c_str(), &setup.files, &setup.attributes,

@@ -11,7 +11,8 @@
 namespace platform {
 
 /// A program to start, without a shell: it finds itself in a session of its own, with nothing to
-/// read, no open file of ours and the signals as the system makes them.
+/// read unless it is given something, no other open file of ours and the signals as the system
+/// makes them.
 struct ProgramStart {
     /// The program first: a path, or a name to be looked for in $PATH.
     std::vector<std::string> arguments;
@@ -19,6 +20,10 @@ struct ProgramStart {
     std::string folder;
     /// Set beside what this process has.
     std::vector<std::pair<std::string, std::string>> environment = {};
+    /// Descriptors of this process that become its standard input and output, in place of nothing
+    /// to read and of this process's own output.
+    int input = -1;
+    int output = -1;
 };
 
 /// A child that runs, to be waited for, lest it stays in the table of processes.
