@@ -541,6 +541,46 @@
         <translation>هذا المستند فارغ.</translation>
     </message>
     <message>
+        <source>%1$@, %2$@ unpacked</source>
+        <translation>%1$@، %2$@ بعد فك الضغط</translation>
+    </message>
+    <message>
+        <source>Still being read. This is what there is so far.</source>
+        <translation>ما زالت القراءة جارية. هذا ما قُرئ حتى الآن.</translation>
+    </message>
+    <message>
+        <source>The archive is damaged. This is what could be read before the damage.</source>
+        <translation>الأرشيف تالف. هذا ما أمكنت قراءته قبل موضع التلف.</translation>
+    </message>
+    <message>
+        <source>There is more in this archive than is listed here.</source>
+        <translation>في هذا الأرشيف أكثر مما هو معروض هنا.</translation>
+    </message>
+    <message>
+        <source>Unpacking it takes a password.</source>
+        <translation>يتطلب فك الضغط كلمة مرور.</translation>
+    </message>
+    <message>
+        <source>What is in this archive can only be seen with its password.</source>
+        <translation>لا يمكن رؤية محتوى هذا الأرشيف إلا بكلمة مروره.</translation>
+    </message>
+    <message>
+        <source>There is nothing in this archive.</source>
+        <translation>هذا الأرشيف فارغ.</translation>
+    </message>
+    <message>
+        <source>A part of this program is missing: archives cannot be listed. Install it again.</source>
+        <translation>جزء من هذا البرنامج مفقود: لا يمكن سرد محتويات الأرشيفات. أعد تثبيته.</translation>
+    </message>
+    <message>
+        <source>Encrypted</source>
+        <translation>مشفّر</translation>
+    </message>
+    <message>
+        <source>Link</source>
+        <translation>رابط</translation>
+    </message>
+    <message>
         <source>This document is not on this device. Download it first.</source>
         <translation>هذا المستند ليس على هذا الجهاز. نزّله أولًا.</translation>
     </message>

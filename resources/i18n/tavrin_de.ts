@@ -513,6 +513,46 @@
         <translation>Dieses Dokument ist leer.</translation>
     </message>
     <message>
+        <source>%1$@, %2$@ unpacked</source>
+        <translation>%1$@, entpackt %2$@</translation>
+    </message>
+    <message>
+        <source>Still being read. This is what there is so far.</source>
+        <translation>Wird noch gelesen. Bisher ist dies da.</translation>
+    </message>
+    <message>
+        <source>The archive is damaged. This is what could be read before the damage.</source>
+        <translation>Das Archiv ist beschädigt. Dies war vor dem Schaden zu lesen.</translation>
+    </message>
+    <message>
+        <source>There is more in this archive than is listed here.</source>
+        <translation>In diesem Archiv ist mehr, als hier steht.</translation>
+    </message>
+    <message>
+        <source>Unpacking it takes a password.</source>
+        <translation>Zum Entpacken ist ein Passwort nötig.</translation>
+    </message>
+    <message>
+        <source>What is in this archive can only be seen with its password.</source>
+        <translation>Was in diesem Archiv ist, lässt sich nur mit seinem Passwort sehen.</translation>
+    </message>
+    <message>
+        <source>There is nothing in this archive.</source>
+        <translation>Dieses Archiv ist leer.</translation>
+    </message>
+    <message>
+        <source>A part of this program is missing: archives cannot be listed. Install it again.</source>
+        <translation>Ein Teil dieses Programms fehlt: Archive lassen sich nicht auflisten. Bitte installieren Sie es neu.</translation>
+    </message>
+    <message>
+        <source>Encrypted</source>
+        <translation>Verschlüsselt</translation>
+    </message>
+    <message>
+        <source>Link</source>
+        <translation>Verknüpfung</translation>
+    </message>
+    <message>
         <source>This document is not on this device. Download it first.</source>
         <translation>Dieses Dokument ist nicht auf diesem Gerät. Laden Sie es zuerst.</translation>
     </message>

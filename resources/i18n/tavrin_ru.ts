@@ -520,6 +520,46 @@
         <translation>Этот документ пуст.</translation>
     </message>
     <message>
+        <source>%1$@, %2$@ unpacked</source>
+        <translation>%1$@, в распакованном виде %2$@</translation>
+    </message>
+    <message>
+        <source>Still being read. This is what there is so far.</source>
+        <translation>Чтение ещё идёт. Пока показано то, что уже прочитано.</translation>
+    </message>
+    <message>
+        <source>The archive is damaged. This is what could be read before the damage.</source>
+        <translation>Архив повреждён. Показано то, что удалось прочитать до места повреждения.</translation>
+    </message>
+    <message>
+        <source>There is more in this archive than is listed here.</source>
+        <translation>В этом архиве есть и другое: здесь показано не всё.</translation>
+    </message>
+    <message>
+        <source>Unpacking it takes a password.</source>
+        <translation>Для распаковки нужен пароль.</translation>
+    </message>
+    <message>
+        <source>What is in this archive can only be seen with its password.</source>
+        <translation>Содержимое этого архива можно увидеть только с паролем.</translation>
+    </message>
+    <message>
+        <source>There is nothing in this archive.</source>
+        <translation>Этот архив пуст.</translation>
+    </message>
+    <message>
+        <source>A part of this program is missing: archives cannot be listed. Install it again.</source>
+        <translation>Не хватает части этой программы: содержимое архивов показать нельзя. Установите её заново.</translation>
+    </message>
+    <message>
+        <source>Encrypted</source>
+        <translation>Зашифровано</translation>
+    </message>
+    <message>
+        <source>Link</source>
+        <translation>Ссылка</translation>
+    </message>
+    <message>
         <source>This document is not on this device. Download it first.</source>
         <translation>Этого документа нет на устройстве. Сначала загрузите его.</translation>
     </message>

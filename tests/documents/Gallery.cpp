@@ -88,10 +88,15 @@ void previews(GalleryScene& scene) {
     }
 }
 
+void previewsOfContents(GalleryScene& scene) {
+    scene.preview("Files/Holiday.zip");
+    scene.save("preview-archive");
+}
+
 void previewsOfNothing(GalleryScene& scene) {
     for (const auto& [file, name] :
          {std::pair("Files/Broken.png", "damaged"), std::pair("Files/Nothing.pdf", "nothing"),
-          std::pair("Archive.zip", "unknown")}) {
+          std::pair("data.xyzzy", "unknown")}) {
         scene.preview(file);
         scene.save(std::string("preview-") + name);
     }
@@ -130,15 +135,18 @@ using Scene = void (*)(GalleryScene&);
 const std::vector<std::pair<Look, std::vector<Scene>>>& gallery() {
     static const std::vector<std::pair<Look, std::vector<Scene>>> all = {
         {phone,
-         {lists, pagesInPlaceOfRows, previews, previewsOfNothing, choosers, unavailable, searches,
-          actions, focus}},
-        {phoneRtl, {lists, pagesInPlaceOfRows, previews, choosers, searches, actions}},
+         {lists, pagesInPlaceOfRows, previews, previewsOfContents, previewsOfNothing, choosers,
+          unavailable, searches, actions, focus}},
+        {phoneRtl,
+         {lists, pagesInPlaceOfRows, previews, previewsOfContents, choosers, searches, actions}},
         {phoneLarge,
-         {lists, pagesInPlaceOfRows, previews, previewsOfNothing, choosers, unavailable, searches,
-          actions}},
+         {lists, pagesInPlaceOfRows, previews, previewsOfContents, previewsOfNothing, choosers,
+          unavailable, searches, actions}},
         {phoneTurned, {lists, pagesInPlaceOfRows, previews, choosers, unavailable, searches}},
         {phoneCoarse, {lists}},
-        {tablet, {lists, pagesInPlaceOfRows, previews, choosers, searches, actions, focus}},
+        {tablet,
+         {lists, pagesInPlaceOfRows, previews, previewsOfContents, choosers, searches, actions,
+          focus}},
         {tabletUpright, {lists, previews}},
         {tabletRtl, {lists, choosers}},
     };

@@ -5,6 +5,7 @@
 #include "platform/documents/preview/PreviewView.h"
 #include "platform/documents/targets/TargetScreen.h"
 #include "platform/ui/Controls.h"
+#include "tests/documents/SampleArchives.h"
 #include "tests/documents/SampleDocuments.h"
 
 #include <QApplication>
@@ -45,6 +46,17 @@ bool isComplete(const FolderModel& model) {
             return false;
     }
     return true;
+}
+
+std::string holidayArchive() {
+    std::vector<PackedItem> items = {
+        {"Holiday in the north/Plan of the journey.odt", std::string(18'000, 'o')},
+        {"Holiday in the north/Tickets.pdf", std::string(240'000, 'p')},
+        {"Read me.txt", "All pictures are from August."}};
+    for (int i = 1; i <= 20; ++i)
+        items.push_back({"Holiday in the north/Pictures/IMG " + std::to_string(2040 + i) + ".jpg",
+                         std::string(static_cast<std::size_t>(90'000 + i * 7'777), 'j')});
+    return archiveOf(items, "zip", "", "zip:encryption=traditional");
 }
 
 /// Text on a page alone has more shades than this.
@@ -88,6 +100,7 @@ void GalleryScene::fill() {
     givenFile("Files/Story.txt", longText(2000));
     givenFile("Files/Broken.png", "this is no picture");
     givenFile("Files/Nothing.pdf", "");
+    givenFile("Files/Holiday.zip", holidayArchive());
 }
 
 std::shared_ptr<DocumentListController> GalleryScene::list(std::string_view where) {

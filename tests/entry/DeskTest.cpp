@@ -126,6 +126,7 @@ TEST_F(Desk, InstalledItOpensTheAddressesOfItsScheme) {
     givenRuntimeFolder();
     environment.emplace_back("DISPLAY=:99"); // asked for, though nothing is drawn there
     fs::copy("/bin/true", bin + "/pelmora");
+    fs::copy("/bin/true", bin + "/tavrin-list-archive");
     const auto install = [&](const std::string& more) {
         return test::run({{INSTALLER, "--programs", bin, more}, environment});
     };

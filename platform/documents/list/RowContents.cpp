@@ -27,20 +27,25 @@ Image iconFor(const DocumentEntry& entry, const EntryDetails* details) {
 
 } // namespace
 
+RowContent makeRowContent(const DocumentEntry& entry, const EntryDetails* details,
+                          const std::string& place) {
+    RowContent content;
+    content.name = rowName(entry);
+    content.details = rowDetails(entry, details, place);
+    content.icon = iconFor(entry, details);
+    content.kind = entry.kind;
+    content.promised = details ? details->promised || entry.promised : entry.promised;
+    return content;
+}
+
 RowContent& RowContents::at(const RowModel& model, std::size_t index) {
     const RowId row = model.idAt(index);
     if (const auto found = contents_.find(row); found != contents_.end())
         return found->second;
     if (contents_.size() >= mostContents)
         contents_.clear();
-    const DocumentEntry& entry = model.entryAt(index);
-    const auto details = model.detailsAt(index);
-    RowContent content;
-    content.name = rowName(entry);
-    content.details = rowDetails(entry, details.get(), model.placeAt(index));
-    content.icon = iconFor(entry, details.get());
-    content.kind = entry.kind;
-    content.promised = details ? details->promised || entry.promised : entry.promised;
+    RowContent content =
+        makeRowContent(model.entryAt(index), model.detailsAt(index).get(), model.placeAt(index));
     return contents_.emplace(row, std::move(content)).first->second;
 }
 

@@ -27,6 +27,10 @@ struct RowContent {
     double fittingFor = -1;
 };
 
+/// See rowDetails for `place`. The icon is the default one of the entry's kind or type.
+RowContent makeRowContent(const DocumentEntry& entry, const EntryDetails* details,
+                          const std::string& place);
+
 /// The contents of the rows around the view.
 class RowContents {
 public:

@@ -7,10 +7,11 @@ namespace {
 
 /// The first that fits is taken: special kinds before general ones.
 constexpr std::array kinds{
-    &pdfPreview,    //
-    &imagePreview,  //
-    &sourcePreview, //
-    &textPreview    //
+    &archivePreview, //
+    &pdfPreview,     //
+    &imagePreview,   //
+    &sourcePreview,  //
+    &textPreview,    //
 };
 
 } // namespace

@@ -8,5 +8,6 @@ extern const PreviewKind imagePreview;
 extern const PreviewKind pdfPreview;
 extern const PreviewKind sourcePreview;
 extern const PreviewKind textPreview;
+extern const PreviewKind archivePreview;
 
 } // namespace platform

@@ -82,6 +82,15 @@ void PreviewToken::ifWanted(const Job& job) {
         job();
 }
 
+void PreviewToken::deliver(MainQueue& main, Job job) {
+    ifWanted([&] {
+        main.async([token = shared_from_this(), job = std::move(job)] {
+            if (!token->isCancelled())
+                job();
+        });
+    });
+}
+
 PreviewWorker::PreviewWorker(MainQueue& main)
     : main_(main),
       queue_(std::make_unique<WorkQueue>("platform.preview", WorkPriority::userInitiated)) {
@@ -97,14 +106,8 @@ void PreviewWorker::run(Work work) {
         if (token->isCancelled())
             return;
         Job rest = work(*token);
-        if (!rest)
-            return;
-        token->ifWanted([&] {
-            main.async([token, rest = std::move(rest)] {
-                if (!token->isCancelled())
-                    rest();
-            });
-        });
+        if (rest)
+            token->deliver(main, std::move(rest));
     });
 }
 

@@ -15,13 +15,16 @@ namespace platform {
 class WorkQueue;
 
 /// Tells work that goes on elsewhere whether anybody still wants it.
-class PreviewToken {
+class PreviewToken : public std::enable_shared_from_this<PreviewToken> {
 public:
     bool isCancelled() const { return cancel_.isCancelled(); }
     void cancel();
     CancelFlag& flag() { return cancel_; }
     /// Runs the job unless cancelled; a cancellation waits until it has run.
     void ifWanted(const Job& job);
+    /// Has the job done on the main thread, unless cancelled before that; for what there is to show
+    /// before the work is done.
+    void deliver(MainQueue& main, Job job);
 
 private:
     CancelFlag cancel_;
