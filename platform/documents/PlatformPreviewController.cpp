@@ -139,8 +139,10 @@ PlatformPreviewController::~PlatformPreviewController() {
 }
 
 bool PlatformPreviewController::canPreview(const Url& url) {
-    // A folder of that name is a folder, whatever its name ends in.
-    return !url.hasDirectoryMark() && previewKindFor(typeOf(url)) != nullptr;
+    const std::string type = typeOf(url);
+    // A folder of that name is a folder, whatever its name ends in, unless it is a package.
+    return (!url.hasDirectoryMark() || TypeRegistry::conformsTo(type, types::package)) &&
+           previewKindFor(type) != nullptr;
 }
 
 void PlatformPreviewController::setDataSource(PlatformPreviewDataSource* source) {

@@ -541,6 +541,14 @@
         <translation>هذا المستند فارغ.</translation>
     </message>
     <message>
+        <source>This document consists of several files. A program that knows its kind shows them as one.</source>
+        <translation>يتكون هذا المستند من عدة ملفات. البرنامج الذي يعرف نوعه يعرضها كمستند واحد.</translation>
+    </message>
+    <message>
+        <source>There is more in this document than is listed here.</source>
+        <translation>في هذا المستند أكثر مما هو معروض هنا.</translation>
+    </message>
+    <message>
         <source>%1$@, %2$@ unpacked</source>
         <translation>%1$@، %2$@ بعد فك الضغط</translation>
     </message>

@@ -513,6 +513,14 @@
         <translation>Dieses Dokument ist leer.</translation>
     </message>
     <message>
+        <source>This document consists of several files. A program that knows its kind shows them as one.</source>
+        <translation>Dieses Dokument besteht aus mehreren Dateien. Ein Programm, das seine Art kennt, zeigt sie als eines.</translation>
+    </message>
+    <message>
+        <source>There is more in this document than is listed here.</source>
+        <translation>In diesem Dokument ist mehr, als hier steht.</translation>
+    </message>
+    <message>
         <source>%1$@, %2$@ unpacked</source>
         <translation>%1$@, entpackt %2$@</translation>
     </message>

@@ -520,6 +520,14 @@
         <translation>Этот документ пуст.</translation>
     </message>
     <message>
+        <source>This document consists of several files. A program that knows its kind shows them as one.</source>
+        <translation>Этот документ состоит из нескольких файлов. Программа, знающая его вид, показывает их как одно целое.</translation>
+    </message>
+    <message>
+        <source>There is more in this document than is listed here.</source>
+        <translation>В этом документе есть и другое: здесь показано не всё.</translation>
+    </message>
+    <message>
         <source>%1$@, %2$@ unpacked</source>
         <translation>%1$@, в распакованном виде %2$@</translation>
     </message>

@@ -9,6 +9,7 @@
 
 #include <gmock/gmock.h>
 
+#include <filesystem>
 #include <future>
 #include <poll.h>
 #include <sys/syscall.h>
@@ -180,6 +181,31 @@ TEST_F(ContentsPreview, maybeLeftWhileItIsListed) {
     }
     screen.reset();
     house.settle();
+}
+
+TEST_F(ContentsPreview, aPackageIsListedWithWhatIsPromisedAndWithoutWhatItsLinksLeadTo) {
+    for (const char* const name : {"Note.rtfd", "Trip.package", "Trip.tavrinpack"}) {
+        EXPECT_TRUE(PlatformPreviewController::canPreview(house.url(name)));
+        EXPECT_TRUE(PlatformPreviewController::canPreview(house.url(name).markedAsDirectory(true)));
+    }
+    house.givenFile("Note.rtfd/TXT.rtf", "{}");
+    house.givenFile("Note.rtfd/Pictures/1.png", std::string(4000, 'p'));
+    house.givenFolder("Note.rtfd/Empty");
+    std::filesystem::create_symlink(house.path(""), house.path("Note.rtfd/All"));
+    show("Note.rtfd");
+    ASSERT_TRUE(untilShown());
+    EXPECT_THAT(rows(), ElementsAre("Empty", "Pictures", "1.png", "All", "TXT.rtf"));
+    EXPECT_THAT(page().headText(), HasSubstr("3 items, 4 KB"));
+    EXPECT_THAT(spoken(2), HasSubstr("Link"));
+}
+
+TEST_F(ContentsPreview, aPackageThatIsNoneOrHoldsNothingSaysSo) {
+    house.givenFile("File.rtfd", "a file");
+    house.givenFolder("Empty.package");
+    show("File.rtfd");
+    EXPECT_TRUE(untilPage("damaged"));
+    show("Empty.package");
+    EXPECT_TRUE(untilPage("nothing in this document"));
 }
 
 TEST(ArchiveRecords, comeOutOfAnyPiecesAsTheyWentIn) {

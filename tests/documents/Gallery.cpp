@@ -91,6 +91,8 @@ void previews(GalleryScene& scene) {
 void previewsOfContents(GalleryScene& scene) {
     scene.preview("Files/Holiday.zip");
     scene.save("preview-archive");
+    scene.preview("Files/Diary.package");
+    scene.save("preview-package");
 }
 
 void previewsOfNothing(GalleryScene& scene) {

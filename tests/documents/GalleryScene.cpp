@@ -101,6 +101,10 @@ void GalleryScene::fill() {
     givenFile("Files/Broken.png", "this is no picture");
     givenFile("Files/Nothing.pdf", "");
     givenFile("Files/Holiday.zip", holidayArchive());
+    givenFile("Files/Diary.package/Entries/August.md", longText(40));
+    givenFile("Files/Diary.package/Entries/September.md", longText(90));
+    givenFile("Files/Diary.package/Pictures/Lake.jpg", std::string(345'000, 'j'));
+    givenFile("Files/Diary.package/index.json", "{}");
 }
 
 std::shared_ptr<DocumentListController> GalleryScene::list(std::string_view where) {

@@ -8,6 +8,7 @@ namespace {
 /// The first that fits is taken: special kinds before general ones.
 constexpr std::array kinds{
     &archivePreview, //
+    &packagePreview, //
     &pdfPreview,     //
     &imagePreview,   //
     &sourcePreview,  //

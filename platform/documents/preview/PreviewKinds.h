@@ -9,5 +9,6 @@ extern const PreviewKind pdfPreview;
 extern const PreviewKind sourcePreview;
 extern const PreviewKind textPreview;
 extern const PreviewKind archivePreview;
+extern const PreviewKind packagePreview;
 
 } // namespace platform

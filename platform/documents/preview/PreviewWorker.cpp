@@ -15,11 +15,13 @@
 namespace platform {
 namespace {
 
-Failure checkContents(const Url& file) {
+Failure checkContents(const Url& file, DocumentForm form) {
     const Result<FileAttributes> attributes =
         FileManager::attributes(file.path(), FollowLinks::yes);
     if (!attributes)
         return attributes.error();
+    if (form == DocumentForm::package)
+        return attributes->kind == FileKind::directory ? Failure() : damagedDocument(file);
     if (attributes->kind != FileKind::file)
         return makeErrorWithText(ErrorCode::unsupportedOperation,
                                  attributes->kind == FileKind::directory
@@ -117,7 +119,8 @@ void PreviewWorker::cancel() {
 }
 
 Failure readDocument(const Url& file, PreviewToken& token,
-                     const std::function<Failure(const std::string& path)>& read) {
+                     const std::function<Failure(const std::string& path)>& read,
+                     DocumentForm form) {
     // A coordinated read would fetch the contents, which is for the user to ask for.
     if (ContentProvider* const provider = FileCoordinator::contentProvider();
         provider && provider->isPromised(file))
@@ -129,7 +132,7 @@ Failure readDocument(const Url& file, PreviewToken& token,
     Failure failure;
     const Failure refused =
         coordinator.coordinateReading(file, ReadingOptions::withoutChanges, [&](const Url& url) {
-            failure = checkContents(url);
+            failure = checkContents(url, form);
             if (!failure && !token.isCancelled())
                 failure = read(url.path());
         });

@@ -58,11 +58,15 @@ private:
     Job lastJob_;
 };
 
+/// What a document is on the disk: a package is a folder.
+enum class DocumentForm { file, package };
+
 /// Reads a document while nobody changes it; within Work. `read` gets the path of a file with
-/// something in it, and its error is the answer's. A document without contents, or one that is not
-/// on the device, is an error as well.
+/// something in it, or of a package, and its error is the answer's. A document of the other form,
+/// one without contents, or one that is not on the device, is an error as well.
 Failure readDocument(const Url& file, PreviewToken& token,
-                     const std::function<Failure(const std::string& path)>& read);
+                     const std::function<Failure(const std::string& path)>& read,
+                     DocumentForm form = DocumentForm::file);
 
 /// "… is damaged", with what the decoder said where it said anything.
 Error damagedDocument(const Url& file, const std::string& detail = {});
