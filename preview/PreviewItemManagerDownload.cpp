@@ -132,6 +132,11 @@ struct PreviewItemManager::Download {
     }
 
     void succeed(const Url& readUrl) const {
+        // A read is granted for what is not there as well; there is nothing to show of it.
+        if (!FileUtils::exists(readUrl)) {
+            fail(platform::makeError(ErrorCode::noSuchItem, readUrl.lastPathComponent()));
+            return;
+        }
         auto self = platform::lockForMain(manager);
         const std::optional<Url> current = self ? self->itemResolvedUrl() : url;
         VXLOG(vxDebug, "coordinateReadingItemAtURL finished, old URL %@, new URL %@", current,

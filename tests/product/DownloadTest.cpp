@@ -68,6 +68,16 @@ TEST_F(Download, cancelLeavesThePromiseAndNoPart) {
     EXPECT_TRUE(whileTimePasses([this] { return showsFullPreview(); })) << "it can begin again";
 }
 
+TEST_F(Download, ofADocumentThatIsNotThereSaysSoOnce) {
+    start();
+    ASSERT_TRUE(nav().showURLPreview(url("Gone.txt"), tavrin::fullPreviewMode));
+    advance(1s);
+    downloadsEnd();
+    EXPECT_THAT(alertText(), HasSubstr("Gone.txt"));
+    EXPECT_TRUE(showsIdle());
+    EXPECT_EQ(timesLogged("6 Dispatching download of " + told("Gone.txt")), 1U);
+}
+
 TEST_F(Download, endsWhenItsScreenIsLeft) {
     givenRunningDownload();
     const auto held = nav().itemManager();
