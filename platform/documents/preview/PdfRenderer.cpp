@@ -1,5 +1,6 @@
 #include "platform/base/Text.h"
 #include "platform/documents/DisplayName.h"
+#include "platform/documents/preview/LatestWishes.h"
 #include "platform/documents/preview/PdfFile.h"
 #include "platform/documents/preview/PreviewKinds.h"
 #include "platform/documents/preview/PreviewWorker.h"
@@ -12,7 +13,6 @@
 
 #include <algorithm>
 #include <cmath>
-#include <mutex>
 #include <optional>
 #include <unordered_map>
 
@@ -179,24 +179,8 @@ private:
     std::vector<std::pair<int, int>> asked_;
 };
 
-/// What the main thread wants rendered; the worker looks before each page.
-struct RenderWishes {
-    std::mutex mutex;
-    std::vector<std::pair<int, int>> wanted;
-
-    std::optional<std::pair<int, int>> take() {
-        const std::lock_guard lock(mutex);
-        if (wanted.empty())
-            return std::nullopt;
-        const auto first = wanted.front();
-        wanted.erase(wanted.begin());
-        return first;
-    }
-    void set(std::vector<std::pair<int, int>> pages) {
-        const std::lock_guard lock(mutex);
-        wanted = std::move(pages);
-    }
-};
+/// A page, and how many pixels wide.
+using RenderWishes = LatestWishes<std::pair<int, int>>;
 
 /// The open document; of the worker's queue alone.
 struct PdfSlot {
@@ -212,7 +196,7 @@ public:
         content_ = content.get();
         auto widget = std::make_unique<ZoomWidget>(
             std::move(content),
-            ZoomWidget::Settings{{ZoomPlace::Fit::width, pageMargin, 6}, false});
+            ZoomWidget::Settings{{ZoomPlace::Fit::width, pageMargin, 6}, false, true});
         widget_ = widget.get();
         widget_->setMovedHandler([this] { tellPlace(); });
         view_ = std::make_shared<WidgetView>(std::move(widget));

@@ -14,7 +14,9 @@ public:
         /// All of it is in view, and nothing is drawn larger than it is.
         whole,
         /// As wide as the view.
-        width
+        width,
+        /// As large as it is, from the corner where reading begins.
+        none
     };
     struct Limits {
         Fit fit = Fit::whole;
@@ -22,6 +24,10 @@ public:
         double margin = 0;
         /// Pixels of the content that one zooms in to at most, for each point of the view.
         double largestZoom = 8;
+        /// One zooms out to this, or until it fits where that is smaller.
+        double smallestZoom = 1;
+        /// Reading begins at the right: what is not fitted stays there when sizes change.
+        bool fromRight = false;
     };
 
     explicit ZoomPlace(const Limits& limits) : limits_(limits) {}
@@ -34,6 +40,14 @@ public:
     /// The part of the content that is in view.
     QRectF visibleRect() const;
 
+    /// For a scroll bar: in points of the view, margins included.
+    struct Extent {
+        double offset;
+        double view;
+        double length;
+    };
+    Extent extent(Qt::Orientation direction) const;
+
     /// The same share of the content stays in view.
     void setSizes(QSizeF view, QSizeF content);
     /// What is at `point` of the view stays there.
@@ -42,6 +56,7 @@ public:
     void bring(QPointF content, double zoom, QPointF point);
     /// Answers whether all of the way was free.
     bool moveBy(QPointF distance);
+    void scrollTo(Qt::Orientation direction, double offset);
 
 private:
     double clampedZoom(double zoom) const;

@@ -1,11 +1,13 @@
 #include "platform/documents/preview/ZoomWidget.h"
 
 #include "platform/base/Runtime.h"
+#include "platform/ui/qt/Bridge.h"
 
 #include <QKeyEvent>
 #include <QMouseEvent>
 #include <QNativeGestureEvent>
 #include <QPainter>
+#include <QScrollBar>
 #include <QTouchEvent>
 #include <QWheelEvent>
 
@@ -21,10 +23,12 @@ constexpr double stepPerNotch = 80;
 constexpr double keyStep = 60;
 constexpr double doubleTapZoom = 2.5;
 constexpr double slop = 10;
+constexpr int scrollBarWidth = 12;
+constexpr int scrollBarSteps = 1'000'000;
 constexpr Duration doubleTapTime = std::chrono::milliseconds(350);
 constexpr double doubleTapReach = 40;
 
-Point fromQt(QPointF point) {
+Point pointOf(QPointF point) {
     return {point.x(), point.y()};
 }
 
@@ -42,6 +46,7 @@ QPointF middleOf(const QTouchEvent& event) {
 ZoomWidget::ZoomWidget(std::unique_ptr<ZoomContent> content, const Settings& settings)
     : content_(std::move(content)),
       wheelZooms_(settings.wheelZooms),
+      ground_(settings.ground),
       place_(settings.limits),
       flinger_([this](Point stretch) {
           return moveBy({stretch.x, stretch.y});
@@ -49,6 +54,19 @@ ZoomWidget::ZoomWidget(std::unique_ptr<ZoomContent> content, const Settings& set
     setFocusPolicy(Qt::StrongFocus);
     setAttribute(Qt::WA_AcceptTouchEvents);
     setAttribute(Qt::WA_OpaquePaintEvent, false);
+    if (!settings.scrollBars)
+        return;
+    for (auto [bar, direction] : {std::pair(&across_, Qt::Horizontal), {&down_, Qt::Vertical}}) {
+        *bar = new QScrollBar(direction, this);
+        (*bar)->setFocusPolicy(Qt::NoFocus);
+        // Its places are the content's, which are counted from the left.
+        (*bar)->setLayoutDirection(Qt::LeftToRight);
+        (*bar)->hide();
+        QObject::connect(*bar, &QScrollBar::valueChanged, this, [this, way = direction](int value) {
+            place_.scrollTo(way, place_.extent(way).length * value / scrollBarSteps);
+            changed();
+        });
+    }
 }
 
 ZoomWidget::~ZoomWidget() = default;
@@ -84,12 +102,30 @@ bool ZoomWidget::moveBy(QPointF distance) {
 
 void ZoomWidget::changed() {
     update();
+    updateScrollBar(across_);
+    updateScrollBar(down_);
     if (moved_)
         moved_();
 }
 
+void ZoomWidget::updateScrollBar(QScrollBar* bar) const {
+    if (!bar)
+        return;
+    const ZoomPlace::Extent extent = place_.extent(bar->orientation());
+    const QSignalBlocker quiet(bar);
+    bar->setVisible(extent.length > extent.view + 1);
+    const auto steps = [&](double points) {
+        return static_cast<int>(std::max(0.0, points / extent.length * scrollBarSteps));
+    };
+    bar->setRange(0, steps(extent.length - extent.view));
+    bar->setPageStep(steps(extent.view));
+    bar->setSingleStep(steps(keyStep));
+    bar->setValue(steps(extent.offset));
+}
+
 void ZoomWidget::paintEvent(QPaintEvent* /*event*/) {
     QPainter painter(this);
+    painter.fillRect(rect(), toQt(ground_));
     painter.setRenderHint(QPainter::SmoothPixmapTransform);
     painter.translate(place_.origin());
     painter.scale(zoom(), zoom());
@@ -98,6 +134,11 @@ void ZoomWidget::paintEvent(QPaintEvent* /*event*/) {
 
 void ZoomWidget::resizeEvent(QResizeEvent* event) {
     QWidget::resizeEvent(event);
+    if (down_) {
+        const bool rightToLeft = layoutDirection() == Qt::RightToLeft;
+        down_->setGeometry(rightToLeft ? 0 : width() - scrollBarWidth, 0, scrollBarWidth, height());
+        across_->setGeometry(0, height() - scrollBarWidth, width(), scrollBarWidth);
+    }
     contentChanged();
 }
 
@@ -144,7 +185,7 @@ bool ZoomWidget::touch(QTouchEvent& event) {
         if (tap_ && (at - *tap_).manhattanLength() > slop)
             tap_.reset();
     }
-    flinger_.track(fromQt(at));
+    flinger_.track(pointOf(at));
     if (!over)
         return true;
     dragged_.reset();
@@ -152,9 +193,16 @@ bool ZoomWidget::touch(QTouchEvent& event) {
         return true;
     if (!tap_)
         flinger_.release();
-    else if (tappedTwice(at))
-        toggleZoom(at);
+    else
+        tap(at);
     return true;
+}
+
+void ZoomWidget::tap(QPointF point) {
+    if (tapped_ && tapped_(place_.toContent(point)))
+        return;
+    if (tappedTwice(point))
+        toggleZoom(point);
 }
 
 void ZoomWidget::pinch(const QTouchEvent& event) {
@@ -184,7 +232,7 @@ void ZoomWidget::mousePressEvent(QMouseEvent* event) {
         return;
     flinger_.stop();
     flinger_.forget();
-    dragged_ = event->position();
+    dragged_ = tap_ = event->position();
 }
 
 void ZoomWidget::mouseMoveEvent(QMouseEvent* event) {
@@ -192,14 +240,19 @@ void ZoomWidget::mouseMoveEvent(QMouseEvent* event) {
         return;
     moveBy(event->position() - *dragged_);
     dragged_ = event->position();
-    flinger_.track(fromQt(event->position()));
+    if (tap_ && (event->position() - *tap_).manhattanLength() > slop)
+        tap_.reset();
+    flinger_.track(pointOf(event->position()));
 }
 
 void ZoomWidget::mouseReleaseEvent(QMouseEvent* event) {
     if (event->button() != Qt::LeftButton || !dragged_)
         return;
     dragged_.reset();
-    flinger_.release();
+    if (!tap_)
+        flinger_.release();
+    else if (tapped_)
+        tapped_(place_.toContent(event->position()));
 }
 
 void ZoomWidget::mouseDoubleClickEvent(QMouseEvent* event) {

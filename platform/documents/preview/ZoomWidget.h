@@ -2,6 +2,7 @@
 
 #include "platform/documents/preview/Flinger.h"
 #include "platform/documents/preview/ZoomPlace.h"
+#include "platform/ui/Color.h"
 
 #include <QWidget>
 
@@ -9,6 +10,7 @@
 #include <memory>
 #include <optional>
 
+class QScrollBar;
 class QTouchEvent;
 
 namespace platform {
@@ -30,6 +32,9 @@ public:
         ZoomPlace::Limits limits;
         /// A wheel makes larger and smaller; else it scrolls, and Ctrl makes it zoom.
         bool wheelZooms = false;
+        bool scrollBars = false;
+        /// Behind the content and beside it.
+        Color ground = Color::clear;
     };
 
     ZoomWidget(std::unique_ptr<ZoomContent> content, const Settings& settings);
@@ -44,6 +49,9 @@ public:
     void contentChanged();
     /// Called after every change of what is in view.
     void setMovedHandler(std::function<void()> moved) { moved_ = std::move(moved); }
+    /// Called for a tap or click at a place of the content; answers whether that was for it. Else
+    /// the second one zooms.
+    void setTapHandler(std::function<bool(QPointF content)> tapped) { tapped_ = std::move(tapped); }
 
 protected:
     bool event(QEvent* event) override;
@@ -69,11 +77,14 @@ private:
     bool moveBy(QPointF distance);
     bool touch(QTouchEvent& event);
     void pinch(const QTouchEvent& event);
+    void tap(QPointF point);
     bool tappedTwice(QPointF point);
     void changed();
+    void updateScrollBar(QScrollBar* bar) const;
 
     std::unique_ptr<ZoomContent> content_;
     const bool wheelZooms_;
+    const Color ground_;
     ZoomPlace place_;
     std::optional<QPointF> dragged_;
     std::optional<Pinch> pinch_;
@@ -81,6 +92,10 @@ private:
     std::optional<std::pair<Duration, QPointF>> lastTap_;
     Flinger flinger_;
     std::function<void()> moved_;
+    std::function<bool(QPointF)> tapped_;
+    /// None where the content goes without.
+    QScrollBar* across_ = nullptr;
+    QScrollBar* down_ = nullptr;
 };
 
 } // namespace platform
