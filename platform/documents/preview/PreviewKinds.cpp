@@ -11,6 +11,7 @@ constexpr std::array kinds{
     &packagePreview, //
     &pdfPreview,     //
     &imagePreview,   //
+    &tablePreview,   //
     &sourcePreview,  //
     &textPreview,    //
 };

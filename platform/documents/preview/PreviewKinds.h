@@ -7,6 +7,7 @@ namespace platform {
 extern const PreviewKind imagePreview;
 extern const PreviewKind pdfPreview;
 extern const PreviewKind sourcePreview;
+extern const PreviewKind tablePreview;
 extern const PreviewKind textPreview;
 extern const PreviewKind archivePreview;
 extern const PreviewKind packagePreview;

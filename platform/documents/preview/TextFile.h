@@ -54,14 +54,19 @@ public:
     std::uint64_t start() const { return encoding_.markLength; }
     std::uint64_t lineEndsBetween(std::uint64_t from, std::uint64_t to) const;
 
+    TextEncoding encoding() const { return encoding_.encoding; }
+    /// The bytes there; fewer at the end of the file.
+    std::string read(std::uint64_t offset, std::size_t length) const;
+    /// What the bytes say, without the end of a line and with signs in place of what cannot be
+    /// shown.
+    QString decode(std::string_view bytes) const;
+
 private:
     TextFile() = default;
-    std::string read(std::uint64_t offset, std::size_t length) const;
     std::size_t unit() const;
     /// Just behind the first line end at or after `from`; npos when there is none.
     std::size_t behindLineEnd(std::string_view bytes, std::size_t from) const;
     std::vector<TextLine> split(std::string_view bytes, std::uint64_t offset, bool toEnd) const;
-    QString decode(std::string_view bytes) const;
 
     FileDescriptor file_;
     std::uint64_t size_ = 0;
