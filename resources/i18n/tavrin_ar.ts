@@ -541,6 +541,18 @@
         <translation>هذا المستند فارغ.</translation>
     </message>
     <message>
+        <source>“%1$@” cannot be shown. It may be damaged, or need a password.</source>
+        <translation>تعذّر عرض «⁨%1$@⁩». ربما يكون تالفًا أو يحتاج إلى كلمة مرور.</translation>
+    </message>
+    <message>
+        <source>This document is too large to be shown here.</source>
+        <translation>هذا المستند أكبر من أن يُعرض هنا.</translation>
+    </message>
+    <message>
+        <source>It takes too long to show this document here.</source>
+        <translation>يستغرق عرض هذا المستند هنا وقتًا طويلًا جدًا.</translation>
+    </message>
+    <message>
         <source>This document consists of several files. A program that knows its kind shows them as one.</source>
         <translation>يتكون هذا المستند من عدة ملفات. البرنامج الذي يعرف نوعه يعرضها كمستند واحد.</translation>
     </message>

@@ -513,6 +513,18 @@
         <translation>Dieses Dokument ist leer.</translation>
     </message>
     <message>
+        <source>“%1$@” cannot be shown. It may be damaged, or need a password.</source>
+        <translation>„%1$@“ lässt sich nicht anzeigen. Das Dokument ist vielleicht beschädigt oder braucht ein Passwort.</translation>
+    </message>
+    <message>
+        <source>This document is too large to be shown here.</source>
+        <translation>Dieses Dokument ist zu groß, um hier angezeigt zu werden.</translation>
+    </message>
+    <message>
+        <source>It takes too long to show this document here.</source>
+        <translation>Dieses Dokument hier anzuzeigen dauert zu lange.</translation>
+    </message>
+    <message>
         <source>This document consists of several files. A program that knows its kind shows them as one.</source>
         <translation>Dieses Dokument besteht aus mehreren Dateien. Ein Programm, das seine Art kennt, zeigt sie als eines.</translation>
     </message>

@@ -520,6 +520,18 @@
         <translation>Этот документ пуст.</translation>
     </message>
     <message>
+        <source>“%1$@” cannot be shown. It may be damaged, or need a password.</source>
+        <translation>Документ «%1$@» нельзя показать. Возможно, он повреждён или защищён паролем.</translation>
+    </message>
+    <message>
+        <source>This document is too large to be shown here.</source>
+        <translation>Этот документ слишком велик, чтобы показать его здесь.</translation>
+    </message>
+    <message>
+        <source>It takes too long to show this document here.</source>
+        <translation>Показ этого документа здесь занимает слишком много времени.</translation>
+    </message>
+    <message>
         <source>This document consists of several files. A program that knows its kind shows them as one.</source>
         <translation>Этот документ состоит из нескольких файлов. Программа, знающая его вид, показывает их как одно целое.</translation>
     </message>

@@ -1,5 +1,7 @@
 #include "platform/documents/preview/PreviewKinds.h"
 
+#include "platform/documents/preview/OfficeConverter.h"
+
 #include <array>
 
 namespace platform {
@@ -11,6 +13,7 @@ constexpr std::array kinds{
     &packagePreview, //
     &pdfPreview,     //
     &imagePreview,   //
+    &officePreview,  //
     &tablePreview,   //
     &sourcePreview,  //
     &textPreview,    //
@@ -19,6 +22,9 @@ constexpr std::array kinds{
 } // namespace
 
 const PreviewKind* previewKindFor(std::string_view typeIdentifier) {
+    // Some are written as text that says nothing to a reader.
+    if (isOfficeType(typeIdentifier) && !officePreview.shows(typeIdentifier))
+        return nullptr;
     for (const PreviewKind* const kind : kinds)
         if (kind->shows(typeIdentifier))
             return kind;

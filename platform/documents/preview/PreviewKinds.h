@@ -11,5 +11,6 @@ extern const PreviewKind tablePreview;
 extern const PreviewKind textPreview;
 extern const PreviewKind archivePreview;
 extern const PreviewKind packagePreview;
+extern const PreviewKind officePreview;
 
 } // namespace platform
