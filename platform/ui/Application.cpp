@@ -79,7 +79,10 @@ void Application::terminate(int status) {
 }
 
 bool Application::openUrl(const std::string& url, const OpenUrlOptions& options) {
-    return impl_->delegate && impl_->delegate->applicationOpenURLOptions(*this, url, options);
+    if (!impl_->delegate || !impl_->delegate->applicationOpenURLOptions(*this, url, options))
+        return false;
+    impl_->saveStateSoon();
+    return true;
 }
 
 void Application::bringForward(const std::string& activationToken) {

@@ -121,6 +121,20 @@ TEST_F(Entry, keepsItsStateWhileSomebodyIsSignedIn) {
     EXPECT_FALSE(delegate->applicationShouldRestoreApplicationState(*application));
 }
 
+TEST_F(Entry, comesBackAfterAKillWithWhatTheLastAddressOpened) {
+    signIn();
+    launch();
+    const std::string prefix = "tavrinapp:";
+    ASSERT_TRUE(request(prefix + givenFile("First.txt")));
+    advance(3s);
+    // The same screen shows it, over lists of its own.
+    ASSERT_TRUE(request(prefix + givenFile("Second.txt")));
+    advance(3s);
+    relaunch();
+    ASSERT_NE(nav().itemManager(), nullptr);
+    EXPECT_EQ(nav().itemManager()->item()->url(), url("Second.txt"));
+}
+
 TEST_F(Entry, showsAccountNetworkAndActivityInTheStrip) {
     launch();
     EXPECT_EQ(window().statusStrip().account, "Not signed in");

@@ -127,6 +127,11 @@ bool Application::Impl::eventFilter(QObject* watched, QEvent* event) {
         if (const auto* const device = static_cast<QMouseEvent*>(event)->pointingDevice())
             pointerHovers = device->type() != QInputDevice::DeviceType::TouchScreen;
         break;
+    case QEvent::KeyRelease:
+    case QEvent::MouseButtonRelease:
+    case QEvent::TouchEnd:
+        saveStateSoon();
+        break;
     default:
         break;
     }

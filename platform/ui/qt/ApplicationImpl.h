@@ -33,7 +33,8 @@ struct Application::Impl : public QObject {
     /// The latest of those in view; none when there is none.
     Window* visibleWindow() const;
     void saveState();
-    /// After a screen came to the top, so that a program that is killed comes back there as well.
+    /// After whatever may have changed what is shown (a screen that came to the top, a person's
+    /// input, an address), so that a program that is killed comes back there as well.
     void saveStateSoon();
     void restoreState();
 

@@ -35,10 +35,12 @@ void NavigationController::Stack::change(Screens wanted, bool animated) {
             from->impl().take(AppearanceStep::willDisappear, false);
             from->impl().take(AppearanceStep::didDisappear, false);
         }
-        if (from != to)
+        if (from != to) {
             showTop();
-        else
+        } else if (to) {
+            follow(to);
             updateBar();
+        }
         release(former);
         if (from != to && to && isOnScreen())
             step(AppearanceStep::willAppear, false);
