@@ -1,6 +1,7 @@
 #include "platform/ui/qt/RestorationFile.h"
 
 #include "platform/base/Error.h"
+#include "platform/base/Log.h"
 #include "platform/ui/qt/Bridge.h"
 
 #include <QDir>
@@ -19,6 +20,9 @@ constexpr QLatin1String bytesKey("bytes");
 constexpr QLatin1String dateKey("date");
 constexpr QLatin1String urlKey("url");
 constexpr QLatin1String mapKey("map");
+
+/// No state is a hundredth of that; a longer file is not ours.
+constexpr qint64 sizeLimit = 1024 * 1024;
 
 QJsonObject toJson(const Value::Map& map);
 
@@ -127,7 +131,13 @@ Value::Map readRestorationFile(const std::string& path) {
     QFile file(QFile::decodeName(path.c_str()));
     if (!file.open(QIODevice::ReadOnly))
         return {};
-    return mapOf(QJsonDocument::fromJson(file.readAll()).object());
+    QJsonParseError error{};
+    const QJsonDocument document = QJsonDocument::fromJson(file.read(sizeLimit), &error);
+    if (!document.isObject())
+        platformLog(LogLevel::warning, "The saved state of the screens is damaged: %@",
+                    error.error == QJsonParseError::NoError ? "it is no object"
+                                                            : fromQt(error.errorString()));
+    return mapOf(document.object());
 }
 
 } // namespace platform
