@@ -82,6 +82,16 @@ TEST_F(Input, enterOpensAndF2AndDeleteAskForTheirActions) {
     EXPECT_EQ(delegate->actions.size(), 2U) << "what is not offered is not done by a key either";
 }
 
+TEST_F(Input, enterOpensTheFirstRowThatComesIntoAnEmptyList) {
+    house.givenFolder("Empty");
+    showList("Empty");
+    widget().setFocus();
+    house.givenFile("Empty/First.txt");
+    ASSERT_TRUE(untilShown({"First.txt"}));
+    press(Qt::Key_Return);
+    EXPECT_THAT(delegate->files, ElementsAre(house.url("Empty/First.txt")));
+}
+
 TEST_F(Input, typingFindsANameAndAPauseBeginsAnother) {
     house.givenFile("Zebra.txt");
     ASSERT_TRUE(house.until([&] { return list->containedItemCount() == 41; }));

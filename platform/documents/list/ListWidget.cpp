@@ -148,11 +148,13 @@ void ListWidget::keepPlace() {
 }
 
 /// The keyboard's row is gone: the one in its place is the next.
+/// Who is in the list with the keys is on a row as soon as there is one.
 void ListWidget::keepCurrent() {
-    if (!state_.current || state_.model.contains(*state_.current))
+    if (state_.current ? state_.model.contains(*state_.current) : !state_.hasFocus)
         return;
+    const std::size_t wanted = state_.current ? currentIndex_ : state_.firstWholeInView();
     state_.current.reset();
-    if (const auto next = state_.allowedAround(currentIndex_))
+    if (const auto next = state_.allowedAround(wanted))
         state_.current = state_.model.idAt(*next);
 }
 

@@ -1,5 +1,6 @@
 #include "platform/documents/list/ListAccessible.h"
 #include "platform/documents/list/ListWidget.h"
+#include "platform/ui/qt/Settings.h"
 
 #include <QContextMenuEvent>
 #include <QTouchEvent>
@@ -117,8 +118,9 @@ void ListWidget::focusInEvent(QFocusEvent* event) {
         if (const auto first = state_.allowedAround(state_.firstWholeInView()))
             state_.current = state_.model.idAt(*first);
     const auto index = state_.indexOf(state_.current);
-    const bool byKey =
-        event->reason() == Qt::TabFocusReason || event->reason() == Qt::BacktabFocusReason;
+    // The toolkit gives the same reason when it looks for a place for the focus by itself.
+    const bool byKey = showsKeyboardFocus() && (event->reason() == Qt::TabFocusReason ||
+                                                event->reason() == Qt::BacktabFocusReason);
     if (byKey && index && (*index < state_.firstInView() || *index >= state_.endInView()))
         state_.reveal(*index, false);
     announceCurrentRow(*this);
