@@ -46,11 +46,27 @@ ThumbnailImageView::ThumbnailImageView(platform::Rect frame)
 
 void ThumbnailImageView::setItem(const std::shared_ptr<VXItem>& item) {
     item_ = item;
+    coming_.reset();
     const platform::Image thumbnail = item ? item->thumbnail() : platform::Image();
-    if (thumbnail.empty())
-        showGenericImage();
-    else
+    if (!thumbnail.empty()) {
         thumbnailView_->setImage(thumbnail);
+        return;
+    }
+    showGenericImage();
+    waitForThumbnail();
+}
+
+void ThumbnailImageView::waitForThumbnail() {
+    // A promise has what was made before, and nothing is downloaded for a picture.
+    if (!item_ || !item_->resolvedURL() || !item_->typeIdentifier() || item_->isDirectory() ||
+        item_->isPackage() || item_->isPromise() || !item_->contentModificationDate())
+        return;
+    coming_ = std::make_unique<platform::DocumentThumbnail>(
+        *item_->resolvedURL(), *item_->contentModificationDate(), *item_->typeIdentifier(),
+        [this](const platform::Image& image) {
+            item_->setThumbnail(image);
+            thumbnailView_->setImage(image);
+        });
 }
 
 void ThumbnailImageView::showGenericImage() {

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "items/VXItem.h"
+#include "platform/documents/DocumentThumbnail.h"
 #include "platform/ui/Controls.h"
 #include "preview/PieProgressIndicatorView.h"
 
@@ -8,7 +9,8 @@
 
 namespace tavrin {
 
-/// An item's thumbnail, or its type's icon, with a small progress pie in its corner. Main thread.
+/// An item's thumbnail, or its type's icon, with a small progress pie in its corner. A thumbnail
+/// that is still to be made takes the icon's place when it is there. Main thread.
 class ThumbnailImageView : public platform::View {
 public:
     explicit ThumbnailImageView(platform::Rect frame = {});
@@ -24,7 +26,11 @@ public:
     const std::shared_ptr<PieProgressIndicatorView>& progressView() const { return progressView_; }
 
 private:
+    void waitForThumbnail();
+
     std::shared_ptr<VXItem> item_;
+    /// None while nothing is being made.
+    std::unique_ptr<platform::DocumentThumbnail> coming_;
     std::shared_ptr<platform::ImageView> thumbnailView_;
     std::shared_ptr<PieProgressIndicatorView> progressView_;
 };

@@ -2,6 +2,7 @@
 
 #include "platform/cloud/Sidecar.h"
 #include "platform/files/PathText.h"
+#include "platform/launch/ThumbnailCache.h"
 #include "platform/launch/TypeRegistry.h"
 
 #include <sys/xattr.h>
@@ -28,6 +29,7 @@ struct Subject {
     SharedRole role = SharedRole::none;
     std::string_view downloadingStatus;
     std::string type;
+    bool isPromised = false;
 };
 
 /// Looked up once for the two attributes that need it.
@@ -48,6 +50,19 @@ Value roleValue(SharedRole role) {
     if (role == SharedRole::none)
         return {};
     return role == SharedRole::owner ? sharedRoleOwner : sharedRoleParticipant;
+}
+
+/// Of a promise, whatever was made while its content was here; nothing larger can be made now.
+Value thumbnailsOf(const Subject& subject) {
+    if (subject.isDirectory)
+        return {};
+    const ThumbnailCache cache = ThumbnailCache::current();
+    std::optional<Bytes> picture =
+        subject.isPromised ? cache.findLargest(subject.url, subject.modified)
+                           : cache.find(subject.url, subject.modified, ThumbnailSize::xxLarge);
+    if (!picture)
+        return {};
+    return Value::Map{{std::string(thumbnailSize1024), *std::move(picture)}};
 }
 
 Value valueOf(Subject& subject, ResourceKey key) {
@@ -83,7 +98,7 @@ Value valueOf(Subject& subject, ResourceKey key) {
     case ResourceKey::downloadingStatus:
         return subject.downloadingStatus.empty() ? Value() : Value(subject.downloadingStatus);
     case ResourceKey::thumbnailDictionary:
-        return {};
+        return thumbnailsOf(subject);
     }
     return {};
 }
@@ -155,6 +170,7 @@ ResourceValues readPromisedAttributes(const Url& url, const RemoteRow& remote, R
     subject.modified = remote.modified;
     subject.role = remote.role;
     subject.downloadingStatus = downloadingStatusNotDownloaded;
+    subject.isPromised = true;
     return valuesOf(subject, keys);
 }
 

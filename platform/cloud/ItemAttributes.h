@@ -37,7 +37,8 @@ inline constexpr std::string_view sharedRoleParticipant = "participant";
 /// Values of downloadingStatus.
 inline constexpr std::string_view downloadingStatusNotDownloaded = "not-downloaded";
 inline constexpr std::string_view downloadingStatusCurrent = "current";
-/// The entry of the thumbnail dictionary with 1024 pixels a side.
+/// The entry of the thumbnail dictionary with 1024 pixels a side, or fewer where no more are to be
+/// had: a small picture is not enlarged, and of a promise there is what was made before.
 inline constexpr std::string_view thumbnailSize1024 = "1024x1024";
 
 /// The attributes that a read answered: one slot a key, none where the item has no such attribute.

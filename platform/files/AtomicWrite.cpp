@@ -37,22 +37,22 @@ int writeAll(int file, std::string_view content) {
     return 0;
 }
 
-int writeAndSync(FileDescriptor file, std::string_view content) {
+int writeAndSync(FileDescriptor file, std::string_view content, Durable durable) {
     if (const int number = writeAll(file.get(), content))
         return number;
-    if (::fsync(file.get()) != 0)
+    if (durable == Durable::yes && ::fsync(file.get()) != 0)
         return errno;
     return ::close(file.release()) == 0 ? 0 : errno;
 }
 
 /// Writes and syncs a new file at `temporary`, then gives it its name. Leaves no file on failure.
 int writeAndRename(const std::string& temporary, const PathText& target, std::string_view content,
-                   std::uint32_t mode) {
+                   std::uint32_t mode, Durable durable) {
     FileDescriptor file(::open(temporary.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC,
                                static_cast<mode_t>(mode)));
     if (!file)
         return errno;
-    int number = writeAndSync(std::move(file), content);
+    int number = writeAndSync(std::move(file), content, durable);
     if (number == 0 && std::rename(temporary.c_str(), target.c_str()) != 0)
         number = errno;
     if (number != 0)
@@ -71,14 +71,14 @@ int syncFolder(std::string_view folder) {
 
 } // namespace
 
-Failure FileManager::writeAtomically(const Url& file, std::string_view content,
-                                     std::uint32_t mode) {
+Failure FileManager::writeAtomically(const Url& file, std::string_view content, std::uint32_t mode,
+                                     Durable durable) {
     const PathText target(file.path());
     if (*target.c_str() == '\0')
         return posixError(ENOENT, file, true);
     const std::string_view folder = folderOf(file.path());
-    int number = writeAndRename(temporaryPath(folder), target, content, mode);
-    if (number == 0)
+    int number = writeAndRename(temporaryPath(folder), target, content, mode, durable);
+    if (number == 0 && durable == Durable::yes)
         number = syncFolder(folder);
     return number == 0 ? std::nullopt : Failure(posixError(number, file, true));
 }

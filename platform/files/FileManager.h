@@ -42,6 +42,7 @@ struct DirectoryEntry {
 };
 
 enum class FollowLinks { no, yes };
+enum class Durable { no, yes };
 
 /// The file system, one call a step. Every operation is synchronous, safe from any thread, and says
 /// in its error which item failed and why. Nothing here coordinates; see FileCoordinator.
@@ -74,9 +75,10 @@ public:
     /// The first `limit` bytes, or all when the file is shorter. Regular files only; never waits.
     static Result<Bytes> contents(const Url& file, std::uint64_t limit);
     /// Writes beside the target, syncs, renames over it, syncs the folder: after a crash either the
-    /// old content or the whole new one is there.
+    /// old content or the whole new one is there. Without syncing, others still see either; after a
+    /// crash it may be damaged, which is enough for what can be made again.
     static Failure writeAtomically(const Url& file, std::string_view content,
-                                   std::uint32_t mode = 0644);
+                                   std::uint32_t mode = 0644, Durable durable = Durable::yes);
 
     /// Free bytes of the file system that holds the path, as an unprivileged user may use them.
     static Result<std::uint64_t> freeBytes(std::string_view path);

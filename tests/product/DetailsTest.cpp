@@ -1,4 +1,5 @@
 #include "preview/PreviewThumbnailViewController.h"
+#include "tests/documents/SampleDocuments.h"
 #include "tests/product/PreviewFixture.h"
 
 #include <QColor>
@@ -187,6 +188,24 @@ TEST_F(Details, leansTheNamesTowardTheirValues) {
                   rightToLeft ? platform::TextAlignment::left : platform::TextAlignment::right);
         EXPECT_EQ(place(*cell.nameLabel()).x > place(*cell.valueLabel()).x, rightToLeft);
     }
+}
+
+TEST_F(Details, showsThePictureOnceItIsMade) {
+    signIn();
+    givenFile("Coast.png", pngPicture(1600, 800));
+    std::filesystem::last_write_time(path("Coast.png"),
+                                     std::filesystem::file_time_type::clock::now() - 24h);
+    EXPECT_TRUE(VXItem(url("Coast.png")).thumbnail().empty()) << "nobody waits for it";
+    launch(phone);
+    open("Documents");
+    preview("Coast.png", tavrin::detailsMode);
+    const platform::ImageView& shown = *details()->thumbnailView()->thumbnailView();
+    ASSERT_TRUE(until([&] { return shown.image().size() == platform::Size{1024, 512}; }));
+    EXPECT_EQ(manager().item()->thumbnail(), shown.image());
+    EXPECT_EQ(VXItem(url("Coast.png")).thumbnail().size(), (platform::Size{1024, 512}));
+    const platform::Rect place = Details::place(shown);
+    EXPECT_TRUE(place.width > 0 && place.maxX() <= 390 &&
+                place.maxY() <= Details::place(*details()->fileDetailsView()).y);
 }
 
 TEST_F(Details, showsAPieOnTheThumbnailOnlyWhenAsked) {

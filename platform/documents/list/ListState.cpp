@@ -30,6 +30,7 @@ ListState::ListState(std::shared_ptr<RowModel> theModel, ListClient& theClient,
     : modelOwner(std::move(theModel)),
       model(*modelOwner),
       client(&theClient),
+      thumbnails(repaint),
       scrolling(std::move(scrolled)),
       swipe(repaint),
       repaint_(std::move(repaint)) {
@@ -104,6 +105,7 @@ RowLook ListState::lookOf(std::size_t index) const {
     look.editing = editingShare;
     if (const auto found = arriving.find(row); found != arriving.end())
         look.progress = found->second;
+    look.thumbnail = thumbnails.of(row);
     look.lastRow = index + 1 == model.count();
     return look;
 }

@@ -6,6 +6,7 @@
 #include "platform/documents/list/RowSelection.h"
 #include "platform/documents/list/RowSpans.h"
 #include "platform/documents/list/RowSwipe.h"
+#include "platform/documents/list/RowThumbnails.h"
 #include "platform/documents/list/Scrolling.h"
 
 #include <optional>
@@ -69,6 +70,7 @@ public:
     ListClient* client;
     RowStyle style = RowStyle::current();
     RowContents contents;
+    RowThumbnails thumbnails;
     RowSpans spans;
     RowSelection selection;
     Scrolling scrolling;

@@ -100,6 +100,12 @@ void ListWidget::updateScrollBar() {
 void ListWidget::tellRowsInView() {
     const std::size_t first = state_.firstInView();
     state_.model.setRowsInView(first - std::min(first, rowsAhead), state_.endInView() + rowsAhead);
+    followThumbnails();
+}
+
+void ListWidget::followThumbnails() {
+    state_.thumbnails.follow(state_.model, state_.firstInView(), state_.endInView(),
+                             devicePixelRatioF());
 }
 
 // Changes of the rows
@@ -160,6 +166,7 @@ void ListWidget::keepCurrent() {
 
 void ListWidget::rowContentDidChange(const std::vector<RowId>& rows) {
     state_.contents.forget(rows);
+    followThumbnails();
     update();
 }
 

@@ -66,6 +66,7 @@ private:
     void scrolled();
     void updateScrollBar();
     void tellRowsInView();
+    void followThumbnails();
     void keepPlace();
     void keepCurrent();
     void paintRows(QPainter& painter, const QRectF& dirty);

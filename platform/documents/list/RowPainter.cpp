@@ -6,8 +6,11 @@
 #include "platform/ui/qt/ViewWidget.h"
 
 #include <QPainter>
+#include <QPainterPath>
 
+#include <algorithm>
 #include <array>
+#include <cmath>
 
 namespace platform {
 namespace {
@@ -19,6 +22,11 @@ constexpr double frameCorner = 8;
 constexpr double containerCorner = 11;
 /// Quieter than the rows that can be opened, and still to be read.
 constexpr double dimmedAlpha = 0.45;
+/// What is not on this device.
+constexpr double promisedAlpha = 0.55;
+constexpr double thumbnailCorner = 3;
+/// However thin a picture is, it can be seen.
+constexpr double leastThumbnail = 4;
 /// Beside drawn-in actions a narrower second line would say nothing.
 constexpr double leastDetailsWidth = 96;
 
@@ -90,6 +98,10 @@ private:
 
     void paintIcon() {
         const QRectF frame = place(geometry_.icon);
+        if (!look_.thumbnail.empty()) {
+            paintThumbnail(frame);
+            return;
+        }
         if (isDocument(content_.kind)) {
             painter_.setPen(QPen(toQt(Theme::hairline), 1));
             painter_.setBrush(toQt(Theme::page));
@@ -101,7 +113,7 @@ private:
         target.moveCenter(frame.center());
         painter_.save();
         if (content_.promised)
-            painter_.setOpacity(painter_.opacity() * 0.55);
+            painter_.setOpacity(painter_.opacity() * promisedAlpha);
         paintImage(painter_, content_.icon, target);
         painter_.restore();
         if (content_.kind == EntryKind::container) {
@@ -110,6 +122,32 @@ private:
             painter_.drawRoundedRect(target.adjusted(0.5, 0.5, -0.5, -0.5), containerCorner,
                                      containerCorner);
         }
+    }
+
+    /// Whole, however long or high it is, within a line that ends white paper on a white page.
+    void paintThumbnail(const QRectF& frame) {
+        const Size size = look_.thumbnail.size();
+        const double factor =
+            std::min({1.0, frame.width() / size.width, frame.height() / size.height});
+        QRectF target(0, 0, std::max(leastThumbnail, std::round(size.width * factor)),
+                      std::max(leastThumbnail, std::round(size.height * factor)));
+        target.moveTopLeft({std::round(frame.center().x() - target.width() / 2),
+                            std::round(frame.center().y() - target.height() / 2)});
+        painter_.save();
+        if (content_.promised)
+            painter_.setOpacity(painter_.opacity() * promisedAlpha);
+        QPainterPath shape;
+        shape.addRoundedRect(target, thumbnailCorner, thumbnailCorner);
+        painter_.save();
+        painter_.setClipPath(shape, Qt::IntersectClip);
+        painter_.fillRect(target, toQt(Theme::page));
+        paintImage(painter_, look_.thumbnail, target);
+        painter_.restore();
+        painter_.setPen(QPen(toQt(Theme::text.withAlpha(0.16)), 1));
+        painter_.setBrush(Qt::NoBrush);
+        painter_.drawRoundedRect(target.adjusted(0.5, 0.5, -0.5, -0.5), thumbnailCorner,
+                                 thumbnailCorner);
+        painter_.restore();
     }
 
     void paintTexts() {

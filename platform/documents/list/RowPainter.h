@@ -26,6 +26,8 @@ struct RowLook {
     /// Made narrower by the actions that were drawn in beside it.
     bool aside = false;
     double editing = 0;
+    /// The document's picture; its type's icon stands for none.
+    Image thumbnail;
     /// The share of its content that has arrived; none when nothing is on its way.
     std::optional<double> progress;
     /// No line below: the last row, or the one above a marked one.
