@@ -8,6 +8,8 @@
 #include "preview/ConstraintUtils.h"
 #include "preview/PreviewItemManager.h"
 
+#include <algorithm>
+
 namespace tavrin {
 namespace {
 
@@ -51,10 +53,33 @@ void append(PreviewDetailsViewController::Constraints& all,
 
 } // namespace
 
+void PreviewDetailsViewController::loadView() {
+    PreviewBaseViewController::loadView();
+    page_ = std::make_shared<View>();
+    page_->addSubview(wrapperView());
+    scrollBox_ = std::make_shared<platform::ScrollBox>(page_);
+    view()->addSubview(scrollBox_);
+}
+
 void PreviewDetailsViewController::viewDidLoad() {
     PreviewBaseViewController::viewDidLoad();
     makeOpenInAppButton();
     setupViewsAndConstraints();
+}
+
+void PreviewDetailsViewController::viewWillAppear(bool animated) {
+    PreviewBaseViewController::viewWillAppear(animated);
+    // Rows that need more room than there is push the lower end out of the screen.
+    if (parentBottomConstraint())
+        parentBottomConstraint()->setPriority(almostRequired);
+}
+
+void PreviewDetailsViewController::viewDidLayoutSubviews() {
+    PreviewBaseViewController::viewDidLayoutSubviews();
+    const platform::Rect all = view()->bounds();
+    const double below = parentBottomConstraint() ? -parentBottomConstraint()->constant() : 0;
+    scrollBox_->setFrame(all);
+    scrollBox_->setContentHeight(std::max(all.height, wrapperView()->frame().maxY() + below));
 }
 
 void PreviewDetailsViewController::makeOpenInAppButton() {
@@ -107,13 +132,13 @@ std::shared_ptr<HairlineView> PreviewDetailsViewController::addHairline() {
 }
 
 /// The lines reach beyond the columns that hold them, and a view shows only what is within its
-/// parent. So the screen itself draws each where it lies.
+/// parent. So the page itself draws each where it lies.
 void PreviewDetailsViewController::drawOnScreen(HairlineView& line) {
     const auto drawn = std::make_shared<View>();
     drawn->setBackgroundColor(line.backgroundColor());
     drawn->setLaidOutByConstraints(true);
     line.setBackgroundColor(platform::Color::clear);
-    view()->insertSubview(drawn, 0);
+    page_->insertSubview(drawn, 0);
     Constraints same;
     for (const LayoutAttribute edge : {LayoutAttribute::leading, LayoutAttribute::trailing,
                                        LayoutAttribute::top, LayoutAttribute::bottom})

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "platform/ui/ScrollBox.h"
 #include "platform/ui/StackView.h"
 #include "preview/FileInfoStackView.h"
 #include "preview/HairlineView.h"
@@ -15,11 +16,15 @@ namespace tavrin {
 /// The details screen: a large thumbnail, the name (tap to rename), the rows of information and a
 /// button that opens the document in its application. Below each other in portrait, side by side in
 /// landscape.
+/// What does not fit at the user's text size is scrolled to.
 class PreviewDetailsViewController : public PreviewBaseViewController {
 public:
     using Constraints = std::vector<platform::LayoutConstraint::Pointer>;
 
+    void loadView() override;
     void viewDidLoad() override;
+    void viewWillAppear(bool animated) override;
+    void viewDidLayoutSubviews() override;
     void viewWillTransitionToSize(platform::Size size,
                                   platform::TransitionCoordinator& coordinator) override;
     void refreshItem() override;
@@ -58,6 +63,9 @@ private:
     std::shared_ptr<HairlineView> addHairline();
     void drawOnScreen(HairlineView& line);
 
+    std::shared_ptr<platform::ScrollBox> scrollBox_;
+    /// As high as the screen, or as what is on it; holds the wrapper view.
+    std::shared_ptr<platform::View> page_;
     std::shared_ptr<ThumbnailImageView> thumbnailView_;
     std::shared_ptr<platform::Label> filenameTextField_;
     std::shared_ptr<FileInfoStackView> fileInfoView_;

@@ -229,6 +229,33 @@ TEST_F(Details, showsAPieOnTheThumbnailOnlyWhenAsked) {
     EXPECT_EQ(thumbnail.progressView()->bounds().width, 22);
 }
 
+TEST_F(Details, letsEveryRowBeReachedAtTwiceTheTextSize) {
+    givenDetails("Milk.txt");
+    const auto screen = details();
+    for (const platform::Size size : {phone, platform::Size{844, 390}, {360, 640}, {640, 360}}) {
+        SCOPED_TRACE(size.width);
+        window().resize(size);
+        advance(1s);
+        const auto& rows = screen->fileInfoView()->arrangedSubviews();
+        for (const double scale : {1.0, 2.0}) {
+            application->setTextScale(scale);
+            advance(1s);
+            for (std::size_t i = 1; i < rows.size(); ++i)
+                EXPECT_GE(place(*rows[i]).y, place(*rows[i - 1]).maxY()) << "none over another";
+            const double last = place(*rows.back()).maxY();
+            const double toolbar = nav().toolbarFrame().height;
+            const bool roomy = scale == 1 && size.height > 360;
+            EXPECT_TRUE(!roomy || last <= size.height - toolbar);
+            const auto& page = screen->view()->subviews();
+            auto& box = dynamic_cast<platform::ScrollBox&>(*page.back());
+            box.scrollTo(10'000);
+            EXPECT_LE(last - box.offset(), size.height - toolbar);
+            EXPECT_TRUE(!roomy || box.offset() == 0);
+            box.scrollTo(0);
+        }
+    }
+}
+
 TEST_F(Details, standsBelowUprightAndBesideAcross) {
     givenDetails("Milk.txt", {768, 1024});
     const auto screen = details();

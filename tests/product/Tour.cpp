@@ -2,7 +2,9 @@
 // that it is given.
 
 #include "platform/base/Text.h"
+#include "platform/cloud/CloudDocumentService.h"
 #include "platform/documents/DocumentSearchController.h"
+#include "platform/files/FileCoordinator.h"
 #include "preview/PreviewDownloadViewController.h"
 #include "preview/PreviewItemManager.h"
 #include "tests/product/ProgramHouse.h"
@@ -11,6 +13,7 @@
 #include <QGuiApplication>
 
 #include <cstdio>
+#include <future>
 #include <string>
 
 using namespace std::chrono_literals;
@@ -61,6 +64,16 @@ struct Tour : test::ProgramHouse {
         calmDown();
         advance(1s); // what moves comes to rest
         savePicture(folder + "/" + name + "-" + look_.name + ".png", look_.scale);
+    }
+    /// Its contents come to this device.
+    void fetch(const std::string& path) {
+        bool here = false;
+        const auto fetching = std::async(std::launch::async, [this, &here, item = url(path)] {
+            (void)platform::FileCoordinator().coordinateReading(item, {},
+                                                                [](const platform::Url&) {});
+            platform->mainQueue().async([&here] { here = true; });
+        });
+        until([&] { return here; });
     }
     void back() {
         nav().popViewController(false);
@@ -123,6 +136,34 @@ void lists(Tour& tour) {
     tour.back();
 }
 
+/// Pictures in a list, and the details of every kind of item.
+void details(const Look& look, double textScale = 1) {
+    Tour tour(look);
+    tour.application->setTextScale(textScale);
+    tour.open("Photos");
+    tour.open("Summer");
+    for (const char* const photo : {"The Bay.jpg", "First Snow.jpg", "Hills.jpg", "Road North.jpg"})
+        tour.fetch("/Photos/Summer/" + std::string(photo));
+    tour.picture("photos");
+    tour.fetch("House Rules.pdf");
+    tour.fetch("Archive/2021/Garden Plan.rtfd");
+    const auto show = [&](const std::string& name, const std::string& path) {
+        tour.nav().showPreview(std::make_shared<tavrin::VXItem>(tour.url(path)),
+                               tavrin::detailsMode);
+        tour.picture("details-" + name);
+        tour.back();
+    };
+    show("picture", "/Photos/Summer/The Bay.jpg");
+    show("pdf", "House Rules.pdf");
+    show("folder", "Archive");
+    show("container", "/Travel");
+    show("package", "Archive/2021/Garden Plan.rtfd");
+    show("promise", "/Letters/Complaint about the Stove.pdf");
+    show("shared", "/Travel/Club Minutes.md");
+    if (!tour.documents().evictItem(tour.url("/Photos/Summer/The Bay.jpg")))
+        show("evicted", "/Photos/Summer/The Bay.jpg");
+}
+
 void documents(Tour& tour) {
     for (const std::string name : {"House Rules.pdf", "Lake House.svg", "Long Story.txt"}) {
         tour.open(name);
@@ -183,14 +224,21 @@ int main(int argc, char** argv) {
     makeSample(sample / "Sample");
     const Look phone{"phone", test::phone};
     const Look tablet{"tablet", test::tablet};
+    const Look turned{"phone-landscape", {844, 390}};
     const Look german{"phone-german", {360, 640}, "de_DE"};
     const Look arabic{"phone-arabic", test::phone, "ar_EG", 2};
     show(phone);
     show(tablet);
-    show({"phone-landscape", {844, 390}});
+    show(turned);
     show(german);
     show({"tablet-russian", {768, 1024}, "ru_RU"});
     show(arabic);
+    for (const Look& look :
+         {phone, turned, tablet, arabic, Look{"phone-small", {360, 640}, "de_DE"},
+          Look{"tablet-arabic", {768, 1024}, "ar_EG"}})
+        details(look);
+    details({"phone-large-text", {360, 640}}, 2);
+    details({"phone-landscape-large-text", {844, 390}}, 2);
     for (const Look& look : {phone, tablet, german, arabic}) {
         download(look);
         signedOut(look);
