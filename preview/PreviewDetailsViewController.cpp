@@ -38,12 +38,15 @@ void resistsCompression(View& view) {
         view.setCompressionResistancePriority(layoutRequired, axis);
 }
 
-/// Keeps a view within its column, a little off the edges.
+/// Keeps a view within its column, a little off the edges. The end that may reach beyond the column
+/// must not: a view shows only what is within its parent, and the last letters would be cut.
 PreviewDetailsViewController::Constraints insetWithin(View& view, View& column) {
     return {LayoutConstraint::make(view, LayoutAttribute::leading, LayoutRelation::greaterOrEqual,
                                    &column, LayoutAttribute::leading, 1, sideInset),
             LayoutConstraint::make(view, LayoutAttribute::trailing, LayoutRelation::lessOrEqual,
-                                   &column, LayoutAttribute::trailing, 1, sideInset)};
+                                   &column, LayoutAttribute::trailing, 1, sideInset),
+            LayoutConstraint::make(view, LayoutAttribute::trailing, LayoutRelation::lessOrEqual,
+                                   &column, LayoutAttribute::trailing)};
 }
 
 void append(PreviewDetailsViewController::Constraints& all,

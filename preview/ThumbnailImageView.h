@@ -3,6 +3,7 @@
 #include "items/VXItem.h"
 #include "platform/documents/DocumentThumbnail.h"
 #include "platform/ui/Controls.h"
+#include "platform/ui/ShapeLayer.h"
 #include "preview/PieProgressIndicatorView.h"
 
 #include <memory>
@@ -25,7 +26,11 @@ public:
     const std::shared_ptr<platform::ImageView>& thumbnailView() const { return thumbnailView_; }
     const std::shared_ptr<PieProgressIndicatorView>& progressView() const { return progressView_; }
 
+protected:
+    void layoutSubviews() override;
+
 private:
+    void showThumbnail(const platform::Image& image);
     void waitForThumbnail();
 
     std::shared_ptr<VXItem> item_;
@@ -33,6 +38,9 @@ private:
     std::unique_ptr<platform::DocumentThumbnail> coming_;
     std::shared_ptr<platform::ImageView> thumbnailView_;
     std::shared_ptr<PieProgressIndicatorView> progressView_;
+    /// The line around a thumbnail, without which white paper would have no end.
+    std::shared_ptr<platform::View> frameView_;
+    std::shared_ptr<platform::ShapeLayer> frameLayer_;
 };
 
 } // namespace tavrin
