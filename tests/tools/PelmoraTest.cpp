@@ -68,7 +68,7 @@ TEST_F(Pelmora, RefusesBadInputInWords) {
 TEST_F(Pelmora, HelpsWithEveryCommand) {
     EXPECT_EQ(run("--help"), 0);
     for (const std::string command :
-         {"sign-in", "sign-out", "status", "ls", "refresh", "download", "sample"}) {
+         {"sign-in", "sign-out", "status", "ls", "refresh", "download", "tag", "tags", "sample"}) {
         EXPECT_NE(out.find(command), std::string::npos);
         const std::string overview = out;
         EXPECT_EQ(run(command + " --help"), 0);
@@ -118,6 +118,30 @@ TEST_F(Pelmora, AStoreInUseIsReadAndNotChanged) {
     EXPECT_NE(err.find(std::to_string(getpid())), std::string::npos) << err;
     EXPECT_EQ(run("ls Letters"), 0);
     EXPECT_EQ(run("status"), 0);
+}
+
+TEST_F(Pelmora, TagsDocumentsAndKeepsTheListOfTags) {
+    givenSignedIn();
+    ASSERT_EQ(run("download Letters/a.txt"), 0) << err;
+    for (const std::string name : {"\"Red; / 🚣\" red", "Later none", "\"Red; / 🚣\" orange"})
+        ASSERT_EQ(run("tags " + name), 0) << err;
+    EXPECT_EQ(run("tags"), 0);
+    EXPECT_EQ(out, "orange  Red; / 🚣\nnone    Later\n");
+    EXPECT_NE(home.read("remote/.pelmora/keyvalue.json").find("Later"), std::string::npos);
+    EXPECT_EQ(run("tags --remove Later"), 0) << err;
+    EXPECT_EQ(run("tags --remove Later"), 1);
+    EXPECT_EQ(run("tag Letters/a.txt \"Red; / 🚣\" Later"), 0) << err;
+    EXPECT_EQ(extendedAttribute(store() + "Letters/a.txt", "user.xdg.tags"), "Red; / 🚣,Later");
+    EXPECT_EQ(run("tag Letters/a.txt"), 0) << err;
+    EXPECT_EQ(extendedAttribute(store() + "Letters/a.txt", "user.xdg.tags"), std::nullopt);
+    EXPECT_EQ(run("tag Letters/b.txt Later"), 1) << "a promise";
+    EXPECT_EQ(run("tag Letters/none.txt"), 1);
+    for (const std::string bad : {"tag", "tag Letters/a.txt one,two", "tags One", "tags One pink"})
+        EXPECT_EQ(run(bad), 2) << bad;
+    home.write("remote/.pelmora/keyvalue.json", R"({"KolviTagDict": {"KolviTagDictVersion": 3}})");
+    EXPECT_EQ(run("tags New red"), 1);
+    expectOneClearLine();
+    EXPECT_EQ(home.read("remote/.pelmora/keyvalue.json").find("New"), std::string::npos);
 }
 
 TEST_F(Pelmora, TheSampleIsAStoreToTryThingsWith) {

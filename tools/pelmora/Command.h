@@ -36,6 +36,8 @@ int showStatus(const std::vector<std::string>& arguments);
 int listItems(const std::vector<std::string>& arguments);
 int refresh(const std::vector<std::string>& arguments);
 int download(const std::vector<std::string>& arguments);
+int tagItem(const std::vector<std::string>& arguments);
+int tags(const std::vector<std::string>& arguments);
 int makeSample(const std::vector<std::string>& arguments);
 
 std::span<const Command> commands();

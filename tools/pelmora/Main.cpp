@@ -9,7 +9,7 @@
 namespace pelmora {
 namespace {
 
-constexpr std::array<Command, 7> table{{
+constexpr std::array<Command, 9> table{{
     {"sign-in", "sign-in folder PATH [--name NAME] [--rate-limit BYTES] [--quota BYTES]",
      "Signs in to the account whose remote is the folder PATH. An account that was signed in\n"
      "before finds its store again.\n"
@@ -33,6 +33,15 @@ constexpr std::array<Command, 7> table{{
      "Fetches the contents of documents; of a folder, of everything below it. PATH is absolute or\n"
      "relative to the store. Ctrl-C stops; what is not whole leaves nothing behind.\n",
      &download},
+    {"tag", "tag PATH [NAME...]",
+     "Gives the document PATH those tags in place of the ones that it had; without NAME it has\n"
+     "none then.\n",
+     &tagItem},
+    {"tags", "tags [NAME COLOUR | --remove NAME]",
+     "Lists the account's tags with their colours, gives one a colour (and the account the tag), "
+     "or\n"
+     "takes one out of the list. Colours: none, grey, green, purple, blue, yellow, red, orange.\n",
+     &tags},
     {"sample", "sample PATH",
      "Makes a folder PATH with documents of many kinds, to sign in to and try things with. PATH\n"
      "must not exist yet, or be empty.\n",
