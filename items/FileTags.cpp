@@ -62,9 +62,11 @@ const Value::Map* checkedDictionary(const Value& stored) {
 }
 
 /// A name that the dictionary does not know is drawn like label 0.
-Color colorOf(const std::string& tag, const FileTags::ColorMap& colors) {
-    const auto found = colors.find(tag);
-    return found == colors.end() ? FileTags::_tagBlipColors()[0] : found->second;
+Color colorOf(const std::string& tag) {
+    setUpOnce();
+    const std::lock_guard lock(tablesMutex); // in place: a copy of a long list for each dot is dear
+    const auto found = colorsByTag.find(tag);
+    return found == colorsByTag.end() ? FileTags::_tagBlipColors()[0] : found->second;
 }
 
 } // namespace
@@ -114,7 +116,6 @@ platform::Image FileTags::blipWithTags(const std::vector<std::string>& tags, dou
                                        double scale) {
     if (tags.empty())
         return {};
-    const ColorMap colors = tagColorsByTag();
     const double diameter = std::ceil(height);
     const double step = height / 2;
     platform::ImageCanvas canvas({diameter + step * static_cast<double>(tags.size() - 1), diameter},
@@ -122,7 +123,7 @@ platform::Image FileTags::blipWithTags(const std::vector<std::string>& tags, dou
     for (std::size_t i = 0; i < tags.size(); ++i) {
         const platform::Rect square{static_cast<double>(i) * step, 0, diameter, diameter};
         const platform::Rect circle = square.inset(0.5, 0.5);
-        const Color color = colorOf(tags[i], colors);
+        const Color color = colorOf(tags[i]);
         canvas.fillEllipse(circle, color);
         canvas.strokeEllipse(circle, _colorBlendedWithColor(color, halfWhite), outlineWidth);
     }
@@ -135,8 +136,7 @@ platform::Image FileTags::blipWithTag(const std::optional<std::string>& tag,
     if (!tag)
         return {};
     platform::ImageCanvas canvas(imageSize, false, 1.0);
-    canvas.fillEllipse({offset.x, offset.y, blipHeight, blipHeight},
-                       colorOf(*tag, tagColorsByTag()));
+    canvas.fillEllipse({offset.x, offset.y, blipHeight, blipHeight}, colorOf(*tag));
     return canvas.image();
 }
 

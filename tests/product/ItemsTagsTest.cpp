@@ -59,6 +59,20 @@ TEST_F(Tags, keepTheUsersOrderAndTheLastColour) {
     EXPECT_EQ(FileTags::tagColorsByTag().size(), 6U) << "that was a copy";
 }
 
+TEST_F(Tags, areFoundAmongVeryMany) {
+    Value::List entries;
+    for (int i = 0; i < 100'000; ++i)
+        entries.push_back(tag(("Tag " + std::to_string(i)).c_str(), i % 8));
+    entries.push_back(tag("a, b/c: \xF0\x9F\x9A\xA3\xF0\x9F\x8F\xBD", 6));
+    givenTags(std::move(entries));
+    EXPECT_EQ(FileTags::allTags().size(), 100'001U);
+    std::vector<std::string> many(1'000, "Tag 99999");
+    many.emplace_back("a, b/c: \xF0\x9F\x9A\xA3\xF0\x9F\x8F\xBD");
+    const Image dots = FileTags::blipWithTags(many, 10, 1);
+    expectNear(pixel(dots, 2, 5), labelColor(99'999 % 8));
+    expectNear(pixel(dots, 5'005, 5), labelColor(6));
+}
+
 TEST_F(Tags, areNoneWithoutADictionaryOfTheKnownVersion) {
     listenClosely();
     const Value::List entries{tag("Work", 4)};

@@ -207,6 +207,14 @@ TEST_F(Preview, mergesABurstOfChangesIntoOneRefresh) {
     EXPECT_EQ(timesLogged("6 " + told("Here.txt") + " changed"), 10U);
     advance(5s);
     EXPECT_EQ(refreshes("Here.txt"), 1U);
+    clearLog();
+    for (int i = 0; i < 10'000; ++i) {
+        manager().presentedItemDidChange();
+        if (i % 1000 == 999)
+            advance(90ms);
+    }
+    advance(5s);
+    EXPECT_EQ(refreshes("Here.txt"), 1U);
 }
 
 TEST_F(Preview, showsAnEditFromOutsideOnce) {
