@@ -541,6 +541,42 @@
         <translation>هذا المستند فارغ.</translation>
     </message>
     <message>
+        <source>“%1$@” cannot be played. It may be damaged, or of a kind for which there is no decoder here.</source>
+        <translation>تعذّر تشغيل «⁨%1$@⁩». ربما يكون تالفًا أو من نوع لا يوجد له مفكّك ترميز هنا.</translation>
+    </message>
+    <message>
+        <source>Sound and films cannot be played: a part of this program is missing. Install it again.</source>
+        <translation>لا يمكن تشغيل الصوت والأفلام: جزء من هذا البرنامج مفقود. أعد تثبيته.</translation>
+    </message>
+    <message>
+        <source>There is no device here to hear the sound from.</source>
+        <translation>لا يوجد هنا جهاز لسماع الصوت.</translation>
+    </message>
+    <message>
+        <source>Play</source>
+        <translation>تشغيل</translation>
+    </message>
+    <message>
+        <source>Pause</source>
+        <translation>إيقاف مؤقت</translation>
+    </message>
+    <message>
+        <source>Mute</source>
+        <translation>كتم الصوت</translation>
+    </message>
+    <message>
+        <source>Unmute</source>
+        <translation>إلغاء كتم الصوت</translation>
+    </message>
+    <message>
+        <source>Position</source>
+        <translation>الموضع</translation>
+    </message>
+    <message>
+        <source>Volume</source>
+        <translation>مستوى الصوت</translation>
+    </message>
+    <message>
         <source>“%1$@” cannot be shown. It may be damaged, or need a password.</source>
         <translation>تعذّر عرض «⁨%1$@⁩». ربما يكون تالفًا أو يحتاج إلى كلمة مرور.</translation>
     </message>

@@ -513,6 +513,42 @@
         <translation>Dieses Dokument ist leer.</translation>
     </message>
     <message>
+        <source>“%1$@” cannot be played. It may be damaged, or of a kind for which there is no decoder here.</source>
+        <translation>„%1$@“ lässt sich nicht abspielen. Die Datei ist vielleicht beschädigt oder von einer Art, für die hier kein Decoder da ist.</translation>
+    </message>
+    <message>
+        <source>Sound and films cannot be played: a part of this program is missing. Install it again.</source>
+        <translation>Ton und Filme lassen sich nicht abspielen: Ein Teil dieses Programms fehlt. Bitte installieren Sie es neu.</translation>
+    </message>
+    <message>
+        <source>There is no device here to hear the sound from.</source>
+        <translation>Hier ist kein Gerät, auf dem der Ton zu hören wäre.</translation>
+    </message>
+    <message>
+        <source>Play</source>
+        <translation>Abspielen</translation>
+    </message>
+    <message>
+        <source>Pause</source>
+        <translation>Anhalten</translation>
+    </message>
+    <message>
+        <source>Mute</source>
+        <translation>Ton aus</translation>
+    </message>
+    <message>
+        <source>Unmute</source>
+        <translation>Ton ein</translation>
+    </message>
+    <message>
+        <source>Position</source>
+        <translation>Stelle</translation>
+    </message>
+    <message>
+        <source>Volume</source>
+        <translation>Lautstärke</translation>
+    </message>
+    <message>
         <source>“%1$@” cannot be shown. It may be damaged, or need a password.</source>
         <translation>„%1$@“ lässt sich nicht anzeigen. Das Dokument ist vielleicht beschädigt oder braucht ein Passwort.</translation>
     </message>

@@ -520,6 +520,42 @@
         <translation>Этот документ пуст.</translation>
     </message>
     <message>
+        <source>“%1$@” cannot be played. It may be damaged, or of a kind for which there is no decoder here.</source>
+        <translation>Файл «%1$@» нельзя воспроизвести. Возможно, он повреждён или для него здесь нет декодера.</translation>
+    </message>
+    <message>
+        <source>Sound and films cannot be played: a part of this program is missing. Install it again.</source>
+        <translation>Звук и фильмы воспроизвести нельзя: не хватает части этой программы. Установите её заново.</translation>
+    </message>
+    <message>
+        <source>There is no device here to hear the sound from.</source>
+        <translation>Здесь нет устройства для вывода звука.</translation>
+    </message>
+    <message>
+        <source>Play</source>
+        <translation>Воспроизвести</translation>
+    </message>
+    <message>
+        <source>Pause</source>
+        <translation>Пауза</translation>
+    </message>
+    <message>
+        <source>Mute</source>
+        <translation>Выключить звук</translation>
+    </message>
+    <message>
+        <source>Unmute</source>
+        <translation>Включить звук</translation>
+    </message>
+    <message>
+        <source>Position</source>
+        <translation>Позиция</translation>
+    </message>
+    <message>
+        <source>Volume</source>
+        <translation>Громкость</translation>
+    </message>
+    <message>
         <source>“%1$@” cannot be shown. It may be damaged, or need a password.</source>
         <translation>Документ «%1$@» нельзя показать. Возможно, он повреждён или защищён паролем.</translation>
     </message>

@@ -93,6 +93,10 @@ void previewsOfContents(GalleryScene& scene) {
     scene.save("preview-archive");
     scene.preview("Files/Diary.package");
     scene.save("preview-package");
+    scene.preview("Files/Tune.wav");
+    scene.save("preview-sound");
+    scene.preview("Files/Clip.avi");
+    scene.save("preview-film");
 }
 
 void previewsOfNothing(GalleryScene& scene) {

@@ -22,9 +22,10 @@ using namespace std::chrono_literals;
 
 namespace {
 
-struct OneDocument : PlatformPreviewController, PlatformPreviewDataSource {
+struct OneDocument : PlatformPreviewController, PlatformPreviewDataSource, PlatformPreviewDelegate {
     explicit OneDocument(Url theDocument) : document(std::move(theDocument)) {
         setDataSource(this);
+        setDelegate(this);
     }
     std::size_t numberOfPreviewItemsInPreviewController(PlatformPreviewController&) override {
         return 1;
@@ -33,7 +34,12 @@ struct OneDocument : PlatformPreviewController, PlatformPreviewDataSource {
                                                            std::size_t) override {
         return document;
     }
+    void previewControllerDidShowItem(PlatformPreviewController&, const Url&) override {
+        shown = true;
+    }
+    bool isThere() { return shown || static_cast<const PreviewView&>(*view()).showsPage(); }
     const Url document;
+    bool shown = false;
 };
 
 /// The details of the rows in view are there.
@@ -100,6 +106,8 @@ void GalleryScene::fill() {
     givenFile("Files/Story.txt", longText(2000));
     givenFile("Files/Broken.png", "this is no picture");
     givenFile("Files/Nothing.pdf", "");
+    givenFile("Files/Tune.wav", soundOf(200));
+    givenFile("Files/Clip.avi", filmOf(320, 180, 40));
     givenFile("Files/Holiday.zip", holidayArchive());
     givenFile("Files/Diary.package/Entries/August.md", longText(40));
     givenFile("Files/Diary.package/Entries/September.md", longText(90));
@@ -141,6 +149,7 @@ void GalleryScene::preview(const std::string& file) {
                                               BarButtonItem::withSystemItem(SystemItem::organize)});
     screen->reloadData();
     showAlone({DocumentListController::createForURL(url()), screen});
+    until([&] { return screen->isThere(); });
     waitForPictures();
 }
 

@@ -25,7 +25,7 @@ TEST_F(Preview, knowsByTheNameAloneWhatItCanShow) {
     for (const char* const name : {"a.png", "a.JPG", "a.pdf", "a.txt", "notes.md", "a.csv"})
         EXPECT_TRUE(PlatformPreviewController::canPreview(Url::file(std::string("/none/") + name)))
             << name;
-    for (const char* const name : {"a", "a.unheard-of", "a.mp3"})
+    for (const char* const name : {"a", "a.unheard-of", "a.exe"})
         EXPECT_FALSE(PlatformPreviewController::canPreview(Url::file(std::string("/none/") + name)))
             << name;
     EXPECT_FALSE(PlatformPreviewController::canPreview(Url::file("/none/folder.txt", true)));

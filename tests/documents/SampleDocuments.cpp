@@ -86,4 +86,35 @@ std::string longText(int lines) {
     return text;
 }
 
+std::string soundOf(int seconds) {
+    constexpr std::uint32_t rate = 8000;
+    const auto number = [](std::uint32_t value, int bytes) {
+        std::string out;
+        for (int i = 0; i < bytes; ++i)
+            out += static_cast<char>(value >> (8 * i) & 0xFF);
+        return out;
+    };
+    const auto chunk = [&](const char* name, const std::string& content) {
+        return name + number(static_cast<std::uint32_t>(content.size()), 4) + content;
+    };
+    std::string samples;
+    for (std::uint32_t i = 0; i < rate * static_cast<std::uint32_t>(seconds); ++i)
+        samples += static_cast<char>(i % 16 < 8 ? 108 : 148);
+    const std::string format = number(1, 2) + number(1, 2) + number(rate, 4) + number(rate, 4) +
+                               number(1, 2) + number(8, 2);
+    return chunk("RIFF",
+                 "WAVE" + chunk("fmt ", format) +
+                     chunk("LIST", "INFO" + chunk("INAM", "A low tone") + chunk("IART", "Nobody")) +
+                     chunk("data", samples));
+}
+
+std::string filmOf(int width, int height, int pictures) {
+    std::string film = "YUV4MPEG2 W" + std::to_string(width) + " H" + std::to_string(height) +
+                       " F10:1 Ip A1:1 C420jpeg\n";
+    const auto pixels = static_cast<std::size_t>(width * height);
+    for (int i = 0; i < pictures; ++i)
+        film += "FRAME\n" + std::string(pixels, '\x70') + std::string(pixels / 2, '\x40');
+    return film;
+}
+
 } // namespace test

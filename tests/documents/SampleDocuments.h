@@ -12,5 +12,9 @@ std::string pngPicture(int width, int height);
 std::string pdfOfPages(int pages);
 /// Numbered lines, some of them long.
 std::string longText(int lines);
+/// A tone in a WAV file, with a title.
+std::string soundOf(int seconds);
+/// A film of plain green pictures, ten a second.
+std::string filmOf(int width, int height, int pictures);
 
 } // namespace test

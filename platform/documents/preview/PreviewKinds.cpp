@@ -14,6 +14,7 @@ constexpr std::array kinds{
     &pdfPreview,     //
     &imagePreview,   //
     &officePreview,  //
+    &mediaPreview,   //
     &tablePreview,   //
     &sourcePreview,  //
     &textPreview,    //

@@ -12,5 +12,6 @@ extern const PreviewKind textPreview;
 extern const PreviewKind archivePreview;
 extern const PreviewKind packagePreview;
 extern const PreviewKind officePreview;
+extern const PreviewKind mediaPreview;
 
 } // namespace platform
