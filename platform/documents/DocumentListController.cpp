@@ -136,6 +136,11 @@ bool DocumentListController::performKeyCommand(KeyCommand command) {
         impl_->openSearch();
         return true;
     }
+    if (command == KeyCommand::selectAll && impl_->editing) {
+        setSelectedItems(containedItems());
+        impl_->list->takeFocus();
+        return true;
+    }
     if (command == KeyCommand::down && impl_->model->count() > 0) {
         impl_->list->takeFocus();
         return true;

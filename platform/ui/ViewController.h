@@ -35,6 +35,8 @@ enum class KeyCommand {
     back,
     /// Ctrl+F.
     find,
+    /// Ctrl+A.
+    selectAll,
     /// The arrow, while the focus is in a field or on a button: leads to what the screen shows.
     down
 };

@@ -6,6 +6,7 @@
 #include <QApplication>
 
 #include <algorithm>
+#include <cstdlib>
 
 namespace platform {
 namespace {
@@ -16,6 +17,10 @@ constexpr int lineTolerance = 8;
 bool comesBefore(const QWidget* a, const QWidget* b) {
     const QRect first = a->geometry();
     const QRect second = b->geometry();
+    // A bar over the page that it belongs to, a field over the list that scrolls beneath it.
+    if (const int distance = second.center().y() - first.center().y();
+        first.intersects(second) && std::abs(distance) > lineTolerance)
+        return distance > 0;
     const bool above = first.bottom() <= second.top() + lineTolerance;
     const bool below = second.bottom() <= first.top() + lineTolerance;
     if (above != below)

@@ -26,6 +26,8 @@ QEvent::Type layoutEventType() {
 std::optional<KeyCommand> commandOf(const QKeyEvent& event) {
     if (event.matches(QKeySequence::Find))
         return KeyCommand::find;
+    if (event.matches(QKeySequence::SelectAll))
+        return KeyCommand::selectAll;
     const bool altLeft = event.key() == Qt::Key_Left && event.modifiers() == Qt::AltModifier;
     if (altLeft || event.key() == Qt::Key_Back)
         return KeyCommand::back;
