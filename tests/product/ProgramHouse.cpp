@@ -48,8 +48,8 @@ void ProgramHouse::launch(platform::Size size) {
         withoutAccount();
     if (!application)
         application = std::make_unique<platform::Application>(argumentCount, arguments);
-    application->setIdiom(size.width < 600 ? platform::DeviceIdiom::phone
-                                           : platform::DeviceIdiom::tablet);
+    application->setIdiom(std::min(size.width, size.height) < 600 ? platform::DeviceIdiom::phone
+                                                                  : platform::DeviceIdiom::tablet);
     delegate = std::make_shared<tavrin::AppDelegate>();
     application->launch(delegate);
     window().resize(size);
