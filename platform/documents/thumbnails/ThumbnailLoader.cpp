@@ -35,7 +35,7 @@ public:
         // The platform may have gone when the thread comes to it.
         worker_.run(
             [this, &owner, request, cache = ThumbnailCache::current()](PreviewToken& token) -> Job {
-                setThreadPriority(WorkPriority::utility);
+                setThreadPriority(WorkPriority::background);
                 MadeThumbnail made = makeThumbnail(cache, request, token);
                 const Image image = imageOf(std::move(made.image), request.scale);
                 return [this, &owner, request, image, lasting = made.lasting] {
