@@ -208,6 +208,27 @@ TEST_F(Details, showsThePictureOnceItIsMade) {
                 place.maxY() <= Details::place(*details()->fileDetailsView()).y);
 }
 
+TEST_F(Details, showsThePictureThatWasMadeBeforeTheContentLeft) {
+    givenRemote("Coast.png", pngPicture(1600, 800));
+    std::filesystem::last_write_time(remoteFile("Coast.png"),
+                                     std::filesystem::file_time_type::clock::now() - 24h);
+    start();
+    EXPECT_TRUE(VXItem(url("Coast.png")).thumbnail().empty());
+    EXPECT_TRUE(isPromise("Coast.png")) << "nothing is fetched for a picture";
+    preview("Coast.png");
+    ASSERT_TRUE(untilFullPreview());
+    back();
+    const platform::Size whole{1024, 512};
+    preview("Coast.png", tavrin::detailsMode);
+    ASSERT_TRUE(until(
+        [&] { return details()->thumbnailView()->thumbnailView()->image().size() == whole; }));
+    back();
+    ASSERT_FALSE(documents().evictItem(url("Coast.png")));
+    preview("Coast.png", tavrin::detailsMode);
+    EXPECT_EQ(details()->thumbnailView()->thumbnailView()->image().size(), whole);
+    EXPECT_TRUE(isPromise("Coast.png"));
+}
+
 TEST_F(Details, showsAPieOnTheThumbnailOnlyWhenAsked) {
     givenDetails("Milk.txt");
     const auto screen = std::make_shared<tavrin::PreviewThumbnailViewController>();
