@@ -525,6 +525,10 @@
         <translation>«%1$@» كبير جدًا بحيث لا يمكن عرضه هنا.</translation>
     </message>
     <message>
+        <source>There is no application for it on this device.</source>
+        <translation>لا يوجد تطبيق لذلك على هذا الجهاز.</translation>
+    </message>
+    <message>
         <source>This document cannot be shown.</source>
         <translation>لا يمكن عرض هذا المستند.</translation>
     </message>

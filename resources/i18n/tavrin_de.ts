@@ -497,6 +497,10 @@
         <translation>„%1$@“ ist zu groß, um hier angezeigt zu werden.</translation>
     </message>
     <message>
+        <source>There is no application for it on this device.</source>
+        <translation>Auf diesem Gerät gibt es dafür kein Programm.</translation>
+    </message>
+    <message>
         <source>This document cannot be shown.</source>
         <translation>Dieses Dokument kann nicht angezeigt werden.</translation>
     </message>

@@ -504,6 +504,10 @@
         <translation>Документ «%1$@» слишком велик, чтобы показать его здесь.</translation>
     </message>
     <message>
+        <source>There is no application for it on this device.</source>
+        <translation>На этом устройстве нет подходящего приложения.</translation>
+    </message>
+    <message>
         <source>This document cannot be shown.</source>
         <translation>Не удаётся показать этот документ.</translation>
     </message>

@@ -9,15 +9,17 @@ namespace {
 
 /// The first that fits is taken: special kinds before general ones.
 constexpr std::array kinds{
-    &archivePreview, //
-    &packagePreview, //
-    &pdfPreview,     //
-    &imagePreview,   //
-    &officePreview,  //
-    &mediaPreview,   //
-    &tablePreview,   //
-    &sourcePreview,  //
-    &textPreview,    //
+    &archivePreview,  //
+    &packagePreview,  //
+    &pdfPreview,      //
+    &imagePreview,    //
+    &officePreview,   //
+    &mediaPreview,    //
+    &tablePreview,    //
+    &markdownPreview, //
+    &htmlPreview,     //
+    &sourcePreview,   //
+    &textPreview,     //
 };
 
 } // namespace

@@ -4,7 +4,9 @@
 
 namespace platform {
 
+extern const PreviewKind htmlPreview;
 extern const PreviewKind imagePreview;
+extern const PreviewKind markdownPreview;
 extern const PreviewKind pdfPreview;
 extern const PreviewKind sourcePreview;
 extern const PreviewKind tablePreview;

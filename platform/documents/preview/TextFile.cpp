@@ -183,7 +183,7 @@ std::uint64_t TextFile::lineEndsBetween(std::uint64_t from, std::uint64_t to) co
     return count;
 }
 
-QString TextFile::decode(std::string_view bytes) const {
+QString TextFile::decodeWhole(std::string_view bytes) const {
     const QByteArrayView view(bytes.data(), static_cast<qsizetype>(bytes.size()));
     QString text;
     switch (encoding_.encoding) {
@@ -202,6 +202,11 @@ QString TextFile::decode(std::string_view bytes) const {
         break;
     }
     }
+    return text;
+}
+
+QString TextFile::decode(std::string_view bytes) const {
+    QString text = decodeWhole(bytes);
     while (text.endsWith(QChar(u'\n')) || text.endsWith(QChar(u'\r')))
         text.chop(1);
     for (QChar& unit : text)

@@ -60,6 +60,8 @@ public:
     /// What the bytes say, without the end of a line and with signs in place of what cannot be
     /// shown.
     QString decode(std::string_view bytes) const;
+    /// What the bytes say, as it is.
+    QString decodeWhole(std::string_view bytes) const;
 
 private:
     TextFile() = default;

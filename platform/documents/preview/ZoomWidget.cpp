@@ -72,7 +72,15 @@ ZoomWidget::ZoomWidget(std::unique_ptr<ZoomContent> content, const Settings& set
 ZoomWidget::~ZoomWidget() = default;
 
 void ZoomWidget::zoomBy(double factor) {
-    zoomAround(zoom() * factor, rect().center());
+    if (zoomed_)
+        zoomed_(factor);
+    else
+        zoomAround(zoom() * factor, rect().center());
+}
+
+void ZoomWidget::showTop(double y) {
+    place_.moveBy({0, -(y - visibleRect().top()) * zoom()});
+    changed();
 }
 
 void ZoomWidget::zoomAround(double zoom, QPointF point) {
@@ -265,7 +273,10 @@ void ZoomWidget::wheelEvent(QWheelEvent* event) {
     flinger_.stop();
     const double notches = event->angleDelta().y() / notch;
     if (wheelZooms_ || event->modifiers().testFlag(Qt::ControlModifier)) {
-        zoomAround(zoom() * std::pow(zoomPerNotch, notches), event->position());
+        if (zoomed_)
+            zoomed_(std::pow(zoomPerNotch, notches));
+        else
+            zoomAround(zoom() * std::pow(zoomPerNotch, notches), event->position());
         return;
     }
     const QPointF pixels = event->pixelDelta();

@@ -45,6 +45,11 @@ public:
     /// The part of the content that is in view.
     QRectF visibleRect() const { return place_.visibleRect(); }
     void zoomBy(double factor);
+    /// Makes larger in place of the view itself, where larger means laid out anew: for the buttons,
+    /// the keys and the wheel.
+    void setZoomHandler(std::function<void(double factor)> zoom) { zoomed_ = std::move(zoom); }
+    /// That place of the content comes to the top, as far as there is enough below it.
+    void showTop(double y);
     /// The content has another size now; the same share of it stays in view.
     void contentChanged();
     /// Called after every change of what is in view.
@@ -93,6 +98,7 @@ private:
     Flinger flinger_;
     std::function<void()> moved_;
     std::function<bool(QPointF)> tapped_;
+    std::function<void(double)> zoomed_;
     /// None where the content goes without.
     QScrollBar* across_ = nullptr;
     QScrollBar* down_ = nullptr;
