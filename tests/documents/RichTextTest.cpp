@@ -69,6 +69,8 @@ TEST(CleanHtml, isBoundedInEveryDirection) {
     EXPECT_LT(clean(repeated("<div>", 100'000) + "x").size(), 2000U);
     EXPECT_LT(clean(repeated("<table><tr><td>", 1000) + "x").size(), 25'000U)
         << "one table of rows";
+    EXPECT_EQ(clean(repeated("<table><tr><td>", 10'000)), "<too much>");
+    EXPECT_EQ(clean(repeated("<pre>x</pre>", 10'000)), "<too much>");
     EXPECT_EQ(clean(repeated("<i>x</i>", 200'000)), "<too much>");
     EXPECT_EQ(clean("<table>" + repeated("<tr><td>", 50'000) + repeated("<td>", 60)), "<too much>");
     EXPECT_EQ(clean(repeated(

@@ -17,8 +17,10 @@ constexpr std::size_t deepest = 48;
 constexpr int deepestTable = 3;
 constexpr int mostColumns = 64;
 /// Of all tables together, whether there is something in them or not: each takes as much as a
-/// paragraph; two seconds.
+/// paragraph; two seconds. A table itself costs as much as so many, and one within another four
+/// times as much for each level.
 constexpr int mostCells = 60'000;
+constexpr int cellsForATable = 10;
 /// Two seconds as well.
 constexpr int mostElements = 150'000;
 /// Time for a word grows with the square of its length: longer ones may be broken anywhere.
@@ -235,9 +237,10 @@ private:
             break;
         }
         const QString more = textAttributes(element, attributes);
-        if (element.name == "pre" && tables_.empty())
+        if (element.name == "pre" && tables_.empty()) {
+            cells_ += cellsForATable;
             push(element, boxStart + element.written, element.written + boxEnd);
-        else if (element.name == "a" && !more.contains(QStringLiteral(" href=")))
+        } else if (element.name == "a" && !more.contains(QStringLiteral(" href=")))
             push(element, QStringLiteral("span") + more, QStringLiteral("span"));
         else
             push(element, element.written + more, element.written);
@@ -387,8 +390,14 @@ private:
         tables_.emplace_back();
     }
 
+    /// Of the innermost table, in cells.
+    int costOf(const Table& table) const {
+        const int times = 1 << (2 * (static_cast<int>(tables_.size()) - 1));
+        return times * (cellsForATable + table.rows * table.columns);
+    }
+
     void endTable() {
-        cells_ += tables_.back().rows * tables_.back().columns;
+        cells_ += costOf(tables_.back());
         tables_.pop_back();
     }
 
@@ -425,7 +434,7 @@ private:
         if (span > 1)
             tag += QStringLiteral(" colspan=\"%1\"").arg(span);
         push(element, tag, element.written);
-        if (table.rows * table.columns > mostCells)
+        if (costOf(table) > mostCells)
             cells_ = mostCells + 1;
     }
 
