@@ -82,7 +82,8 @@ void searches(GalleryScene& scene) {
 void previews(GalleryScene& scene) {
     for (const auto& [file, name] :
          {std::pair("Files/Upright.jpg", "image"), std::pair("Files/Report.pdf", "pdf"),
-          std::pair("Files/Story.txt", "text")}) {
+          std::pair("Files/Story.txt", "text"), std::pair("Files/Program.cpp", "source"),
+          std::pair("Files/Accounts.csv", "table"), std::pair("Files/Guide.md", "markdown")}) {
         scene.preview(file);
         scene.save(std::string("preview-") + name);
     }

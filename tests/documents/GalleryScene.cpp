@@ -104,6 +104,9 @@ void GalleryScene::fill() {
     givenFile("Files/Upright.jpg", turnedPhoto(1600, 1200));
     givenFile("Files/Report.pdf", pdfOfPages(5));
     givenFile("Files/Story.txt", longText(2000));
+    givenFile("Files/Program.cpp", sampleProgram());
+    givenFile("Files/Accounts.csv", sampleTable());
+    givenFile("Files/Guide.md", sampleGuide());
     givenFile("Files/Broken.png", "this is no picture");
     givenFile("Files/Nothing.pdf", "");
     givenFile("Files/Tune.wav", soundOf(200));

@@ -117,4 +117,31 @@ std::string filmOf(int width, int height, int pictures) {
     return film;
 }
 
+std::string sampleProgram() {
+    std::string text = "#include <string>\n\n/* Adds\n   things. */\nnamespace sums {\n\n";
+    for (int i = 1; i < 40; ++i)
+        text += "// The sum, and " + std::to_string(i) + ".\nint plus" + std::to_string(i) +
+                "(int value) {\n    const char* const note = \"more\";\n    return value + " +
+                std::to_string(i) + ";\n}\n\n";
+    return text + "} // namespace sums\n";
+}
+
+std::string sampleTable() {
+    std::string text = "Date,Account,Purpose,Amount\n";
+    for (int i = 1; i < 400; ++i)
+        text += "2026-" + std::to_string(10 + i % 3) + "-" + std::to_string(10 + i % 18) +
+                (i % 2 ? ",Household,\"Groceries, and what else one needs for a week\","
+                       : ",Savings,Interest,") +
+                std::to_string(i * 37 % 900) + ".50\n";
+    return text;
+}
+
+std::string sampleGuide() {
+    return "# A short guide\n\nWith **bold**, *italic* and `code`, and a "
+           "[link](https://example.org).\n\n## What to do\n\n- [x] read it\n- [ ] try it\n\n"
+           "1. first\n2. then\n\n> Somebody said this, and it took more than one line.\n\n"
+           "```\nfor (int i = 0; i < 3; ++i)\n    print(i);\n```\n\n"
+           "| Name | Amount |\n|:-----|-------:|\n| Anna | 12.50 |\n| Bert | 3.00 |\n";
+}
+
 } // namespace test

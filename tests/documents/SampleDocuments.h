@@ -17,4 +17,11 @@ std::string soundOf(int seconds);
 /// A film of plain green pictures, ten a second.
 std::string filmOf(int width, int height, int pictures);
 
+/// C++ of a few functions.
+std::string sampleProgram();
+/// A table of bookings, with names above its columns.
+std::string sampleTable();
+/// Markdown with all that it may have.
+std::string sampleGuide();
+
 } // namespace test
