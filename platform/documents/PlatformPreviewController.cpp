@@ -7,6 +7,7 @@
 #include "platform/documents/preview/PreviewRenderer.h"
 #include "platform/documents/preview/PreviewView.h"
 #include "platform/files/FileManager.h"
+#include "platform/launch/DocumentInteractionController.h"
 #include "platform/launch/TypeRegistry.h"
 #include "platform/ui/NavigationController.h"
 #include "platform/ui/Theme.h"
@@ -107,7 +108,18 @@ struct PlatformPreviewController::Impl {
     void showPage(const std::string& message) {
         const std::string type = TypeRegistry::identifierForFile(shown->path());
         view->showPage({DocumentIcons::forType(type, pageIconEdge),
-                        displayName(shown->lastPathComponent()), factsOf(*shown, type), message});
+                        displayName(shown->lastPathComponent()), factsOf(*shown, type), message,
+                        menuOf(*shown)});
+    }
+
+    /// What other programs can do with the document; none when it is not there.
+    std::function<void(const std::shared_ptr<View>&)> menuOf(const Url& document) {
+        if (!FileManager::exists(document.path()))
+            return {};
+        return [this, document](const std::shared_ptr<View>& beside) {
+            menu = DocumentInteractionController::create(document);
+            menu->presentOptionsMenuFromRectInView(beside->bounds(), beside, true);
+        };
     }
 
     /// Lets go of the document and of all that was made from it.
@@ -128,6 +140,7 @@ struct PlatformPreviewController::Impl {
     std::shared_ptr<PreviewView> view;
     std::unique_ptr<PreviewRenderer> renderer;
     std::optional<Url> shown;
+    std::shared_ptr<DocumentInteractionController> menu;
     Timer loading;
 };
 

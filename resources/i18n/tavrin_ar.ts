@@ -545,6 +545,10 @@
         <translation>هذا المستند فارغ.</translation>
     </message>
     <message>
+        <source>Open With…</source>
+        <translation>فتح باستخدام…</translation>
+    </message>
+    <message>
         <source>“%1$@” cannot be played. It may be damaged, or of a kind for which there is no decoder here.</source>
         <translation>تعذّر تشغيل «⁨%1$@⁩». ربما يكون تالفًا أو من نوع لا يوجد له مفكّك ترميز هنا.</translation>
     </message>

@@ -517,6 +517,10 @@
         <translation>Dieses Dokument ist leer.</translation>
     </message>
     <message>
+        <source>Open With…</source>
+        <translation>Öffnen mit…</translation>
+    </message>
+    <message>
         <source>“%1$@” cannot be played. It may be damaged, or of a kind for which there is no decoder here.</source>
         <translation>„%1$@“ lässt sich nicht abspielen. Die Datei ist vielleicht beschädigt oder von einer Art, für die hier kein Decoder da ist.</translation>
     </message>

@@ -524,6 +524,10 @@
         <translation>Этот документ пуст.</translation>
     </message>
     <message>
+        <source>Open With…</source>
+        <translation>Открыть с помощью…</translation>
+    </message>
+    <message>
         <source>“%1$@” cannot be played. It may be damaged, or of a kind for which there is no decoder here.</source>
         <translation>Файл «%1$@» нельзя воспроизвести. Возможно, он повреждён или для него здесь нет декодера.</translation>
     </message>

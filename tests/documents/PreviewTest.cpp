@@ -172,6 +172,31 @@ TEST_F(Preview, maybeLeftWhileItReads) {
     house.settle();
 }
 
+std::shared_ptr<Button> visibleButton(const View& view, const std::string& title) {
+    for (const auto& each : view.subviews()) {
+        if (each->isHidden())
+            continue;
+        if (auto button = std::dynamic_pointer_cast<Button>(each);
+            button && button->title() == title)
+            return button;
+        if (auto inner = visibleButton(*each, title))
+            return inner;
+    }
+    return nullptr;
+}
+
+TEST_F(Preview, offersOtherProgramsForADocumentThatIsThereAndCannotBeShown) {
+    house.givenFile("Program.exe", "MZ");
+    show("Program.exe");
+    ASSERT_TRUE(untilPage("cannot be shown here"));
+    const auto open = visibleButton(view(), "Open With…");
+    ASSERT_TRUE(open);
+    open->sendActions(ControlEvent::touchUpInside);
+    house.settle();
+    show("Gone.exe");
+    EXPECT_FALSE(visibleButton(view(), "Open With…"));
+}
+
 TEST_F(Preview, withoutADocumentItSaysSo) {
     screen->reloadData();
     house.show({screen});

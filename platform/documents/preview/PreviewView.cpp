@@ -30,6 +30,7 @@ PreviewView::PreviewView()
       title_(page_->addText(TextStyle::headline, Theme::text, 0)),
       facts_(page_->addText(TextStyle::subheadline, Theme::secondaryText, smallGap)),
       message_(page_->addText(TextStyle::subheadline, Theme::text, edge)),
+      open_(std::make_shared<Button>(ButtonType::system)),
       loading_(std::make_shared<Label>()),
       placeGround_(makeGround(Theme::text.withAlpha(0.72))),
       place_(std::make_shared<Label>()),
@@ -41,6 +42,12 @@ PreviewView::PreviewView()
     page_->setBackgroundColor(Theme::page);
     page_->setPicture(picture_);
     picture_->setContentMode(ContentMode::aspectFit);
+    open_->setTitle(localized("Open With…"));
+    open_->addAction(ControlEvent::touchUpInside, [this] {
+        if (const auto open = openElsewhere_)
+            open(open_);
+    });
+    page_->addControl(open_, edge);
     loading_->setText(localized("Loading…"));
     loading_->setTextColor(Theme::secondaryText);
     loading_->setTextAlignment(TextAlignment::center);
@@ -104,6 +111,8 @@ void PreviewView::showPage(const Page& page) {
     facts_->setHidden(page.facts.empty());
     message_->setText(page.message);
     message_->setHidden(page.message.empty());
+    openElsewhere_ = page.open;
+    open_->setHidden(!openElsewhere_);
     page_->setHidden(false);
     page_->setNeedsLayout();
     loading_->setHidden(true);

@@ -29,6 +29,9 @@ public:
         /// Lines of what is known of it, and of what can be done.
         std::string facts;
         std::string message;
+        /// Offers other programs, beside the view that it gets; none where there is nothing to
+        /// open.
+        std::function<void(const std::shared_ptr<View>& beside)> open = {};
     };
     void showPage(const Page& page);
     void showDocument();
@@ -46,6 +49,7 @@ private:
     std::shared_ptr<Label> title_;
     std::shared_ptr<Label> facts_;
     std::shared_ptr<Label> message_;
+    std::shared_ptr<Button> open_;
     std::shared_ptr<Label> loading_;
     std::shared_ptr<View> placeGround_;
     std::shared_ptr<Label> place_;
@@ -54,6 +58,7 @@ private:
     std::shared_ptr<Button> larger_;
     std::shared_ptr<Button> smaller_;
     std::function<void(double)> zoom_;
+    std::function<void(const std::shared_ptr<View>&)> openElsewhere_;
 };
 
 } // namespace platform
