@@ -25,7 +25,8 @@ Failure KeptFolder::makeFolders(const std::string& relative) {
     return std::nullopt;
 }
 
-Result<std::string> KeptFolder::take(const std::string& relative, bool onlyHere) {
+Result<std::string> KeptFolder::takeFrom(const std::string& from, const std::string& relative,
+                                         bool onlyHere) {
     const std::string moment = momentText(context_.clock.now());
     for (int number = 1;; ++number) {
         std::string place = moment;
@@ -39,7 +40,7 @@ Result<std::string> KeptFolder::take(const std::string& relative, bool onlyHere)
         // Of two items kept in one second one may be a file where the other has a folder.
         const bool taken = failure && failure->is(ErrorCode::noSuchItem);
         if (!failure)
-            failure = context_.disk.rename(context_.pathOf(relative), path);
+            failure = context_.disk.rename(from, path);
         if (!failure)
             return path;
         const Result<FileAttributes> standing = context_.disk.attributes(path);

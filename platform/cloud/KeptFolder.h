@@ -11,7 +11,12 @@ public:
     explicit KeptFolder(const StoreContext& context) : context_(context) {}
 
     /// Moves the item there. Answers its path there; after an error it is where it was.
-    Result<std::string> take(const std::string& relative, bool onlyHere);
+    Result<std::string> take(const std::string& relative, bool onlyHere) {
+        return takeFrom(context_.pathOf(relative), relative, onlyHere);
+    }
+    /// The same for what lies at `from` now and was at `relative`.
+    Result<std::string> takeFrom(const std::string& from, const std::string& relative,
+                                 bool onlyHere);
 
 private:
     Failure makeFolders(const std::string& relative);

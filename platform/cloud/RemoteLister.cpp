@@ -54,10 +54,12 @@ Failure RemoteLister::run(const std::vector<ItemId>& folders, Depth depth) {
     context_.queue.sync([&] {
         for (const ItemId item : folders) {
             const std::optional<std::string> remotePath = context_.database.remotePathOf(item);
-            const std::optional<std::string> localPath = context_.database.pathOf(item);
-            if (remotePath && localPath)
-                waiting_.push_back({item, *remotePath, *localPath, false, false});
+            const std::optional<std::string> localPath = context_.database.localPathOf(item);
+            if (remotePath)
+                waiting_.push_back(
+                    {item, *remotePath, localPath.value_or(""), false, false, !localPath});
         }
+        first_ = !context_.database.scan(rootItem, Side::remote).complete;
     });
     for (readAhead(); !reading_.empty(); readAhead()) {
         Reading next = std::move(reading_.front());
@@ -104,7 +106,7 @@ RemoteLister::Known RemoteLister::knownOf(const Folder& folder) {
 Result<Arrivals::Spot> RemoteLister::spotOf(const Folder& folder) {
     Arrivals::Spot spot{
         folder.item, folder.localPath, context_.pathOf(folder.localPath), folder.remotePath, {}};
-    if (folder.empty)
+    if (folder.empty || folder.recordOnly)
         return spot;
     const Result<std::vector<DirectoryEntry>> entries = context_.disk.entries(spot.path);
     if (!entries)
@@ -129,6 +131,11 @@ Failure RemoteLister::bringIn(const Folder& folder, const Result<RemoteListing>&
     if (!listing)
         return listing.error();
     Result<Arrivals::Spot> spot = spotOf(folder);
+    if (!spot && spot.error().is(ErrorCode::noSuchItem)) { // deleted by the user a moment ago
+        Folder recorded = folder;
+        recorded.recordOnly = true;
+        return bringIn(recorded, listing);
+    }
     if (!spot)
         return spot.error();
     Visit visit{folder, knownOf(folder), std::move(*spot), 1, listing->refused};
@@ -151,6 +158,10 @@ Failure RemoteLister::bringIn(const Folder& folder, const Result<RemoteListing>&
 Failure RemoteLister::take(Visit& visit, const RemoteEntry& entry) {
     if (const auto known = visit.known.remote.find(entry.name); known != visit.known.remote.end())
         return takeKnown(visit, entry, *known->second);
+    if (const std::optional<ItemState> moved = movedHere(visit, entry)) {
+        takeMoved(visit, entry, *moved);
+        return std::nullopt;
+    }
     const auto shown = visit.known.shown.find(entry.name);
     if (shown == visit.known.shown.end())
         return takeNew(visit, entry, nullptr);
@@ -163,15 +174,54 @@ Failure RemoteLister::take(Visit& visit, const RemoteEntry& entry) {
     return takeNew(visit, entry, &state);
 }
 
+std::optional<ItemState> RemoteLister::movedHere(const Visit& visit, const RemoteEntry& entry) {
+    if (first_ || entry.remoteId.empty())
+        return std::nullopt;
+    std::optional<ItemState> state;
+    std::optional<std::string> before;
+    context_.queue.sync([&] {
+        if (const auto item = context_.database.itemOfRemoteId(entry.remoteId)) {
+            state = context_.database.state(*item);
+            before = context_.database.remotePathOf(*item);
+        }
+    });
+    if (!state || !state->remote || state->item.kind != entry.kind)
+        return std::nullopt;
+    const std::string now = joined(visit.folder.remotePath, entry.name);
+    if (!before || *before == now)
+        return state;
+    const Result<RemoteEntry> there = context_.remote.entry(*before, cancel_);
+    const bool left =
+        there ? there->remoteId != entry.remoteId : there.error().is(ErrorCode::noSuchItem);
+    return left ? state : std::nullopt; // a second name of one file is a file of its own
+}
+
+void RemoteLister::takeMoved(Visit& visit, const RemoteEntry& entry, const ItemState& state) {
+    RemoteRow row = rowOf(visit, entry);
+    ListingBatch::Change change{state.item, false, row, {}, {}};
+    // A move changes the version and no content, where size and time are the same.
+    if (state.base && state.remote->etag == state.base->etag && state.remote->size == entry.size &&
+        state.remote->modified == entry.modified && entry.kind == ItemKind::file) {
+        change.base = state.base;
+        change.base->etag = entry.etag;
+    }
+    batch_.changes.push_back(std::move(change));
+    if (entry.kind == ItemKind::folder)
+        descendKnown(visit, entry, state);
+}
+
 Failure RemoteLister::takeKnown(Visit& visit, const RemoteEntry& entry, const ItemState& state) {
     if (state.item.kind != entry.kind) {
-        visit.refused.push_back(
-            {entry.name, localized("It took the place of something else on the account.")});
+        batch_.displaced.push_back(state.item.id); // another one has its place: it is not there
+        if (state.item.place && state.local)
+            addRemoteOnly(visit, entry);
+        else
+            return takeNew(visit, entry, nullptr);
         return std::nullopt;
     }
-    if (!state.local && !state.base && state.item.place)
+    if (!state.local && !state.base && state.item.place && !visit.folder.recordOnly)
         return takeNew(visit, entry, &state);
-    if (entry.kind == ItemKind::folder && depth_ == Depth::everything && state.local)
+    if (entry.kind == ItemKind::folder && depth_ == Depth::everything)
         descendKnown(visit, entry, state);
     if (sameObservation(*state.remote, entry)) {
         if (state.remote->generation != visit.generation)
@@ -196,6 +246,19 @@ Failure RemoteLister::takeKnown(Visit& visit, const RemoteEntry& entry, const It
 }
 
 Failure RemoteLister::takeNew(Visit& visit, const RemoteEntry& entry, const ItemState* state) {
+    if (visit.folder.recordOnly) {
+        addRemoteOnly(visit, entry);
+        return std::nullopt;
+    }
+    if (state && state->local) {
+        // On the disk already, and not agreed on: what that means is for a plan to say.
+        batch_.changes.push_back({state->item, false, rowOf(visit, entry), {}, {}});
+        if (entry.kind == ItemKind::folder) {
+            batch_.scans.push_back({state->item.id, {0, false}, std::nullopt});
+            descendKnown(visit, entry, *state);
+        }
+        return std::nullopt;
+    }
     Result<Arrivals::Outcome> outcome =
         arrivals_.arrive(visit.spot, entry, state ? std::optional(state->item.id) : std::nullopt);
     if (!outcome)
@@ -215,27 +278,32 @@ Failure RemoteLister::takeNew(Visit& visit, const RemoteEntry& entry, const Item
         batch_.scans.push_back({item, {0, false}, std::nullopt});
         waiting_.push_back({item, joined(visit.folder.remotePath, entry.name),
                             joined(visit.folder.localPath, entry.name), state == nullptr,
-                            outcome->madeFolder});
+                            outcome->madeFolder, false});
     }
     return std::nullopt;
 }
 
 void RemoteLister::addRemoteOnly(Visit& visit, const RemoteEntry& entry) {
-    batch_.changes.push_back({{context_.database.newItemId(), entry.kind, std::nullopt},
-                              true,
-                              rowOf(visit, entry),
-                              std::nullopt,
-                              std::nullopt});
+    const ItemId item = context_.database.newItemId();
+    batch_.changes.push_back(
+        {{item, entry.kind, std::nullopt}, true, rowOf(visit, entry), std::nullopt, std::nullopt});
+    if (entry.kind == ItemKind::folder) {
+        batch_.scans.push_back({item, {0, false}, std::nullopt});
+        waiting_.push_back(
+            {item, joined(visit.folder.remotePath, entry.name), "", true, false, true});
+    }
 }
 
 void RemoteLister::descendKnown(const Visit& visit, const RemoteEntry& entry,
                                 const ItemState& state) {
-    std::optional<std::string> localPath = joined(visit.folder.localPath, entry.name);
-    if (state.item.place != Place{visit.folder.item, entry.name}) // moved on this device
-        context_.queue.sync([&] { localPath = context_.database.pathOf(state.item.id); });
-    if (localPath)
-        waiting_.push_back(
-            {state.item.id, joined(visit.folder.remotePath, entry.name), *localPath, false, false});
+    std::optional<std::string> localPath;
+    if (state.local && state.local->place == Place{visit.folder.item, entry.name} &&
+        !visit.folder.recordOnly)
+        localPath = joined(visit.folder.localPath, entry.name);
+    else if (state.local) // moved on this device
+        context_.queue.sync([&] { localPath = context_.database.localPathOf(state.item.id); });
+    waiting_.push_back({state.item.id, joined(visit.folder.remotePath, entry.name),
+                        localPath.value_or(""), false, false, !localPath});
 }
 
 RemoteRow RemoteLister::rowOf(const Visit& visit, const RemoteEntry& entry) const {
@@ -262,6 +330,7 @@ Failure RemoteLister::writeDown() {
     auto done = std::make_shared<std::promise<Failure>>();
     writing_ = done->get_future();
     auto batch = std::make_shared<ListingBatch>(std::exchange(batch_, ListingBatch()));
+    batch->first = first_;
     context_.queue.async([this, done = std::move(done), batch = std::move(batch)] {
         Failure failure;
         if (batch->effectsOnDisk)

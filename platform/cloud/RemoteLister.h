@@ -49,6 +49,8 @@ private:
         bool unknown = false;
         /// Made by this run: nothing lies in it.
         bool empty = false;
+        /// Not on the disk: what is in it is written down, and nothing is made for it.
+        bool recordOnly = false;
     };
     struct Known {
         ScanRow scan;
@@ -79,6 +81,9 @@ private:
     Failure takeKnown(Visit& visit, const RemoteEntry& entry, const ItemState& state);
     Failure takeNew(Visit& visit, const RemoteEntry& entry, const ItemState* state);
     void addRemoteOnly(Visit& visit, const RemoteEntry& entry);
+    /// The known item that was elsewhere on the remote and is this one now.
+    std::optional<ItemState> movedHere(const Visit& visit, const RemoteEntry& entry);
+    void takeMoved(Visit& visit, const RemoteEntry& entry, const ItemState& state);
     void descendKnown(const Visit& visit, const RemoteEntry& entry, const ItemState& state);
     RemoteRow rowOf(const Visit& visit, const RemoteEntry& entry) const;
     void noteFailure(const Folder& folder, const Error& error);
@@ -91,6 +96,8 @@ private:
     Written written_;
     Arrivals arrivals_;
     Depth depth_ = Depth::newFolders;
+    /// Nothing was known before this run, so that nothing can have moved.
+    bool first_ = false;
     std::deque<Folder> waiting_;
     std::deque<Reading> reading_;
     OperationQueue readers_;

@@ -5,6 +5,7 @@
 #include "platform/cloud/StateHandles.h"
 #include "platform/cloud/Tokens.h"
 
+#include <algorithm>
 #include <charconv>
 
 namespace platform {
@@ -12,6 +13,13 @@ namespace {
 
 using sqlite::Name;
 using sqlite::Statement;
+
+// Numbers of items are kept ahead of their use, in the database: a promise may be on the disk
+// before its item is written down, and after a stop its number must not be given to another item.
+constexpr std::string_view nextItemKey = "nextItem";
+constexpr std::int64_t numbersAtOnce = 16384;
+/// What may be given out between two transactions: two batches of a listing, and some more.
+constexpr std::int64_t numbersOnTheWay = 12288;
 
 std::int64_t numberOf(std::string_view text) {
     std::int64_t number = 0;
@@ -91,10 +99,21 @@ Failure StateDatabase::prepareSchema(bool thorough) {
     if (first <= 0) // tables without what every database has since it was made
         return takeFault().value_or(makeError(ErrorCode::readCorrupt, "state.db"));
     Statement last(connection, "SELECT max(id) FROM item WHERE id >= ?1 AND id < ?2");
-    next_ = first + 1;
+    next_ = std::max(first + 1, numberOf(meta(nextItemKey)));
     if (last.with(first, first + (1LL << 32)).step() && !last.isNull(0))
-        next_ = last.integer(0) + 1;
-    return takeFault();
+        next_ = std::max(next_.load(), last.integer(0) + 1);
+    if (Failure fault = takeFault())
+        return fault;
+    return transaction([] { return Failure(); }); // keeps numbers for this run
+}
+
+std::optional<std::int64_t> StateDatabase::keepNumbers() {
+    const std::int64_t next = next_.load();
+    if (next + numbersOnTheWay <= keptUntil_)
+        return std::nullopt;
+    const std::int64_t until = next + numbersAtOnce;
+    setMeta(nextItemKey, std::to_string(until));
+    return until;
 }
 
 Failure StateDatabase::transaction(const std::function<Failure()>& work) {
@@ -103,8 +122,12 @@ Failure StateDatabase::transaction(const std::function<Failure()>& work) {
     if (!connection.execute("BEGIN IMMEDIATE"))
         return takeFault();
     Failure failure = work();
-    if (!failure && !connection.hasFault() && connection.execute("COMMIT"))
+    const std::optional<std::int64_t> kept =
+        failure || connection.hasFault() ? std::nullopt : keepNumbers();
+    if (!failure && !connection.hasFault() && connection.execute("COMMIT")) {
+        keptUntil_ = kept.value_or(keptUntil_);
         return std::nullopt;
+    }
     if (!failure)
         failure = takeFault();
     // Some faults (a full disk) have rolled back already; a second time is harmless.
@@ -205,6 +228,10 @@ void StateDatabase::forgetLocalTree(ItemId item) {
 }
 
 void StateDatabase::removeItem(ItemId item) {
+    handles_
+        ->prepared("UPDATE item SET parent = NULL, name = NULL, folded = NULL WHERE parent = ?1")
+        .with(item)
+        .run();
     handles_->prepared("DELETE FROM item WHERE id = ?1").with(item).run();
 }
 
@@ -241,6 +268,10 @@ void StateDatabase::putScan(ItemId folder, Side side, const ScanRow& scan) {
                    " VALUES(?1, ?2, ?3, ?4)")
         .with(folder, side, scan.generation, scan.complete)
         .run();
+}
+
+void StateDatabase::clearRefused(Side side) {
+    handles_->prepared("DELETE FROM refused WHERE side = ?1").with(side).run();
 }
 
 void StateDatabase::setRefused(ItemId folder, Side side, const std::vector<RefusedRow>& rows) {

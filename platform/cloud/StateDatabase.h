@@ -47,6 +47,7 @@ public:
     std::vector<ItemId> treeOf(ItemId item, Side side);
     /// Items that both sides have had.
     std::int64_t agreedItems();
+    std::int64_t agreedItemsIn(ItemId folder);
     /// Items whose folded name contains the folded text, at most `limit`.
     std::vector<ItemId> itemsNamed(std::string_view text, std::size_t limit);
 
@@ -54,6 +55,7 @@ public:
     std::vector<ItemId> unfinishedScans(Side side);
     std::vector<OpRow> operations();
     std::vector<RefusedRow> refused(ItemId folder, Side side);
+    std::int64_t refusedCount(Side side);
     /// Items with a role and an observation of the disk.
     std::vector<ItemState> sharedItems();
     StoreCounts counts();
@@ -93,7 +95,7 @@ public:
     /// base knows is forgotten altogether.
     void forgetLocalTree(ItemId item);
     void removeRemote(ItemId item);
-    /// Forgets an item in which nobody's place is, with all that was known of it.
+    /// Forgets an item with all that was known of it; what the user saw in it has no place then.
     void removeItem(ItemId item);
     void putBase(ItemId item, const BaseRow& row);
     void removeBase(ItemId item);
@@ -103,6 +105,7 @@ public:
     /// is missing since one whole listing, two less since two. The number moves on only when
     /// something is missing, so that a listing without news writes nothing.
     void putScan(ItemId folder, Side side, const ScanRow& scan);
+    void clearRefused(Side side);
     void setRefused(ItemId folder, Side side, const std::vector<RefusedRow>& rows);
     /// Inserts (id 0) or replaces; answers the id.
     std::int64_t putOperation(const OpRow& row);
@@ -114,7 +117,10 @@ public:
 private:
     explicit StateDatabase(std::unique_ptr<Handles> handles);
     Failure prepareSchema(bool thorough);
+    /// Within a transaction; the new end of the numbers that are kept, if it moves.
+    std::optional<std::int64_t> keepNumbers();
     std::atomic<ItemId> next_{0};
+    std::int64_t keptUntil_ = 0;
 };
 
 /// Reads the database while another, of this or of another process, writes. Safe from any thread,

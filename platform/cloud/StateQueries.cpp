@@ -299,8 +299,23 @@ std::vector<ItemId> StateQueries::treeOf(ItemId item, Side side) {
     return items;
 }
 
+std::int64_t StateQueries::refusedCount(Side side) {
+    return firstItem(handles_->prepared("SELECT count(*) FROM refused WHERE side = ?1").with(side))
+        .value_or(0);
+}
+
 std::int64_t StateQueries::agreedItems() {
     return firstItem(handles_->prepared("SELECT count(*) FROM base").with()).value_or(0);
+}
+
+std::int64_t StateQueries::agreedItemsIn(ItemId folder) {
+    return firstItem(
+               handles_
+                   ->prepared("WITH RECURSIVE tree(id) AS (SELECT item FROM base WHERE parent = ?1"
+                              " UNION SELECT base.item FROM base JOIN tree ON base.parent ="
+                              " tree.id) SELECT count(*) FROM tree")
+                   .with(folder))
+        .value_or(0);
 }
 
 std::vector<ItemState> StateQueries::sharedItems() {

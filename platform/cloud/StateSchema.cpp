@@ -57,6 +57,7 @@ CREATE TABLE base(
     btime INTEGER NOT NULL,
     mtime_ns INTEGER NOT NULL DEFAULT 0,
     ctime_ns INTEGER NOT NULL DEFAULT 0);
+CREATE INDEX base_parent ON base(parent);
 CREATE TABLE op(
     id INTEGER PRIMARY KEY AUTOINCREMENT,
     item INTEGER NOT NULL REFERENCES item(id) ON DELETE CASCADE,
@@ -89,6 +90,7 @@ INSERT INTO item(id, parent, name, folded, kind) VALUES(1, NULL, x'', '', 1);
 const char* const stateMigrationToSecond = R"sql(
 ALTER TABLE base ADD COLUMN mtime_ns INTEGER NOT NULL DEFAULT 0;
 ALTER TABLE base ADD COLUMN ctime_ns INTEGER NOT NULL DEFAULT 0;
+CREATE INDEX base_parent ON base(parent);
 UPDATE base SET mtime_ns = l.mtime_ns, ctime_ns = l.ctime_ns FROM local l WHERE l.item = base.item;
 )sql";
 

@@ -135,6 +135,13 @@ Failure StoreMoves::recordMove(ItemId item, const std::string& to, const FileAtt
             database.setItemPlace(*other, std::nullopt);
             database.removeLocal(*other);
         }
+        if (const std::optional<ItemState> state = database.state(item);
+            state && state->base && state->local && state->local->changed == state->base->changed &&
+            state->local->identity == state->base->identity) {
+            BaseRow base = *state->base; // a rename changes this time, and no content
+            base.changed = attributes.changed;
+            database.putBase(item, base);
+        }
         database.setItemPlace(item, place);
         database.putLocal(item, localRowOf(place, attributes, promise));
         return std::nullopt;

@@ -38,6 +38,7 @@ private:
     bool leavesHere(const ItemState& state) const;
     bool leavesThere(const ItemState& state) const;
     void add(SyncStep step);
+    void leaveWhatGoes();
     void addDeletions();
     std::size_t depthOf(const ItemState& state) const;
 
@@ -47,6 +48,7 @@ private:
     std::set<ItemId> busy_;    // on the way to their step
     std::set<ItemId> emitted_; // have it, or have to wait
     std::set<ItemId> aside_;
+    std::set<ItemId> added_;
     std::set<ItemId> madeHere_;
     std::set<ItemId> madeThere_;
     std::vector<SyncStep> steps_;
@@ -175,6 +177,7 @@ void Planner::add(SyncStep step) {
         madeHere_.insert(step.item);
     if (step.kind == StepKind::makeFolder)
         madeThere_.insert(step.item);
+    added_.insert(step.item);
     steps_.push_back(std::move(step));
 }
 
@@ -333,12 +336,36 @@ void Planner::addDeletions() {
         steps_.push_back(std::move(step));
 }
 
+/// What has to wait for its place, and lies in a folder that is to be deleted, leaves that folder:
+/// its place may be waiting for the folder's name.
+void Planner::leaveWhatGoes() {
+    for (const auto& [item, wish] : wishes_) {
+        const bool here = wish.kind == StepKind::moveHere;
+        if ((!here && wish.kind != StepKind::moveThere) || added_.contains(item))
+            continue;
+        const ItemState& state = *trees_.find(item);
+        const ItemId in = here ? state.local->place.parent : state.remote->place.parent;
+        ItemId folder = in;
+        for (std::size_t steps = 0; steps < trees_.items().size(); ++steps) {
+            const auto fate = wishes_.find(folder);
+            if (fate == wishes_.end() ||
+                fate->second.kind != (here ? StepKind::keep : StepKind::remove))
+                break;
+            const ItemState& going = *trees_.find(folder);
+            folder = here ? going.local->place.parent : going.remote->place.parent;
+        }
+        if (folder != in)
+            add({wish.kind, item, {folder, temporaryName(item)}, 0});
+    }
+}
+
 std::vector<SyncStep> Planner::run() {
     for (const ItemState& state : trees_.items())
         if (Wish wish = wishOf(state))
             wishes_.emplace(state.item.id, std::move(*wish));
     for (const ItemState& state : trees_.items())
         emit(state);
+    leaveWhatGoes();
     std::stable_partition(steps_.begin(), steps_.end(),
                           [](const SyncStep& step) { return !isContentStep(step.kind); });
     addDeletions();

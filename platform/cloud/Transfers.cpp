@@ -5,6 +5,7 @@
 #include "platform/cloud/ContentPlacing.h"
 #include "platform/cloud/Eviction.h"
 #include "platform/cloud/StoreFileSystem.h"
+#include "platform/cloud/SyncExecutor.h"
 #include "platform/cloud/Tokens.h"
 #include "platform/files/PathText.h"
 #include "platform/files/Progress.h"
@@ -14,7 +15,6 @@
 namespace platform {
 namespace {
 
-constexpr unsigned transfersAtOnce = 8;
 /// How often a content that changes while it is read is begun anew.
 constexpr int attempts = 3;
 
@@ -37,8 +37,7 @@ Transfers::Transfers(StoreContext& context, FileProgressSubscription& progress,
     : context_(context),
       progress_(progress),
       limiter_(context.clock, bytesPerSecond),
-      placed_(std::move(placed)),
-      pool_("transfers", transfersAtOnce) {
+      placed_(std::move(placed)) {
 }
 
 Transfers::~Transfers() {
@@ -116,7 +115,7 @@ std::shared_ptr<Transfers::Transfer> Transfers::join(ItemId item, const Url& url
         transfer->url = url;
         transfer->path = url.path().substr(context_.layout.root().size() + 1);
         transfer->progress = std::make_shared<Progress>(std::string(fileProgressKind));
-        pool_.async([this, transfer] {
+        pool_.async(TransferQueue::Urgency::user, [this, transfer] {
             Failure result = run(*transfer);
             const std::lock_guard inner(mutex_);
             transfer->result = std::move(result);
@@ -219,6 +218,10 @@ void Transfers::recover(StoreContext& context) {
     for (const OpRow& op : context.database.operations())
         if (Eviction::owns(op))
             Eviction::resume(context, op);
+        else if (isReplacement(op))
+            resumeReplacement(context, op);
+        else if (isConflict(op))
+            resumeConflict(context, op);
         else
             placing.resume(op);
     const Result<std::vector<DirectoryEntry>> left = context.disk.entries(context.layout.staging());

@@ -1,9 +1,9 @@
 #pragma once
 
-#include "platform/base/OperationQueue.h"
 #include "platform/cloud/RateLimiter.h"
 #include "platform/cloud/Remote.h"
 #include "platform/cloud/StoreContext.h"
+#include "platform/cloud/TransferQueue.h"
 
 #include <condition_variable>
 #include <functional>
@@ -37,6 +37,10 @@ public:
     /// store's queue.
     void stop();
 
+    /// What the engine transfers on its own shares both.
+    TransferQueue& queue() { return pool_; }
+    RateLimiter& limiter() { return limiter_; }
+
     /// Finishes or undoes what a stopped program left. On the store's queue.
     static void recover(StoreContext& context);
 
@@ -58,7 +62,7 @@ private:
     std::map<ItemId, std::shared_ptr<Transfer>> running_; // guarded by mutex_
     int callers_ = 0;                                     // guarded by mutex_
     bool stopping_ = false;                               // guarded by mutex_
-    OperationQueue pool_;
+    TransferQueue pool_;
 };
 
 } // namespace platform

@@ -163,11 +163,17 @@ Failure StoreFixture::open() {
         StoreContext{layout, store->mark, *disk, *remote, clock, *queue, *store->database});
     queue->sync([&] { Transfers::recover(*context); });
     transfers = std::make_unique<Transfers>(*context, progress, rateLimit, nullptr);
+    queue->sync([&] {
+        synchronizer = std::make_unique<Synchronizer>(*context, transfers->queue(),
+                                                      transfers->limiter(), cancel,
+                                                      store->lock.afterCrash(), nullptr);
+    });
     const Result<std::string> mark = remote->connect(cancel);
     return mark ? Failure() : Failure(mark.error());
 }
 
 void StoreFixture::close() {
+    synchronizer.reset();
     transfers.reset();
     queue.reset();
     context.reset();
@@ -192,6 +198,26 @@ Failure StoreFixture::list() {
 
 Failure StoreFixture::refresh() {
     return RemoteLister(*context, cancel, nullptr).run({rootItem}, RemoteLister::Depth::everything);
+}
+
+Synchronizer::Report StoreFixture::sync() {
+    if (!store) {
+        const Failure failure = open();
+        EXPECT_EQ(failure, std::nullopt);
+    }
+    return synchronizer->run({true, true, {}, true});
+}
+
+void StoreFixture::synced() {
+    const Synchronizer::Report report = sync();
+    EXPECT_FALSE(report.failure) << report.failure->localizedDescription.value_or("")
+                                 << report.failure->localizedFailureReason.value_or("");
+    EXPECT_FALSE(report.question);
+    queue->sync([&] {
+        for (const PendingWork& work : Synchronizer::pending(*store->database))
+            ADD_FAILURE() << work.kind << ' ' << work.path << ": " << work.cause;
+        EXPECT_TRUE(store->database->disagreements().empty());
+    });
 }
 
 Failure StoreFixture::fetch(const std::string& path) {

@@ -6,6 +6,7 @@
 #include "platform/cloud/RemoteLister.h"
 #include "platform/cloud/StoreFileSystem.h"
 #include "platform/cloud/StoreMoves.h"
+#include "platform/cloud/Synchronizer.h"
 #include "platform/cloud/Transfers.h"
 #include "platform/files/Progress.h"
 #include "tests/support/TemporaryFolder.h"
@@ -84,6 +85,7 @@ struct StoreFixture : ::testing::Test {
     std::optional<platform::OpenedStore> store;
     std::optional<platform::StoreContext> context;
     std::unique_ptr<platform::Transfers> transfers;
+    std::unique_ptr<platform::Synchronizer> synchronizer;
 
     StoreFixture() { home.makeFolder("remote"); }
     ~StoreFixture() override { close(); }
@@ -102,6 +104,10 @@ struct StoreFixture : ::testing::Test {
     platform::Failure list();
     /// A later look at everything.
     platform::Failure refresh();
+    /// Makes both sides agree, as a command of the user's does.
+    platform::Synchronizer::Report sync();
+    /// The same, and all has gone well.
+    void synced();
     platform::Failure fetch(const std::string& path);
     platform::Failure move(const std::string& from, const std::string& to);
 

@@ -1,0 +1,226 @@
+#include "platform/cloud/Synchronizer.h"
+
+#include "platform/base/Describe.h"
+#include "platform/base/Log.h"
+#include "platform/cloud/LocalScanner.h"
+
+#include <algorithm>
+
+namespace platform {
+namespace {
+
+/// Plans that one run carries out: more than any tree is deep, and an end where something moves to
+/// and fro.
+constexpr int roundsAtMost = 300;
+/// How often in one run a step is made again that only came too late.
+constexpr int triesAtOnce = 3;
+constexpr const char* troubleKind = "sync";
+
+bool onlyCameTooLate(const Error& error) {
+    return error.is(ErrorCode::changedRemotely) || error.is(ErrorCode::changedWhileRead) ||
+           error.is(ErrorCode::fileExists) || error.is(ErrorCode::noSuchItem) ||
+           error.is(ErrorCode::folderNotEmpty);
+}
+
+} // namespace
+
+Synchronizer::Synchronizer(StoreContext& context, TransferQueue& transfers, RateLimiter& limiter,
+                           CancelFlag& cancel, bool afterCrash, RemoteLister::Written written)
+    : context_(context),
+      cancel_(cancel),
+      written_(std::move(written)),
+      executor_(context, transfers, limiter),
+      afterCrash_(afterCrash) {
+    // Whatever failed for the program before is tried anew.
+    for (const OpRow& op : context_.database.operations())
+        if (op.kind == troubleKind)
+            troubles_.emplace(op.item, Trouble{Backoff(static_cast<std::uint64_t>(op.item)), op.id,
+                                               op.tries, 0, Date{}});
+}
+
+Synchronizer::Report Synchronizer::run(const Request& request) {
+    Report report;
+    for (auto& [item, trouble] : troubles_) {
+        trouble.triesInThisRun = 0;
+        if (request.commanded) {
+            trouble.backoff.reset();
+            trouble.nextAt = {};
+        }
+    }
+    if (request.lookAtDisk)
+        report.failure = look(report);
+    if (!report.failure && !report.question)
+        report.failure = list(request.folders, request.everything);
+    if (!report.failure && !report.question)
+        report.failure = settleRemote(request.commanded, report);
+    context_.queue.sync([&] {
+        if (!report.question)
+            report.question = question(context_.database);
+    });
+    if (!report.failure && !report.question)
+        report.failure = carryOutAll(report);
+    for (const auto& [item, trouble] : troubles_)
+        if (!report.retryAt || trouble.nextAt < *report.retryAt)
+            report.retryAt = trouble.nextAt;
+    return report;
+}
+
+Failure Synchronizer::look(Report& report) {
+    LocalScanner scanner(context_, cancel_);
+    if (Failure failure = scanner.run())
+        return failure;
+    report.unsettled = report.unsettled || scanner.unsettled();
+    report.folders = scanner.folders();
+    return settleLocal(scanner.vanished(), report);
+}
+
+Failure Synchronizer::list(const std::vector<ItemId>& folders, bool everything) {
+    if (everything)
+        return RemoteLister(context_, cancel_, written_)
+            .run({rootItem}, RemoteLister::Depth::everything);
+    if (folders.empty())
+        return std::nullopt;
+    return RemoteLister(context_, cancel_, written_).run(folders, RemoteLister::Depth::newFolders);
+}
+
+std::vector<SyncStep> Synchronizer::plan() {
+    std::vector<SyncStep> steps = planSync(trees(), {afterCrash_});
+    std::erase_if(steps, [this](const SyncStep& step) { return !mayTry(step.item); });
+    return steps;
+}
+
+/// What disagrees, with all folders above it and whoever has a place that it wants.
+SyncTrees Synchronizer::trees() {
+    std::vector<ItemState> items;
+    context_.queue.sync([&] {
+        StateDatabase& database = context_.database;
+        items = database.disagreements();
+        std::set<ItemId> seen{rootItem};
+        for (const ItemState& state : items)
+            seen.insert(state.item.id);
+        const auto want = [&](std::optional<ItemId> item) {
+            if (!item || !seen.insert(*item).second)
+                return;
+            if (std::optional<ItemState> state = database.state(*item))
+                items.push_back(std::move(*state));
+        };
+        for (std::size_t i = 0; i < items.size(); ++i) {
+            const std::optional<Place> here =
+                items[i].local ? std::optional(items[i].local->place) : std::nullopt;
+            const std::optional<Place> there =
+                items[i].remote ? std::optional(items[i].remote->place) : std::nullopt;
+            if (here) {
+                want(here->parent);
+                want(database.remoteItemAt(*here));
+            }
+            if (there) {
+                want(there->parent);
+                want(database.localItemAt(*there));
+            }
+        }
+    });
+    return SyncTrees(std::move(items));
+}
+
+Failure Synchronizer::carryOutAll(Report& report) {
+    bool listed = false;
+    context_.queue.sync([&] { listed = context_.database.scan(rootItem, Side::remote).complete; });
+    for (int round = 0; listed && round < roundsAtMost; ++round) {
+        const std::vector<SyncStep> steps = plan();
+        if (steps.empty())
+            break;
+        SyncExecutor::Outcome outcome = executor_.run(steps);
+        report.changes += outcome.done;
+        if (Failure failure = digest(outcome, steps, report))
+            return failure;
+        if (report.question || (outcome.done == 0 && outcome.failed.empty()))
+            break;
+        if (outcome.unsettled && outcome.done + outcome.failed.size() == steps.size())
+            break; // what is being written to is all that is left
+    }
+    if (!report.question)
+        afterCrash_ = false;
+    return std::nullopt;
+}
+
+Failure Synchronizer::digest(SyncExecutor::Outcome& outcome, const std::vector<SyncStep>& steps,
+                             Report& report) {
+    report.unsettled = report.unsettled || outcome.unsettled;
+    for (const SyncStep& step : steps)
+        if (const auto failed = outcome.failed.find(step.item); failed != outcome.failed.end())
+            noteTrouble(step, failed->second);
+        else if (!outcome.stopped)
+            forgetTrouble(step.item);
+    if (outcome.stopped)
+        return outcome.stopped;
+    if (outcome.diskChanged)
+        if (Failure failure = look(report))
+            return failure;
+    if (report.question)
+        return std::nullopt;
+    return list({outcome.outdated.begin(), outcome.outdated.end()}, false);
+}
+
+bool Synchronizer::mayTry(ItemId item) {
+    const auto found = troubles_.find(item);
+    if (found == troubles_.end())
+        return true;
+    const Trouble& trouble = found->second;
+    return trouble.nextAt <= context_.clock.now() && trouble.triesInThisRun < triesAtOnce;
+}
+
+void Synchronizer::noteTrouble(const SyncStep& step, const Error& error) {
+    const auto [found, fresh] = troubles_.try_emplace(
+        step.item, Trouble{Backoff(static_cast<std::uint64_t>(step.item)), 0, 0, 0, Date{}});
+    Trouble& trouble = found->second;
+    ++trouble.tries;
+    ++trouble.triesInThisRun;
+    const bool again = onlyCameTooLate(error) && trouble.triesInThisRun < triesAtOnce;
+    const Date now = context_.clock.now();
+    if (!again)
+        trouble.nextAt = Date{now.nanoseconds + trouble.backoff.next().count()};
+    context_.queue.sync([&] {
+        const Failure ignored = context_.database.transaction([&]() -> Failure {
+            if (context_.database.state(step.item))
+                trouble.op = context_.database.putOperation(
+                    {trouble.op,
+                     step.item,
+                     troubleKind,
+                     std::string(nameOf(step.kind)),
+                     "",
+                     "",
+                     {},
+                     0,
+                     trouble.tries,
+                     trouble.nextAt,
+                     error.localizedDescription.value_or(description(error))});
+            return std::nullopt;
+        });
+    });
+}
+
+void Synchronizer::forgetTrouble(ItemId item) {
+    const auto found = troubles_.find(item);
+    if (found == troubles_.end())
+        return;
+    context_.queue.sync([&] {
+        const Failure ignored = context_.database.transaction([&]() -> Failure {
+            context_.database.removeOperation(found->second.op);
+            return std::nullopt;
+        });
+    });
+    troubles_.erase(found);
+}
+
+std::vector<PendingWork> Synchronizer::pending(StateQueries& queries) {
+    std::vector<PendingWork> work;
+    for (const OpRow& op : queries.operations())
+        if (op.kind == troubleKind)
+            work.push_back(
+                {op.item, op.phase,
+                 queries.localPathOf(op.item).value_or(queries.remotePathOf(op.item).value_or("")),
+                 op.tries, op.nextAt.value_or(Date{}), op.error});
+    return work;
+}
+
+} // namespace platform

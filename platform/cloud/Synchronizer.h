@@ -1,0 +1,109 @@
+#pragma once
+
+#include "platform/cloud/Backoff.h"
+#include "platform/cloud/RemoteLister.h"
+#include "platform/cloud/SyncExecutor.h"
+
+#include <map>
+#include <optional>
+#include <string>
+#include <vector>
+
+namespace platform {
+
+/// So much has vanished from one side at once that the user is asked before the other side follows.
+struct DeletionQuestion {
+    /// Where it vanished.
+    Side side = Side::local;
+    std::int64_t items = 0;
+    bool operator==(const DeletionQuestion&) const = default;
+};
+enum class DeletionAnswer { deleteThem, putBack };
+
+/// Work that could not be done yet.
+struct PendingWork {
+    ItemId item = 0;
+    /// As nameOf(StepKind) has it.
+    std::string kind;
+    /// Relative to the store.
+    std::string path;
+    int tries = 0;
+    Date nextAt;
+    /// For people.
+    std::string cause;
+};
+
+/// Makes both sides of a store agree, as far as that goes now: looks at the disk, asks the remote,
+/// and plans and carries out until nothing is left to do. One run at a time, not on the store's
+/// queue.
+class Synchronizer {
+public:
+    struct Request {
+        /// By the user's command, or because the way to the remote has changed: everything is
+        /// tried now, and looked for a second time without a delay.
+        bool commanded = false;
+        bool lookAtDisk = true;
+        /// Folders of the remote to be read; all of them when `everything`.
+        std::vector<ItemId> folders;
+        bool everything = true;
+    };
+    struct Report {
+        Failure failure;
+        /// Files that are being written to, or folders that could not be read: look again soon.
+        bool unsettled = false;
+        /// Something is missing on the remote since one listing.
+        bool secondLook = false;
+        /// When something that failed is to be tried again.
+        std::optional<Date> retryAt;
+        std::optional<DeletionQuestion> question;
+        /// Of the disk, relative to the store's root; empty when it was not looked at.
+        std::vector<std::string> folders;
+        std::size_t changes = 0;
+    };
+
+    Synchronizer(StoreContext& context, TransferQueue& transfers, RateLimiter& limiter,
+                 CancelFlag& cancel, bool afterCrash, RemoteLister::Written written);
+
+    Report run(const Request& request);
+    /// Ends a run soon, and those that come. From any thread.
+    void cancel() { executor_.cancel(); }
+    /// On the store's queue.
+    [[nodiscard]] Failure answer(DeletionAnswer answer);
+    static std::optional<DeletionQuestion> question(StateQueries& queries);
+    static std::vector<PendingWork> pending(StateQueries& queries);
+
+private:
+    struct Trouble {
+        Backoff backoff;
+        std::int64_t op = 0;
+        int tries = 0;
+        int triesInThisRun = 0;
+        Date nextAt;
+    };
+
+    Failure look(Report& report);
+    Failure list(const std::vector<ItemId>& folders, bool everything);
+    /// What vanished counts as deleted, unless it is too much.
+    Failure settleLocal(const std::vector<ItemId>& vanished, Report& report);
+    Failure settleRemote(bool commanded, Report& report);
+    Failure ask(const DeletionQuestion& question, Report& report);
+    Failure withdraw(Side side);
+    bool isAlarming(const std::vector<ItemId>& items, Side side);
+    Failure carryOutAll(Report& report);
+    std::vector<SyncStep> plan();
+    SyncTrees trees();
+    Failure digest(SyncExecutor::Outcome& outcome, const std::vector<SyncStep>& steps,
+                   Report& report);
+    void noteTrouble(const SyncStep& step, const Error& error);
+    void forgetTrouble(ItemId item);
+    bool mayTry(ItemId item);
+
+    StoreContext& context_;
+    CancelFlag& cancel_;
+    RemoteLister::Written written_;
+    SyncExecutor executor_;
+    std::map<ItemId, Trouble> troubles_;
+    bool afterCrash_ = false;
+};
+
+} // namespace platform

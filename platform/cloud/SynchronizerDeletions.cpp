@@ -1,0 +1,175 @@
+#include "platform/base/Log.h"
+#include "platform/cloud/Synchronizer.h"
+
+#include <charconv>
+#include <set>
+
+namespace platform {
+namespace {
+
+// More than this vanishing at once is a disk that was not mounted, or a hand that slipped, before
+// it is anybody's wish: half of all that both sides have; or, of one folder, a third and not few.
+constexpr std::int64_t fewItems = 50;
+/// Of accounts with next to nothing in them, half is no alarm.
+constexpr std::int64_t smallestAlarm = 3;
+
+constexpr std::string_view questionKey = "question";
+// What the user answered, for the side that it was asked of.
+constexpr std::string_view permissionKey = "deletions";
+constexpr std::string_view putBackKey = "putBack";
+
+std::string_view nameOf(Side side) {
+    return side == Side::local ? "local" : "remote";
+}
+
+std::string textOf(const DeletionQuestion& question) {
+    return std::string(nameOf(question.side)) + ' ' + std::to_string(question.items);
+}
+
+} // namespace
+
+std::optional<DeletionQuestion> Synchronizer::question(StateQueries& queries) {
+    const std::string text = queries.meta(questionKey);
+    const std::size_t blank = text.find(' ');
+    if (blank == std::string::npos)
+        return std::nullopt;
+    DeletionQuestion question{text.starts_with("local") ? Side::local : Side::remote, 0};
+    std::from_chars(text.data() + blank + 1, text.data() + text.size(), question.items);
+    return question;
+}
+
+Failure Synchronizer::ask(const DeletionQuestion& question, Report& report) {
+    report.question = question;
+    platformLog(LogLevel::warning, "cloud: %@ items have vanished from %@; the user is asked",
+                question.items, question.side == Side::local ? "the device" : "the account");
+    return context_.database.transaction([&]() -> Failure {
+        context_.database.setMeta(questionKey, textOf(question));
+        return std::nullopt;
+    });
+}
+
+bool Synchronizer::isAlarming(const std::vector<ItemId>& items, Side side) {
+    StateDatabase& database = context_.database;
+    for (const std::string_view key : {permissionKey, putBackKey})
+        if (database.meta(key) == nameOf(side))
+            return false;
+    std::int64_t count = 0;
+    std::map<ItemId, std::int64_t> inFolder;
+    for (const ItemId item : items) {
+        std::optional<ItemState> state = database.state(item);
+        if (!state || !state->base)
+            continue; // the other side never had it
+        ++count;
+        for (int depth = 0; state && state->base && depth < 4096; ++depth) {
+            ++inFolder[state->base->place.parent];
+            state = database.state(state->base->place.parent);
+        }
+    }
+    if (count >= smallestAlarm && count * 2 > database.agreedItems())
+        return true;
+    for (const auto& [folder, gone] : inFolder)
+        if (gone > fewItems && gone * 3 > database.agreedItemsIn(folder))
+            return true;
+    return false;
+}
+
+/// What was asked about is there again.
+Failure Synchronizer::withdraw(Side side) {
+    const std::optional<DeletionQuestion> asked = question(context_.database);
+    if (!asked || asked->side != side)
+        return std::nullopt;
+    return context_.database.transaction([&]() -> Failure {
+        context_.database.setMeta(questionKey, "");
+        return std::nullopt;
+    });
+}
+
+Failure Synchronizer::settleLocal(const std::vector<ItemId>& vanished, Report& report) {
+    Failure failure;
+    context_.queue.sync([&] {
+        StateDatabase& database = context_.database;
+        if (vanished.empty()) {
+            failure = withdraw(Side::local);
+            return;
+        }
+        if (isAlarming(vanished, Side::local)) {
+            failure = ask({Side::local, static_cast<std::int64_t>(vanished.size())}, report);
+            return;
+        }
+        failure = database.transaction([&]() -> Failure {
+            const bool putBack = database.meta(putBackKey) == nameOf(Side::local);
+            for (const ItemId item : vanished) {
+                database.removeLocal(item);
+                database.setItemPlace(item, std::nullopt);
+                if (putBack) // nothing was agreed on: what the remote has arrives anew
+                    database.removeBase(item);
+            }
+            database.setMeta(permissionKey, "");
+            database.setMeta(putBackKey, "");
+            return std::nullopt;
+        });
+    });
+    return failure;
+}
+
+Failure Synchronizer::settleRemote(bool commanded, Report& report) {
+    std::set<ItemId> again;
+    context_.queue.sync([&] {
+        for (const ItemId item : context_.database.missingFromRemote(1))
+            if (const std::optional<ItemState> state = context_.database.state(item);
+                state && state->remote)
+                again.insert(state->remote->place.parent);
+    });
+    if (again.empty()) {
+        Failure failure;
+        context_.queue.sync([&] { failure = withdraw(Side::remote); });
+        return failure;
+    }
+    if (commanded)
+        if (Failure failure = list({again.begin(), again.end()}, false))
+            return failure;
+    Failure failure;
+    context_.queue.sync([&] {
+        StateDatabase& database = context_.database;
+        std::set<ItemId> gone;
+        for (const ItemId item : database.missingFromRemote(2))
+            for (const ItemId each : database.treeOf(item, Side::remote))
+                gone.insert(each);
+        report.secondLook =
+            database.missingFromRemote(1).size() > database.missingFromRemote(2).size();
+        if (gone.empty())
+            return;
+        const std::vector<ItemId> items(gone.begin(), gone.end());
+        if (isAlarming(items, Side::remote)) {
+            failure = ask({Side::remote, static_cast<std::int64_t>(items.size())}, report);
+            return;
+        }
+        failure = database.transaction([&]() -> Failure {
+            const bool putBack = database.meta(putBackKey) == nameOf(Side::remote);
+            for (const ItemId item : items) {
+                database.removeRemote(item);
+                if (putBack)
+                    database.removeBase(item);
+            }
+            database.setMeta(permissionKey, "");
+            database.setMeta(putBackKey, "");
+            return std::nullopt;
+        });
+    });
+    return failure;
+}
+
+Failure Synchronizer::answer(DeletionAnswer answer) {
+    StateDatabase& database = context_.database;
+    const std::optional<DeletionQuestion> asked = question(database);
+    if (!asked)
+        return std::nullopt;
+    return database.transaction([&]() -> Failure {
+        database.setMeta(questionKey, "");
+        database.setMeta(answer == DeletionAnswer::deleteThem ? permissionKey : putBackKey,
+                         nameOf(asked->side));
+        return std::nullopt;
+    });
+}
+
+} // namespace platform

@@ -1,0 +1,247 @@
+#include "tests/cloud/StoreFixture.h"
+
+#include <set>
+#include <unistd.h>
+
+using namespace platform;
+
+namespace {
+
+struct Sync : test::StoreFixture {
+    std::string remotePath(const std::string& path) const { return home / ("remote/" + path); }
+    std::string remoteContent(const std::string& path) const { return home.read("remote/" + path); }
+    bool remoteHas(const std::string& path) const { return home.has("remote/" + path); }
+    void removeRemote(const std::string& path) {
+        EXPECT_EQ(FileManager::removeItem(Url::file(remotePath(path))), std::nullopt);
+    }
+    void moveRemote(const std::string& from, const std::string& to) {
+        EXPECT_EQ(FileManager::moveItem(Url::file(remotePath(from)), Url::file(remotePath(to))),
+                  std::nullopt);
+    }
+    void removeLocal(const std::string& path) {
+        EXPECT_EQ(FileManager::removeItem(url(path)), std::nullopt);
+    }
+    void moveLocal(const std::string& from, const std::string& to) {
+        EXPECT_EQ(FileManager::moveItem(url(from), url(to)), std::nullopt);
+    }
+    /// Both sides have them, contents and all, and something besides that stays.
+    void givenSynced(const std::vector<std::string>& paths) {
+        for (const std::string& path : paths)
+            givenRemote(path, path);
+        for (int i = 0; i < 12; ++i)
+            givenRemote("Rest/" + std::to_string(i), "rest");
+        synced();
+        for (const std::string& path : paths)
+            ASSERT_EQ(fetch(path), std::nullopt);
+    }
+    std::vector<std::string> names(const std::string& folder) const {
+        std::vector<std::string> found;
+        const auto entries = FileManager::entries(folder);
+        if (!entries)
+            return found;
+        for (const DirectoryEntry& entry : *entries)
+            found.push_back(entry.name);
+        std::sort(found.begin(), found.end());
+        return found;
+    }
+    std::size_t keptContents() const { return names(layout.kept()).size(); }
+};
+
+TEST_F(Sync, WhatIsMadeHereArrivesThereAndTheOtherWayRound) {
+    givenSynced({"A/one"});
+    givenLocal("A/new", "new");
+    givenLocal("Made/inner/deep", "deep");
+    givenRemote("B/theirs", "theirs");
+    synced();
+    EXPECT_EQ(remoteContent("A/new"), "new");
+    EXPECT_EQ(remoteContent("Made/inner/deep"), "deep");
+    EXPECT_TRUE(isPromised("B/theirs"));
+    EXPECT_EQ(sync().changes, 0U) << "nothing is done twice";
+}
+
+TEST_F(Sync, EditsTravelBothWaysAndTheReplacedContentIsKept) {
+    givenSynced({"A/mine", "A/theirs"});
+    givenLocal("A/mine", "edited here");
+    givenRemote("A/theirs", "edited there");
+    synced();
+    EXPECT_EQ(remoteContent("A/mine"), "edited here");
+    EXPECT_EQ(local("A/theirs"), "edited there");
+    EXPECT_EQ(keptContents(), 1U);
+    EXPECT_EQ(stagedFiles(), 0U);
+}
+
+TEST_F(Sync, OfTwoEditsTheRemoteKeepsTheNameAndBothAreOnBothSides) {
+    givenSynced({"A/x.txt"});
+    givenLocal("A/x.txt", "ours");
+    givenRemote("A/x.txt", "theirs");
+    synced();
+    EXPECT_EQ(local("A/x.txt"), "theirs");
+    const auto found = names(layout.root() + "/A");
+    ASSERT_EQ(found.size(), 2U);
+    EXPECT_TRUE(found[0].starts_with("x (conflict 2023-"));
+    EXPECT_TRUE(found[0].ends_with(").txt"));
+    EXPECT_EQ(remoteContent("A/" + found[0]), "ours");
+}
+
+TEST_F(Sync, MovesTravelAsMoves) {
+    givenSynced({"A/one", "A/two", "C/inner/three"});
+    givenRemote("A/promise", "p");
+    synced();
+    const ItemId item = state("A/one")->item.id;
+    moveLocal("A/one", "uno");
+    moveRemote("A/two", "C/zwei");
+    moveLocal("C/inner", "A/moved");
+    ASSERT_EQ(move("A/promise", "promise"), std::nullopt);
+    synced();
+    EXPECT_EQ(remoteContent("uno"), "A/one");
+    EXPECT_EQ(state("uno")->item.id, item);
+    EXPECT_EQ(local("C/zwei"), "A/two");
+    EXPECT_EQ(remoteContent("A/moved/three"), "C/inner/three");
+    EXPECT_FALSE(remoteHas("C/inner"));
+    EXPECT_EQ(remoteContent("promise"), "p");
+    EXPECT_TRUE(isPromised("promise"));
+    EXPECT_EQ(keptContents(), 0U) << "nothing was copied and deleted";
+}
+
+TEST_F(Sync, SwappedNamesAreSwappedOnTheOtherSide) {
+    givenSynced({"A/one", "A/two", "F/x", "G/y"});
+    moveLocal("A/one", "A/t");
+    moveLocal("A/two", "A/one");
+    moveLocal("A/t", "A/two");
+    moveRemote("F", "T");
+    moveRemote("G", "F");
+    moveRemote("T", "G");
+    synced();
+    EXPECT_EQ(remoteContent("A/one"), "A/two");
+    EXPECT_EQ(remoteContent("A/two"), "A/one");
+    EXPECT_EQ(local("G/x"), "F/x");
+    EXPECT_EQ(local("F/y"), "G/y");
+}
+
+TEST_F(Sync, DeletionsTravelAndAnEditBeatsThem) {
+    givenSynced({"A/one", "A/two", "A/three", "B/four"});
+    removeLocal("A/one");
+    removeRemote("A/two");
+    removeRemote("A/three");
+    givenLocal("A/three", "edited");
+    removeLocal("B/four");
+    givenRemote("B/four", "edited");
+    synced();
+    EXPECT_FALSE(remoteHas("A/one"));
+    EXPECT_FALSE(local("A/two"));
+    EXPECT_EQ(keptContents(), 1U);
+    EXPECT_EQ(remoteContent("A/three"), "edited");
+    EXPECT_TRUE(isPromised("B/four"));
+}
+
+TEST_F(Sync, AFolderDeletedThereGoesUnlessSomethingOfItWasEdited) {
+    givenSynced({"A/in/one", "B/in/two", "B/in/three"});
+    removeRemote("A");
+    removeRemote("B");
+    givenLocal("B/in/two", "edited");
+    synced();
+    EXPECT_FALSE(FileManager::exists(url("A").path()));
+    EXPECT_EQ(remoteContent("B/in/two"), "edited");
+    EXPECT_FALSE(local("B/in/three"));
+}
+
+TEST_F(Sync, TwoPopulatedSidesAreMerged) {
+    givenRemote("A/same", "same");
+    givenRemote("A/other", "theirs");
+    givenRemote("A/there", "there");
+    ASSERT_EQ(open(), std::nullopt);
+    givenLocal("A/same", "same");
+    givenLocal("A/other", "ours");
+    givenLocal("A/here", "here");
+    synced();
+    EXPECT_EQ(local("A/same"), "same");
+    EXPECT_EQ(local("A/other"), "theirs");
+    EXPECT_TRUE(isPromised("A/there"));
+    EXPECT_EQ(remoteContent("A/here"), "here");
+    EXPECT_EQ(names(home / "remote/A").size(), 5U);
+    EXPECT_EQ(keptContents(), 0U);
+}
+
+TEST_F(Sync, WhatVanishesInMassesIsAskedAbout) {
+    givenSynced({"A/one"});
+    removeLocal("Rest");
+    std::optional<DeletionQuestion> question = sync().question;
+    ASSERT_TRUE(question);
+    EXPECT_EQ(question->side, Side::local);
+    EXPECT_TRUE(remoteHas("Rest/7"));
+    queue->sync([&] { EXPECT_EQ(synchronizer->answer(DeletionAnswer::putBack), std::nullopt); });
+    synced();
+    EXPECT_TRUE(isPromised("Rest/7"));
+    removeRemote("Rest");
+    EXPECT_EQ(sync().question->side, Side::remote);
+    EXPECT_TRUE(isPromised("Rest/7"));
+    queue->sync([&] { EXPECT_EQ(synchronizer->answer(DeletionAnswer::deleteThem), std::nullopt); });
+    synced();
+    EXPECT_FALSE(FileManager::exists(url("Rest").path()));
+}
+
+TEST_F(Sync, AFileOfTheUsersOverAPromiseDoesNotReplaceWhatTheyHaveNotSeen) {
+    givenSynced({});
+    givenLocal("Rest/3", "mine");
+    synced();
+    EXPECT_EQ(local("Rest/3"), "rest");
+    EXPECT_EQ(names(home / "remote/Rest").size(), 13U);
+}
+
+TEST_F(Sync, OneBadItemDoesNotStopTheOthers) {
+    givenSynced({"A/one"});
+    givenLocal("A/.x.promise", "a name that the remote refuses");
+    ASSERT_EQ(symlink("/etc/hostname", url("A/link").path().c_str()), 0);
+    givenLocal("A/good", "good");
+    synced();
+    EXPECT_EQ(remoteContent("A/good"), "good");
+    EXPECT_FALSE(remoteHas("A/link"));
+}
+
+TEST_F(Sync, StoppedAtAnyStepNothingIsLostAndTheNextRunEndsIt) {
+    for (int step = 1;; ++step) {
+        givenSynced({"A/edited", "A/theirs", "A/both", "A/gone", "A/moved"});
+        close();
+        const int code = test::inAnotherProcess([&] {
+            disk = test::dyingFileSystem((step + 1) / 2, step % 2 == 0);
+            if (open())
+                return 1;
+            givenLocal("A/edited", "edited here");
+            givenRemote("A/theirs", "edited there");
+            givenLocal("A/both", "ours");
+            givenRemote("A/both", "theirs");
+            removeRemote("A/gone");
+            moveRemote("A/moved", "A/away");
+            givenLocal("new/file", "new");
+            givenRemote("arrived/file", "arrived");
+            return sync().failure ? 1 : 0;
+        });
+        ASSERT_TRUE(code == 0 || code == test::diedOnTheWay);
+        ASSERT_EQ(open(), std::nullopt);
+        if (code == test::diedOnTheWay && !remoteHas("arrived/file")) { // died while it opened
+            close();
+            continue;
+        }
+        synced();
+        EXPECT_EQ(remoteContent("A/edited"), "edited here") << step;
+        EXPECT_EQ(local("A/theirs"), "edited there") << step;
+        EXPECT_TRUE(local("A/both") == "theirs" || isPromised("A/both")) << step;
+        EXPECT_EQ(local("A/away"), "A/moved") << step;
+        EXPECT_FALSE(local("A/gone")) << step;
+        EXPECT_EQ(remoteContent("new/file"), "new") << step;
+        EXPECT_TRUE(isPromised("arrived/file")) << step;
+        bool ours = false;
+        for (const std::string& name : names(home / "remote/A"))
+            ours = ours || remoteContent("A/" + name) == "ours";
+        EXPECT_TRUE(ours) << step;
+        EXPECT_EQ(stagedFiles(), 0U) << step;
+        close();
+        if (code == 0 || HasFailure())
+            break;
+        ASSERT_EQ(FileManager::removeItem(Url::file(layout.folder)), std::nullopt);
+        ASSERT_EQ(FileManager::removeItem(Url::file(home / "remote")), std::nullopt);
+        home.makeFolder("remote");
+    }
+}
+
+} // namespace
