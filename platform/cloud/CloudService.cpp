@@ -212,6 +212,39 @@ void CloudService::refresh(const std::optional<Url>& folder,
         done(makeError(ErrorCode::noAccount));
 }
 
+void CloudService::sync(std::function<void(const Failure& failure)> done) {
+    if (const std::shared_ptr<StoreEngine> engine = state_->current())
+        engine->sync(std::move(done));
+    else if (done)
+        done(makeError(ErrorCode::noAccount));
+}
+
+Failure CloudService::answer(DeletionAnswer answer) {
+    const std::shared_ptr<StoreEngine> engine = state_->current();
+    return engine ? engine->answer(answer) : Failure(makeError(ErrorCode::noAccount));
+}
+
+std::vector<PendingWork> CloudService::pending() const {
+    const std::shared_ptr<const StoreView> view = state_->slot.load();
+    if (!view || !view->reader)
+        return {};
+    return view->reader->ask(&Synchronizer::pending);
+}
+
+std::vector<std::string> CloudService::conflicts() const {
+    constexpr std::size_t atMost = 10000;
+    const std::shared_ptr<const StoreView> view = state_->slot.load();
+    if (!view || !view->reader)
+        return {};
+    return view->reader->ask([](StateQueries& queries) {
+        std::vector<std::string> paths;
+        for (const ItemId item : queries.itemsNamed(" (conflict ", atMost))
+            if (const std::optional<std::string> path = queries.pathOf(item))
+                paths.push_back(*path);
+        return paths;
+    });
+}
+
 std::optional<CloudStatus> CloudService::status() const {
     const std::shared_ptr<StoreEngine> engine = state_->current();
     const std::shared_ptr<const StoreView> view = state_->slot.load();
@@ -219,8 +252,10 @@ std::optional<CloudStatus> CloudService::status() const {
         return std::nullopt;
     const StoreCounts counts =
         view->reader->ask([](StateQueries& queries) { return queries.counts(); });
-    return CloudStatus{engine->layout().folder, engine->isListed(), counts.folders, counts.files,
-                       counts.promises,         counts.bytes,       counts.refused};
+    return CloudStatus{engine->layout().folder, engine->isListed(),
+                       counts.folders,          counts.files,
+                       counts.promises,         counts.bytes,
+                       counts.refused,          view->reader->ask(&Synchronizer::question)};
 }
 
 } // namespace platform

@@ -5,6 +5,7 @@
 #include "platform/cloud/CloudAccountService.h"
 #include "platform/cloud/CloudDocumentService.h"
 #include "platform/cloud/QuotaOperation.h"
+#include "platform/cloud/SyncState.h"
 
 #include <cstdint>
 #include <functional>
@@ -39,6 +40,9 @@ struct CloudStatus {
     std::int64_t bytes = 0;
     /// Items of the remote that cannot be on this device.
     std::int64_t refused = 0;
+    /// So much has vanished that the user is to say what it means; until then nothing is brought
+    /// from one side to the other.
+    std::optional<DeletionQuestion> question;
 };
 
 /// The owner of accounts, store and transfers: everybody else speaks to it by values in and events
@@ -78,6 +82,15 @@ public:
     /// of the service's when it has come to its end.
     void refresh(const std::optional<Url>& folder,
                  std::function<void(const Failure& failure)> done);
+    /// Makes both sides agree now, whatever has failed before; `done` as above.
+    void sync(std::function<void(const Failure& failure)> done);
+    /// Answers the question that CloudStatus tells of; what follows from it is done soon.
+    [[nodiscard]] Failure answer(DeletionAnswer answer);
+    /// What could not be done yet, and why.
+    std::vector<PendingWork> pending() const;
+    /// Documents that were changed on both sides, under the names that tell of it: relative to the
+    /// store.
+    std::vector<std::string> conflicts() const;
     /// None without an account whose store can be read.
     std::optional<CloudStatus> status() const;
 

@@ -18,8 +18,13 @@ public:
     Result<std::string> takeFrom(const std::string& from, const std::string& relative,
                                  bool onlyHere);
 
+    /// Removes what has lain there for 30 days, and the oldest where all of it takes more than a
+    /// tenth of the free space. Never what is only here.
+    void expire();
+
 private:
     Failure makeFolders(const std::string& relative);
+    std::uint64_t sizeOf(const std::string& folder) const;
 
     const StoreContext& context_;
 };

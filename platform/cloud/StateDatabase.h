@@ -45,6 +45,8 @@ public:
     std::vector<ItemId> missingFromRemote(int listings);
     /// The item and what is in it on that side.
     std::vector<ItemId> treeOf(ItemId item, Side side);
+    /// Folders of the remote with their paths there, the root ("") among them.
+    std::vector<std::pair<ItemId, std::string>> remoteFolders();
     /// Items that both sides have had.
     std::int64_t agreedItems();
     std::int64_t agreedItemsIn(ItemId folder);

@@ -304,6 +304,19 @@ std::int64_t StateQueries::refusedCount(Side side) {
         .value_or(0);
 }
 
+std::vector<std::pair<ItemId, std::string>> StateQueries::remoteFolders() {
+    Statement& rows = handles_->prepared(
+        "WITH RECURSIVE tree(id, path) AS (SELECT 1, '' UNION ALL SELECT r.item,"
+        " CASE tree.path WHEN '' THEN '' ELSE tree.path || '/' END || CAST(r.name AS TEXT)"
+        " FROM remote r JOIN item i ON i.id = r.item JOIN tree ON r.parent = tree.id"
+        " WHERE i.kind = 1) SELECT id, path FROM tree");
+    rows.with();
+    std::vector<std::pair<ItemId, std::string>> folders;
+    while (rows.step())
+        folders.emplace_back(rows.integer(0), rows.text(1));
+    return folders;
+}
+
 std::int64_t StateQueries::agreedItems() {
     return firstItem(handles_->prepared("SELECT count(*) FROM base").with()).value_or(0);
 }

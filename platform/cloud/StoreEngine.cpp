@@ -4,6 +4,7 @@
 #include "platform/base/Log.h"
 #include "platform/base/Text.h"
 #include "platform/cloud/AttributeReading.h"
+#include "platform/cloud/KeptFolder.h"
 #include "platform/cloud/StoreFileSystem.h"
 
 #include <cstdlib>
@@ -56,6 +57,11 @@ void StoreEngine::stop() {
         const std::lock_guard lock(mutex_);
         transfers = std::move(transfers_);
         services_.clock.cancelAlarm(retry_);
+        for (const auto& [alarm, pending] : alarms_)
+            services_.clock.cancelAlarm(pending.id);
+        alarms_.clear();
+        if (synchronizer_)
+            synchronizer_->cancel();
     }
     if (transfers)
         transfers->stop(); // while the queue that their last steps need has the store
@@ -63,8 +69,15 @@ void StoreEngine::stop() {
         std::unique_lock lock(mutex_);
         unused_.wait(lock, [this] { return uses_ == 0; });
     }
-    listing_->sync([] {});
+    listing_->sync([this] {
+        localWatches_.clear();
+        remoteWatches_.clear();
+    });
     queue_->sync([this] {
+        {
+            const std::lock_guard lock(mutex_);
+            synchronizer_.reset();
+        }
         valuesWatch_.reset();
         rootWatch_.reset();
         containerWatches_.clear();
@@ -160,8 +173,13 @@ void StoreEngine::begin(OpenedStore store) {
                 readRoles();
                 publish();
             });
+        auto synchronizer = std::make_shared<Synchronizer>(
+            *context_, transfers->queue(), transfers->limiter(), cancel_, store_->lock.afterCrash(),
+            [this](const ListingBatch& batch) { written(batch); });
+        KeptFolder(*context_).expire();
         const std::lock_guard lock(mutex_);
         transfers_ = std::move(transfers);
+        synchronizer_ = std::move(synchronizer);
     }
     watchContainers();
     listing_->async([this] { setProblem(followRemote()); });
@@ -234,7 +252,17 @@ bool StoreEngine::isListed() const {
 
 std::optional<std::string> StoreEngine::problem() const {
     const std::lock_guard lock(mutex_);
-    return problem_ ? problem_ : notice_;
+    if (problem_)
+        return problem_;
+    if (question_)
+        return localizedFormat(
+            question_->side == Side::local
+                ? "%1$@ items have vanished from this device. Nothing is deleted "
+                  "on your account until you say so."
+                : "%1$@ items have vanished from your account. Nothing is "
+                  "deleted on this device until you say so.",
+            std::to_string(question_->items));
+    return notice_;
 }
 
 void StoreEngine::setProblem(const Failure& failure) {

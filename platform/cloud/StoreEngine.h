@@ -7,6 +7,7 @@
 #include "platform/cloud/Remote.h"
 #include "platform/cloud/StoreContext.h"
 #include "platform/cloud/StoreView.h"
+#include "platform/cloud/Synchronizer.h"
 #include "platform/cloud/Transfers.h"
 #include "platform/files/DirectoryWatcher.h"
 
@@ -77,6 +78,9 @@ public:
     /// Brings in what is new in the folder, or everywhere. `done` is called on a thread of the
     /// engine's.
     void refresh(const std::optional<Url>& folder, Done done);
+    /// Makes both sides agree now, whatever has failed before. `done` as above.
+    void sync(Done done);
+    [[nodiscard]] Failure answer(DeletionAnswer answer);
     void freeBytes(std::function<void(const Result<std::uint64_t>&)> done);
 
 private:
@@ -100,11 +104,32 @@ private:
     void watchValues();
     void changedByUser();
 
+    // What is to be done so that both sides agree; see StoreEngineSync.cpp. From any thread.
+    enum class Alarm { notice, settle, secondLook, retry, poll, sweep };
+    struct Pending {
+        Clock::AlarmId id = 0;
+        Synchronizer::Request request;
+    };
+    void want(const Synchronizer::Request& wanted);
+    void wantAfter(Alarm alarm, Duration delay, const Synchronizer::Request& wanted);
+    void runWanted();
+    std::shared_ptr<Synchronizer> synchronizer() const;
+
+    // On the listing queue.
+    Failure synchronize(const Synchronizer::Request& request);
+    void plan(const Synchronizer::Report& report);
+    void watchFolders(const std::vector<std::string>& folders);
+    void watchRemote();
+
     // On the listing queue.
     Failure followRemote();
     Failure list(const std::vector<ItemId>& folders, bool everything);
+    /// On the store's queue, for every batch of a listing.
+    void written(const ListingBatch& batch);
     Failure refreshNow(const std::optional<Url>& folder);
 
+    /// A single folder that cannot be read is no reason to call the store unread.
+    static bool concernsWholeStore(const Error& error);
     Failure checkRemoteMark(const std::string& mark);
     void retryLater(std::function<void(StoreEngine&)> job);
     void setProblem(const Failure& failure);
@@ -122,7 +147,11 @@ private:
 
     mutable std::mutex mutex_;
     std::condition_variable unused_;
-    int uses_ = 0; // guarded by mutex_, as are the next seven
+    int uses_ = 0; // guarded by mutex_, as are the next eleven
+    std::shared_ptr<Synchronizer> synchronizer_;
+    std::optional<DeletionQuestion> question_;
+    std::optional<Synchronizer::Request> wanted_;
+    std::map<Alarm, Pending> alarms_;
     std::optional<std::string> problem_;
     std::optional<std::string> notice_; // what had to be done at the start
     std::shared_ptr<Transfers> transfers_;
@@ -138,6 +167,11 @@ private:
     DirectoryWatcher::Token rootWatch_;
     std::map<std::string, DirectoryWatcher::Token> containerWatches_;
     DirectoryWatcher::Token valuesWatch_;
+
+    // Of the listing queue alone.
+    bool followed_ = false; // the remote has been reached, and all was looked at since
+    std::map<std::string, DirectoryWatcher::Token> localWatches_;
+    std::map<ItemId, std::pair<std::string, DirectoryWatcher::Token>> remoteWatches_;
 
     std::mutex connecting_;
     std::atomic<bool> connected_{false};

@@ -5,6 +5,7 @@
 #include "platform/cloud/StoreEngine.h"
 #include "platform/cloud/StoreMoves.h"
 #include "platform/cloud/StoreRemovals.h"
+#include "platform/cloud/SyncTimes.h"
 
 namespace platform {
 
@@ -36,6 +37,8 @@ Failure StoreEngine::withRemote(const std::function<Failure()>& work) {
 void StoreEngine::changedByUser() {
     readRoles();
     publish();
+    // What the user did is written down already.
+    wantAfter(Alarm::notice, noticeDelay, {false, false, {}, false, false});
 }
 
 Failure StoreEngine::moveItem(const Url& from, const Url& to) {

@@ -17,16 +17,15 @@ bool touchesTop(const ListingBatch& batch) {
     });
 }
 
-/// A single folder that cannot be read is no reason to call the store unread.
-bool concernsWholeStore(const Error& error) {
+} // namespace
+
+bool StoreEngine::concernsWholeStore(const Error& error) {
     constexpr std::array codes{ErrorCode::serverNotAvailable, ErrorCode::authenticationFailed,
                                ErrorCode::outOfSpace,         ErrorCode::readOnlyVolume,
                                ErrorCode::databaseUnusable,   ErrorCode::readCorrupt,
                                ErrorCode::userCancelled};
     return std::any_of(codes.begin(), codes.end(), [&](ErrorCode code) { return error.is(code); });
 }
-
-} // namespace
 
 Failure StoreEngine::checkRemoteMark(const std::string& mark) {
     Failure failure;
@@ -66,14 +65,16 @@ Failure StoreEngine::connect() {
     return failure;
 }
 
+void StoreEngine::written(const ListingBatch& batch) {
+    readRoles();
+    if (touchesTop(batch))
+        readContainers();
+    else
+        publish();
+}
+
 Failure StoreEngine::list(const std::vector<ItemId>& folders, bool everything) {
-    RemoteLister lister(*context_, cancel_, [this](const ListingBatch& batch) {
-        readRoles();
-        if (touchesTop(batch))
-            readContainers();
-        else
-            publish();
-    });
+    RemoteLister lister(*context_, cancel_, [this](const ListingBatch& batch) { written(batch); });
     const Failure failure = lister.run(folders, everything ? RemoteLister::Depth::everything
                                                            : RemoteLister::Depth::newFolders);
     if (failure && failure->is(ErrorCode::serverNotAvailable))
@@ -101,8 +102,12 @@ Failure StoreEngine::followRemote() {
         listed_ = true;
     }
     if (!failure) {
-        const std::lock_guard lock(mutex_);
-        backoff_.reset();
+        {
+            const std::lock_guard lock(mutex_);
+            backoff_.reset();
+        }
+        if (!std::exchange(followed_, true))
+            want({false, true, {}, true, false});
         return std::nullopt;
     }
     if (failure->is(ErrorCode::userCancelled))
@@ -136,7 +141,8 @@ Failure StoreEngine::refreshNow(const std::optional<Url>& folder) {
         });
     if (!item)
         return makeError(ErrorCode::noSuchItem, folder->lastPathComponent());
-    return list({*item}, !folder);
+    return synchronize(
+        {false, !folder, folder ? std::vector{*item} : std::vector<ItemId>{}, !folder, false});
 }
 
 void StoreEngine::freeBytes(std::function<void(const Result<std::uint64_t>&)> done) {

@@ -52,7 +52,7 @@ Synchronizer::Report Synchronizer::run(const Request& request) {
     if (!report.failure && !report.question)
         report.failure = list(request.folders, request.everything);
     if (!report.failure && !report.question)
-        report.failure = settleRemote(request.commanded, report);
+        report.failure = settleRemote(request.commanded || request.lookAgain, report);
     context_.queue.sync([&] {
         if (!report.question)
             report.question = question(context_.database);

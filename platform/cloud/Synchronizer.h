@@ -3,6 +3,7 @@
 #include "platform/cloud/Backoff.h"
 #include "platform/cloud/RemoteLister.h"
 #include "platform/cloud/SyncExecutor.h"
+#include "platform/cloud/SyncState.h"
 
 #include <map>
 #include <optional>
@@ -10,28 +11,6 @@
 #include <vector>
 
 namespace platform {
-
-/// So much has vanished from one side at once that the user is asked before the other side follows.
-struct DeletionQuestion {
-    /// Where it vanished.
-    Side side = Side::local;
-    std::int64_t items = 0;
-    bool operator==(const DeletionQuestion&) const = default;
-};
-enum class DeletionAnswer { deleteThem, putBack };
-
-/// Work that could not be done yet.
-struct PendingWork {
-    ItemId item = 0;
-    /// As nameOf(StepKind) has it.
-    std::string kind;
-    /// Relative to the store.
-    std::string path;
-    int tries = 0;
-    Date nextAt;
-    /// For people.
-    std::string cause;
-};
 
 /// Makes both sides of a store agree, as far as that goes now: looks at the disk, asks the remote,
 /// and plans and carries out until nothing is left to do. One run at a time, not on the store's
@@ -46,6 +25,8 @@ public:
         /// Folders of the remote to be read; all of them when `everything`.
         std::vector<ItemId> folders;
         bool everything = true;
+        /// What is missing since one listing is looked for once more.
+        bool lookAgain = false;
     };
     struct Report {
         Failure failure;

@@ -4,6 +4,8 @@
 #include "tests/cloud/ServiceFixture.h"
 #include "tests/cloud/StoreFixture.h"
 
+#include <thread>
+
 using namespace platform;
 
 namespace {
@@ -119,6 +121,46 @@ TEST_F(Changes, ALibraryGoesOnBothSidesOrNotAtAll) {
     const auto fixed = *documents().containerForItemAtURL(url("Documents"));
     EXPECT_TRUE(documents().deleteAllContentsOnClientAndServer(*fixed)->is(
         ErrorCode::unsupportedOperation));
+}
+
+struct Following : Changes {
+    /// Lets time pass until it holds.
+    void until(const std::function<bool()>& holds) {
+        while (!holds()) {
+            clock.advance(std::chrono::milliseconds(100));
+            std::this_thread::yield();
+        }
+    }
+};
+
+TEST_F(Following, WhatChangesOnEitherSideArrivesOnTheOtherUnasked) {
+    givenRemote("A/one.txt", "1");
+    givenStore();
+    givenLocal("A/new.txt", "new");
+    until([&] { return home.has("remote/A/new.txt"); });
+    givenRemote("A/theirs.txt", "theirs");
+    until([&] { return isPromised("A/theirs.txt"); });
+    ASSERT_EQ(documents().moveItem(url("A/theirs.txt"), url("A/ours.txt")), std::nullopt);
+    until([&] { return home.has("remote/A/ours.txt"); });
+    ASSERT_EQ(documents().removeItem(url("A/one.txt")), std::nullopt);
+    until([&] { return !home.has("remote/A/one.txt"); });
+    ASSERT_EQ(FileManager::removeItem(Url::file(home / "remote/A/ours.txt")), std::nullopt);
+    until([&] { return !isPromised("A/ours.txt"); });
+}
+
+TEST_F(Following, AQuestionStandsUntilItIsAnswered) {
+    for (const char* name : {"A/1", "A/2", "A/3", "B/4"})
+        givenRemote(name, name);
+    givenStore();
+    ASSERT_EQ(FileManager::removeItem(url("A")), std::nullopt);
+    ASSERT_EQ(readAll(), std::nullopt);
+    ASSERT_TRUE(cloud->status()->question);
+    EXPECT_NE(problem().find("vanished"), std::string::npos);
+    EXPECT_TRUE(home.has("remote/A/1"));
+    ASSERT_EQ(cloud->answer(DeletionAnswer::deleteThem), std::nullopt);
+    ASSERT_EQ(readAll(), std::nullopt);
+    EXPECT_FALSE(home.has("remote/A"));
+    EXPECT_EQ(problem(), "");
 }
 
 struct Values : Changes {

@@ -164,9 +164,9 @@ Failure StoreFixture::open() {
     queue->sync([&] { Transfers::recover(*context); });
     transfers = std::make_unique<Transfers>(*context, progress, rateLimit, nullptr);
     queue->sync([&] {
-        synchronizer = std::make_unique<Synchronizer>(*context, transfers->queue(),
-                                                      transfers->limiter(), cancel,
-                                                      store->lock.afterCrash(), nullptr);
+        synchronizer =
+            std::make_unique<Synchronizer>(*context, transfers->queue(), transfers->limiter(),
+                                           cancel, store->lock.afterCrash(), nullptr);
     });
     const Result<std::string> mark = remote->connect(cancel);
     return mark ? Failure() : Failure(mark.error());

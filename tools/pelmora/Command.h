@@ -38,6 +38,10 @@ int refresh(const std::vector<std::string>& arguments);
 int download(const std::vector<std::string>& arguments);
 int tagItem(const std::vector<std::string>& arguments);
 int tags(const std::vector<std::string>& arguments);
+int synchronize(const std::vector<std::string>& arguments);
+int evict(const std::vector<std::string>& arguments);
+int listConflicts(const std::vector<std::string>& arguments);
+int listKept(const std::vector<std::string>& arguments);
 int makeSample(const std::vector<std::string>& arguments);
 
 std::span<const Command> commands();

@@ -9,7 +9,7 @@
 namespace pelmora {
 namespace {
 
-constexpr std::array<Command, 9> table{{
+constexpr std::array<Command, 13> table{{
     {"sign-in", "sign-in folder PATH [--name NAME] [--rate-limit BYTES] [--quota BYTES]",
      "Signs in to the account whose remote is the folder PATH. An account that was signed in\n"
      "before finds its store again.\n"
@@ -42,6 +42,25 @@ constexpr std::array<Command, 9> table{{
      "or\n"
      "takes one out of the list. Colours: none, grey, green, purple, blue, yellow, red, orange.\n",
      &tags},
+    {"sync", "sync [--delete | --put-back]",
+     "Makes both sides agree: what changed here goes to the account, and what changed there comes\n"
+     "here. Tells what could not be done, and why. When so much has vanished from one side that "
+     "it\n"
+     "may be an accident, nothing is done until it is told what that means:\n"
+     "  --delete    it is deleted on the other side as well, recoverably\n"
+     "  --put-back  it comes back from the other side\n",
+     &synchronize},
+    {"evict", "evict PATH...",
+     "Frees the room of documents: leaves of each but a promise on this device. Refused while the\n"
+     "account does not surely have the same content.\n",
+     &evict},
+    {"conflicts", "conflicts",
+     "Lists documents that were changed on both sides, under the names that tell of it.\n",
+     &listConflicts},
+    {"kept", "kept",
+     "Lists the folder of local contents that were replaced or deleted. Copy out of it what you\n"
+     "want back. \"only here\" marks what the account is not known to have.\n",
+     &listKept},
     {"sample", "sample PATH",
      "Makes a folder PATH with documents of many kinds, to sign in to and try things with. PATH\n"
      "must not exist yet, or be empty.\n",

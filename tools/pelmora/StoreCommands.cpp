@@ -27,6 +27,10 @@ void printStatus(const AccountSummary& account, const CloudStatus& status) {
     if (status.refused > 0)
         std::printf("Left out:  %lld that this device cannot hold\n",
                     static_cast<long long>(status.refused));
+    if (status.question)
+        std::printf("Question:  %lld items have vanished from %s; see \"pelmora sync --help\"\n",
+                    static_cast<long long>(status.question->items),
+                    status.question->side == Side::local ? "this device" : "the account");
     std::printf("State:     %s\n", status.listed ? "read" : "not read to the end yet");
 }
 
