@@ -6,6 +6,7 @@
 #include "platform/cloud/ContentHash.h"
 #include "platform/cloud/Sidecar.h"
 #include "platform/cloud/StoreFileSystem.h"
+#include "platform/files/PathText.h"
 
 namespace platform {
 namespace {
@@ -147,6 +148,9 @@ Result<std::optional<Arrivals::Outcome>> Arrivals::takeOver(const Spot& spot,
     Outcome taken = outcome;
     if (mark->item != outcome.item && !isKnown(mark->item)) {
         taken.item = mark->item; // made by a run that did not come to write it down
+    } else if (mark->item != outcome.item && !isCopy(mark->item, path)) {
+        // Moved here a moment ago: the name is that one's until a plan says otherwise.
+        return makeError(ErrorCode::fileExists, entry.name);
     } else if (mark->item != outcome.item) {
         mark->item = outcome.item; // a copy of another item's promise
         if (Failure failure = context_.disk.setMark(path, encodedMark(*mark)))
@@ -159,6 +163,17 @@ Result<std::optional<Arrivals::Outcome>> Arrivals::takeOver(const Spot& spot,
     taken.local = localRowOf(place, *attributes, true);
     taken.base = baseOf(place, entry, *attributes);
     return std::optional(std::move(taken));
+}
+
+bool Arrivals::isCopy(ItemId item, const std::string& path) {
+    std::optional<std::string> own;
+    context_.queue.sync([&] { own = context_.database.localPathOf(item); });
+    if (!own)
+        return false;
+    const std::string document = context_.pathOf(*own);
+    const auto found =
+        findSidecar(std::string(folderOf(document)), nameOf(document), context_.mark);
+    return found && found->mark.item == item && found->path != path;
 }
 
 bool Arrivals::isKnown(ItemId item) {

@@ -36,7 +36,7 @@ public:
     Arrivals(StoreContext& context, CancelFlag& cancel) : context_(context), cancel_(cancel) {}
 
     /// `item` is the entry's item where it has one already. An error means that the disk, or the
-    /// remote, does not work.
+    /// remote, does not work; fileExists, that the name is another item's promise's.
     Result<Outcome> arrive(const Spot& spot, const RemoteEntry& entry, std::optional<ItemId> item);
 
     /// A file that is fetched when it is listed.
@@ -56,6 +56,8 @@ private:
     Result<std::optional<Outcome>> takeOver(const Spot& spot, const SidecarName& name,
                                             const RemoteEntry& entry, const Outcome& outcome);
     bool isKnown(ItemId item);
+    /// The item's own promise lies elsewhere than at `path`.
+    bool isCopy(ItemId item, const std::string& path);
 
     StoreContext& context_;
     CancelFlag& cancel_;

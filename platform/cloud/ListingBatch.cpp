@@ -4,7 +4,7 @@ namespace platform {
 
 void ListingBatch::writeTo(StateDatabase& database) const {
     for (const ItemId item : displaced)
-        database.removeRemote(item);
+        database.displaceRemote(item);
     for (const Change& change : changes)
         write(database, change);
     for (const auto& [item, generation] : seen)
@@ -29,7 +29,7 @@ void ListingBatch::write(StateDatabase& database, const Change& change) const {
         if (!change.insert && !database.state(item.id))
             return; // forgotten meanwhile; the next listing sees it as new
         if (const auto other = database.remoteItemAt(change.remote.place); taken(other))
-            database.removeRemote(*other); // it is not there any more
+            database.displaceRemote(*other); // it is not there any more
     }
     if (change.insert)
         database.insertItem(item);

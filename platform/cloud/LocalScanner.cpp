@@ -2,13 +2,16 @@
 
 #include "platform/base/Log.h"
 #include "platform/base/Text.h"
+#include "platform/cloud/KeptFolder.h"
 #include "platform/cloud/StoreFileSystem.h"
+#include "platform/cloud/SyncNames.h"
 #include "platform/cloud/SyncTimes.h"
 #include "platform/files/PathText.h"
 
 namespace platform {
 namespace {
 
+constexpr int namesAside = 100;
 constexpr std::string_view rootMarkName = ".pelmora-root";
 
 std::string joined(const std::string& folder, std::string_view name) {
@@ -35,7 +38,7 @@ Failure LocalScanner::run() {
     device_ = root->identity.device;
     if (Failure failure = readKnown())
         return failure;
-    visits_.push_back({"", rootItem, SIZE_MAX});
+    visits_.push_back({"", rootItem});
     for (std::size_t visit = 0; visit < visits_.size(); ++visit) {
         if (cancel_.isCancelled())
             return makeError(ErrorCode::userCancelled);
@@ -49,8 +52,13 @@ Failure LocalScanner::run() {
     Failure failure;
     context_.queue.sync([&] {
         failure = writeDown();
-        if (!failure)
+        if (!failure && !again_)
             collectVanished();
+        if (failure && again_ && failure->is(ErrorCode::changedWhileRead)) {
+            platformLog(LogLevel::debug, "cloud: the disk changed under a look at it: %@",
+                        *failure);
+            failure.reset(); // nothing was written down
+        }
     });
     for (const Visit& visit : visits_)
         folders_.push_back(visit.path);
@@ -129,7 +137,7 @@ void LocalScanner::take(std::size_t visit, const DirectoryEntry& entry) {
     const bool folder = attributes->kind == FileKind::directory;
     if (!folder && hasSidecarForm(entry.name))
         return takeSidecar(visit, entry.name, *attributes);
-    Found found{path, {}, *attributes, 0, 0, visit, false};
+    Found found{path, {}, *attributes, 0, 0, visit, false, SIZE_MAX};
     if (known && (known->item.kind == ItemKind::folder) == folder) {
         found.item = known->item.id;
         seen_.insert(found.item);
@@ -138,7 +146,7 @@ void LocalScanner::take(std::size_t visit, const DirectoryEntry& entry) {
             return;
         }
         if (folder && known->local->identity == attributes->identity) {
-            visits_.push_back({path, found.item, SIZE_MAX});
+            visits_.push_back({path, found.item});
             return;
         }
     } else if (folder) {
@@ -157,8 +165,10 @@ void LocalScanner::note(Found found, std::size_t visit, bool isFolder) {
     found.folder = visit;
     if (!isFolder && isYoung(found.attributes.modified, context_.clock.now()))
         unsettled_ = true;
-    if (isFolder)
-        visits_.push_back({found.path, found.item, found_.size()});
+    if (isFolder) {
+        found.opens = visits_.size();
+        visits_.push_back({found.path, found.item});
+    }
     found_.push_back(std::move(found));
 }
 
@@ -167,6 +177,10 @@ void LocalScanner::takeSidecar(std::size_t visit, const std::string& name,
     const Visit in = visits_[visit];
     const std::string path = joined(in.path, name);
     const std::optional<SidecarMark> mark = readMark(context_.pathOf(path), context_.mark);
+    if (!mark && isHalfWritten(context_.pathOf(path), context_.mark)) {
+        halfWritten_.push_back(path);
+        return;
+    }
     if (!mark)
         return refuse(
             visit, name,
@@ -183,7 +197,7 @@ void LocalScanner::takeSidecar(std::size_t visit, const std::string& name,
             return;
     }
     note({joined(in.path, document), path, attributes, mark->item, mark->item, visit,
-          !known || known->item.id != mark->item},
+          !known || known->item.id != mark->item, SIZE_MAX},
          visit, false);
 }
 
@@ -218,6 +232,13 @@ bool LocalScanner::stands(const Found& found) const {
 }
 
 Failure LocalScanner::writeDown() {
+    // Whatever they are, they are not thrown away.
+    for (const std::string& path : halfWritten_) {
+        if (!readMark(context_.pathOf(path), context_.mark) &&
+            isHalfWritten(context_.pathOf(path), context_.mark))
+            if (const auto kept = KeptFolder(context_).take(path, true); !kept)
+                platformLog(LogLevel::warning, "cloud: cannot put %@ away: %@", path, kept.error());
+    }
     if (found_.empty() && refused_.empty() && spare_.empty() &&
         context_.database.refusedCount(Side::local) == 0)
         return std::nullopt;
@@ -230,7 +251,8 @@ Failure LocalScanner::writeDown() {
                 context_.database.setItemPlace(found.item, std::nullopt);
             }
         for (Found& found : found_)
-            write(found);
+            if (Failure writing = write(found))
+                return writing;
         std::map<ItemId, std::vector<RefusedRow>> refused;
         for (const auto& [visit, row] : refused_)
             if (visits_[visit].item > 0)
@@ -245,35 +267,31 @@ Failure LocalScanner::writeDown() {
     return failure;
 }
 
-void LocalScanner::write(Found& found) {
+Failure LocalScanner::write(Found& found) {
     StateDatabase& database = context_.database;
     const ItemId parent = visits_[found.folder].item;
-    if (found.item < 0 || parent <= 0 || !stands(found)) {
-        unsettled_ = unsettled_ || found.item >= 0;
-        return;
+    if (found.item < 0)
+        return std::nullopt;
+    const Error late = makeError(ErrorCode::changedWhileRead, nameOf(found.path));
+    if (parent <= 0 || !stands(found)) {
+        again_ = true;
+        // One that has left its place already must get one; all others are found by another look.
+        return found.moved ? Failure(late) : std::nullopt;
     }
-    const Place place{parent, std::string(nameOf(found.path))};
     const bool folder = found.attributes.kind == FileKind::directory;
     const std::optional<ItemState> state =
         found.item != 0 ? database.state(found.item) : std::optional<ItemState>();
-    // Somebody of ours was faster: the next look sees it.
-    const auto before = byItem_.find(found.item);
-    if (state && state->local && before != byItem_.end() &&
-        (state->local->promise != before->second->local->promise ||
-         state->local->place != before->second->local->place) &&
-        state->local->place != place) {
-        unsettled_ = true;
-        return;
-    }
-    if (const std::optional<ItemId> other = database.localItemAt(place);
+    if (const std::optional<ItemId> other =
+            database.localItemAt({parent, std::string(nameOf(found.path))});
         other && *other != found.item) {
-        if (seen_.contains(*other)) { // it is about to be written down elsewhere, or has moved back
-            unsettled_ = true;
-            return;
+        if (!seen_.contains(*other)) {
+            database.removeLocal(*other); // its place is another's
+            database.setItemPlace(*other, std::nullopt);
+        } else if (Failure failure = moveAside(found, *other)) {
+            return failure;
         }
-        database.removeLocal(*other); // its place is another's
-        database.setItemPlace(*other, std::nullopt);
     }
+    const Place place{parent, std::string(nameOf(found.path))};
     if (!state) {
         if (found.item == 0)
             found.item = database.newItemId();
@@ -284,16 +302,55 @@ void LocalScanner::write(Found& found) {
             database.setItemPlace(*shown, std::nullopt);
         database.setItemPlace(found.item, place);
         database.putLocal(found.item, localRowOf(place, found.attributes, found.promised != 0));
+        // A file of the user's over a promise: they have not seen what it promised, so that nothing
+        // is agreed on, and a deletion of theirs is not one of that.
+        if (found.promised == 0 && state->local && state->local->promise)
+            database.removeBase(found.item);
         if (found.promised == 0 && state->local && state->local->promise)
             if (const std::optional<FoundSidecar> sidecar = findSidecar(
                     std::string(folderOf(context_.pathOf(found.path))), place.name, context_.mark);
                 sidecar && sidecar->mark.item == found.item)
                 spare_.push_back(sidecar->path.substr(context_.layout.root().size() + 1));
     }
-    if (folder)
-        for (Visit& visit : visits_)
-            if (visit.found != SIZE_MAX && &found_[visit.found] == &found)
-                visit.item = found.item;
+    if (found.opens != SIZE_MAX)
+        visits_[found.opens].item = found.item;
+    return std::nullopt;
+}
+
+Failure LocalScanner::moveAside(Found& found, ItemId promise) {
+    const std::optional<ItemState> other = context_.database.state(promise);
+    const std::string path = context_.pathOf(found.path);
+    const std::string folder(folderOf(path));
+    const auto sidecar = findSidecar(folder, nameOf(path), context_.mark);
+    if (found.promised != 0 || !other || !other->local || !other->local->promise || !sidecar ||
+        sidecar->mark.item != promise) {
+        again_ = true;
+        return makeError(ErrorCode::changedWhileRead, nameOf(path));
+    }
+    const ItemKind kind =
+        found.attributes.kind == FileKind::directory ? ItemKind::folder : ItemKind::file;
+    Failure failure;
+    for (int number = 1; number <= namesAside; ++number) {
+        const std::string name =
+            conflictName(nameOf(path), kind, context_.clock.now(), deviceName(), number);
+        if (findSidecar(folder, name, context_.mark))
+            continue;
+        failure = context_.disk.rename(path, folder + '/' + name);
+        if (failure && failure->is(ErrorCode::fileExists))
+            continue;
+        if (failure)
+            return failure;
+        const std::size_t slash = found.path.rfind('/');
+        found.path =
+            joined(slash == std::string::npos ? std::string() : found.path.substr(0, slash), name);
+        const Result<FileAttributes> now = context_.disk.attributes(context_.pathOf(found.path));
+        if (!now)
+            return now.error();
+        found.attributes = *now;
+        again_ = true; // what is in it is to be found there
+        return std::nullopt;
+    }
+    return failure ? failure : makeError(ErrorCode::fileExists, nameOf(path));
 }
 
 void LocalScanner::writeNew(const Found& found, const Place& place, bool folder) {

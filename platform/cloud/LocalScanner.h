@@ -26,6 +26,8 @@ public:
     const std::vector<ItemId>& vanished() const { return vanished_; }
     /// Something may change once more without a sign of it: look again after a while.
     bool unsettled() const { return unsettled_; }
+    /// What was found was changed by the look itself, or meanwhile: look again at once.
+    bool again() const { return again_; }
     /// The folders of the tree, relative to its root ("" for the root).
     const std::vector<std::string>& folders() const { return folders_; }
 
@@ -38,11 +40,11 @@ private:
         ItemId item = 0;        // as far as it is known
         std::size_t folder = 0; // index of the folder among visits_
         bool moved = false;
+        std::size_t opens = SIZE_MAX; // index of its own visit, of a folder
     };
     struct Visit {
         std::string path;
         ItemId item = 0; // 0: of a folder that is new
-        std::size_t found = SIZE_MAX;
     };
 
     Failure readKnown();
@@ -57,7 +59,9 @@ private:
 
     // On the store's queue.
     Failure writeDown();
-    void write(Found& found);
+    Failure write(Found& found);
+    /// The user made something at a name that is only promised: it cannot have that name.
+    Failure moveAside(Found& found, ItemId promise);
     void writeNew(const Found& found, const Place& place, bool folder);
     bool stands(const Found& found) const;
     bool isStillAbsent(ItemId item) const;
@@ -75,10 +79,12 @@ private:
     std::set<ItemId> blind_; // folders of which nothing is known
     std::vector<std::pair<std::size_t, RefusedRow>> refused_;
     std::vector<std::string> spare_; // sidecars whose content is there
+    std::vector<std::string> halfWritten_;
     std::vector<ItemId> vanished_;
     std::vector<std::string> folders_;
     std::uint64_t device_ = 0;
     bool unsettled_ = false;
+    bool again_ = false;
 };
 
 } // namespace platform

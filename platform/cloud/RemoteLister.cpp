@@ -128,6 +128,9 @@ void RemoteLister::readAhead() {
 }
 
 Failure RemoteLister::bringIn(const Folder& folder, const Result<RemoteListing>& listing) {
+    // That a folder is not there any more is for the listing of the one above to say.
+    if (!listing && listing.error().is(ErrorCode::noSuchItem) && folder.item != rootItem)
+        return std::nullopt;
     if (!listing)
         return listing.error();
     Result<Arrivals::Spot> spot = spotOf(folder);
@@ -261,6 +264,13 @@ Failure RemoteLister::takeNew(Visit& visit, const RemoteEntry& entry, const Item
     }
     Result<Arrivals::Outcome> outcome =
         arrivals_.arrive(visit.spot, entry, state ? std::optional(state->item.id) : std::nullopt);
+    if (!outcome && outcome.error().is(ErrorCode::fileExists)) {
+        if (!state)
+            addRemoteOnly(visit, entry);
+        else
+            batch_.changes.push_back({state->item, false, rowOf(visit, entry), {}, {}});
+        return std::nullopt;
+    }
     if (!outcome)
         return outcome.error();
     if (outcome->refused) {

@@ -115,6 +115,23 @@ std::optional<SidecarMark> readMark(const std::string& path, std::string_view st
     return mark && mark->store == store ? mark : std::nullopt;
 }
 
+bool isHalfWritten(const std::string& path, std::string_view store) {
+    struct stat status {};
+    if (lstat(path.c_str(), &status) != 0 || !S_ISREG(status.st_mode))
+        return false;
+    if (status.st_size == 0)
+        return true;
+    const std::optional<std::string> content = markFromContent(path);
+    if (!content)
+        return false;
+    std::string head(version);
+    head += ' ';
+    head += store;
+    // Bytes that a disk had kept room for and never got are zeros.
+    const std::string_view text = std::string_view(*content).substr(0, content->find('\0'));
+    return text.size() < head.size() ? head.starts_with(text) : text.starts_with(head);
+}
+
 std::optional<FoundSidecar> findSidecar(const std::string& folder, std::string_view name,
                                         std::string_view store) {
     const auto look = [&](const SidecarName& candidate) -> std::optional<FoundSidecar> {

@@ -49,6 +49,10 @@ std::string promisedName(std::string_view sidecarName, const SidecarMark& mark);
 /// the user's own.
 std::optional<SidecarMark> readMark(const std::string& path, std::string_view store);
 
+/// A promise whose making, or whose disk, was interrupted: nothing, zeros, or the beginning of a
+/// mark of `store`. Only for names of the sidecars' form without a valid mark.
+bool isHalfWritten(const std::string& path, std::string_view store);
+
 struct FoundSidecar {
     std::string path;
     SidecarMark mark;

@@ -27,6 +27,10 @@ std::int64_t numberOf(std::string_view text) {
     return number;
 }
 
+std::string displacedName(ItemId item) {
+    return std::string(1, displacedMark) + std::to_string(item);
+}
+
 const char* roleText(SharedRole role) {
     return role == SharedRole::owner         ? "owner"
            : role == SharedRole::participant ? "participant"
@@ -233,6 +237,12 @@ void StateDatabase::removeItem(ItemId item) {
         .with(item)
         .run();
     handles_->prepared("DELETE FROM item WHERE id = ?1").with(item).run();
+}
+
+void StateDatabase::displaceRemote(ItemId item) {
+    handles_->prepared("UPDATE remote SET name = ?2, gen = gen - 1 WHERE item = ?1")
+        .with(item, Name{displacedName(item)})
+        .run();
 }
 
 void StateDatabase::removeRemote(ItemId item) {

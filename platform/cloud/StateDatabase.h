@@ -97,6 +97,9 @@ public:
     /// base knows is forgotten altogether.
     void forgetLocalTree(ItemId item);
     void removeRemote(ItemId item);
+    /// Another one has its place on the remote. Where it is itself, if it still is, the listings of
+    /// other folders tell; until then it counts as missing since one listing.
+    void displaceRemote(ItemId item);
     /// Forgets an item with all that was known of it; what the user saw in it has no place then.
     void removeItem(ItemId item);
     void putBase(ItemId item, const BaseRow& row);

@@ -47,6 +47,13 @@ struct RemoteRow {
     std::int64_t generation = 0;
 };
 
+/// No item of a remote has a name that begins so: it stands for "not there any more, and not yet
+/// found elsewhere".
+inline constexpr char displacedMark = '\0';
+inline bool isDisplaced(const RemoteRow& row) {
+    return row.place.name.starts_with(displacedMark);
+}
+
 /// The last whole observation of the disk.
 struct LocalRow {
     Place place;

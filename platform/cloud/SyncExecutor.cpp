@@ -109,6 +109,10 @@ std::optional<SyncExecutor::Work> SyncExecutor::prepare(const SyncStep& step) {
             return;
         work = Work{step, std::move(*state), database.localPathOf(step.item).value_or(""),
                     database.remotePathOf(step.item).value_or("")};
+        // "" is the root; nothing is ever done to that one.
+        if ((needsLocal(step.kind) && work->localPath.empty()) ||
+            (needsRemote(step.kind) && work->remotePath.empty()))
+            work.reset();
     });
     return work;
 }

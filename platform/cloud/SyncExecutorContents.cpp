@@ -278,12 +278,17 @@ void resumeConflict(StoreContext& context, const OpRow& op) {
             context.pathOf(folder.empty() ? op.staged : folder + '/' + op.staged));
         if (there && there->identity == state->local->identity)
             moved = *there;
+        // That it is not under its old name any more must not be forgotten by the disk alone.
+        if (moved && context.disk.syncFolder(context.pathOf(folder)))
+            return; // the next start tries again
     }
     const Failure failure = database.transaction([&]() -> Failure {
         database.removeOperation(op.id);
         if (!moved)
             return std::nullopt;
-        // What was moved is an item of its own from now on.
+        // What was moved is an item of its own from now on. Of the other nothing is here: that must
+        // not look like a deletion by the user.
+        database.removeBase(op.item);
         const Place place{state->local->place.parent, op.staged};
         database.removeLocal(op.item);
         database.setItemPlace(op.item, std::nullopt);

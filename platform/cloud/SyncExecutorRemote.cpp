@@ -66,7 +66,9 @@ Failure SyncExecutor::removeThere(const Work& work, CancelFlag& cancel) {
         return failure;
     context_.queue.sync([&] {
         failure = context_.database.transaction([&]() -> Failure {
-            context_.database.removeRemote(work.step.item);
+            // A folder that could be removed, or is not there, has nothing in it.
+            for (const ItemId item : context_.database.treeOf(work.step.item, Side::remote))
+                context_.database.removeRemote(item);
             return std::nullopt;
         });
     });

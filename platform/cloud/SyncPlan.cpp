@@ -62,6 +62,8 @@ SyncStep step(StepKind kind, const ItemState& state, Place to = {}) {
 Planner::Wish Planner::wishOf(const ItemState& state) const {
     if (state.item.id == rootItem || isAgreed(state))
         return std::nullopt;
+    if (state.remote && isDisplaced(*state.remote))
+        return std::nullopt; // the next listings tell
     if (!state.local && !state.remote)
         return step(StepKind::forget, state);
     if (state.local && state.remote)

@@ -14,6 +14,8 @@ namespace {
 constexpr int roundsAtMost = 300;
 /// How often in one run a step is made again that only came too late.
 constexpr int triesAtOnce = 3;
+/// How often a tree that changes while it is looked at is looked at again before that waits.
+constexpr int looksAtOnce = 4;
 constexpr const char* troubleKind = "sync";
 
 bool onlyCameTooLate(const Error& error) {
@@ -66,12 +68,16 @@ Synchronizer::Report Synchronizer::run(const Request& request) {
 }
 
 Failure Synchronizer::look(Report& report) {
-    LocalScanner scanner(context_, cancel_);
-    if (Failure failure = scanner.run())
-        return failure;
-    report.unsettled = report.unsettled || scanner.unsettled();
-    report.folders = scanner.folders();
-    return settleLocal(scanner.vanished(), report);
+    for (int attempt = 1;; ++attempt) {
+        LocalScanner scanner(context_, cancel_);
+        if (Failure failure = scanner.run())
+            return failure;
+        if (scanner.again() && attempt < looksAtOnce)
+            continue;
+        report.unsettled = report.unsettled || scanner.unsettled() || scanner.again();
+        report.folders = scanner.folders();
+        return scanner.again() ? std::nullopt : settleLocal(scanner.vanished(), report);
+    }
 }
 
 Failure Synchronizer::list(const std::vector<ItemId>& folders, bool everything) {

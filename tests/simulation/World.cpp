@@ -1,0 +1,317 @@
+#include "tests/simulation/World.h"
+
+#include "platform/files/FileManager.h"
+#include "platform/files/PathText.h"
+#include "tests/simulation/machine/Fibers.h"
+#include "tests/simulation/machine/Machine.h"
+
+#include <algorithm>
+#include <cstdlib>
+#include <fcntl.h>
+#include <thread>
+#include <unistd.h>
+
+namespace simulation {
+namespace {
+
+using namespace platform;
+
+constexpr std::size_t turnsAtMost = 3'000'000;
+constexpr int runsUntilRest = 14;
+constexpr auto between = std::chrono::minutes(6);
+
+Machine& machine() {
+    return Machine::shared();
+}
+
+FarHabits habitsOf(Luck& luck) {
+    FarHabits habits;
+    habits.ids = luck.percent(70);
+    habits.keepsTimes = luck.percent(80);
+    habits.moveChangesEtag = luck.percent(40);
+    habits.folderEtags = luck.percent(30);
+    habits.checksInSteps = luck.percent(40);
+    habits.youngEtags = luck.percent(20);
+    return habits;
+}
+
+std::string readAll(const std::string& path) {
+    const Result<Bytes> bytes = FileManager::contents(Url::file(path), 1U << 20U);
+    return bytes ? std::string(reinterpret_cast<const char*>(bytes->data()), bytes->size())
+                 : std::string();
+}
+
+} // namespace
+
+World::World(std::uint64_t seed) : luck_(seed) {
+    Fibers& fibers = Fibers::shared();
+    fibers.begin(seed);
+    fibers.reseed(luck_.next(), 20 + static_cast<unsigned>(luck_.below(200)));
+    fibers.setLimit(turnsAtMost);
+    machine().luck() = luck_.split();
+    fibers.setIdle([&fibers] {
+        std::optional<std::chrono::nanoseconds> due = fibers.nextDue();
+        if (const auto alarm = machine().time().nextDue(); alarm && (!due || *alarm < *due))
+            due = alarm;
+        if (!due)
+            return false;
+        machine().time().moveTo(*due);
+        while (Job job = machine().time().takeDue())
+            job();
+        fibers.wakeDue(*due);
+        return true;
+    });
+    Disk::Setup setup;
+    setup.journal = luck_.percent(50) ? Journal::ordered : Journal::loose;
+    setup.nameOrder = luck_.next();
+    setup.attributes = luck_.percent(90);
+    disk_ = std::make_shared<Disk>(setup, [] { return machine().stamp(); });
+    machine().mount("/sim/home", disk_);
+    far_ = std::make_unique<FarSide>(habitsOf(luck_), [] { return machine().wall(); });
+    line_.luck = luck_.split();
+    line_.keepsLog = true;
+    line_.pauses = static_cast<unsigned>(luck_.below(400));
+    line_.machineIsOff = [this] { return off_; };
+    files_ = makeRealStoreFileSystem();
+    remote_ = std::make_unique<SimRemote>(*far_, line_);
+    for (int i = 0; i < 6; ++i)
+        actThere();
+    open();
+}
+
+World::~World() {
+    close();
+    files_.reset();
+    machine().unmountAll();
+    machine().time().forgetAlarms();
+    Fibers::shared().end();
+}
+
+void World::open() {
+    cancel_ = std::make_unique<CancelFlag>();
+    Result<OpenedStore> store = openStore(layout_, *files_, machine().time());
+    if (!store) {
+        tell("cannot open: " + store.error().localizedDescription.value_or(""));
+        return;
+    }
+    store_.emplace(std::move(*store));
+    queue_ = std::make_unique<WorkQueue>("store");
+    context_.emplace(StoreContext{layout_, store_->mark, *files_, *remote_, machine().time(),
+                                  *queue_, *store_->database});
+    queue_->sync([&] { Transfers::recover(*context_); });
+    transfers_ = std::make_unique<Transfers>(*context_, progress_, 0, nullptr);
+    queue_->sync([&] {
+        synchronizer_ =
+            std::make_unique<Synchronizer>(*context_, transfers_->queue(), transfers_->limiter(),
+                                           *cancel_, store_->lock.afterCrash(), nullptr);
+    });
+}
+
+void World::close() {
+    if (cancel_)
+        cancel_->cancel();
+    if (synchronizer_)
+        synchronizer_->cancel();
+    if (transfers_)
+        transfers_->stop();
+    synchronizer_.reset();
+    transfers_.reset();
+    queue_.reset();
+    context_.reset();
+    store_.reset();
+}
+
+Synchronizer::Report World::synchronize(std::size_t turnsUntilStop) {
+    Synchronizer::Report report;
+    if (!synchronizer_)
+        return report;
+    bool ended = false;
+    std::thread thread([&] {
+        if (const Result<std::string> mark = remote_->connect(*cancel_); !mark)
+            report.failure = mark.error();
+        else
+            report = synchronizer_->run({true, true, {}, true, false});
+        ended = true;
+    });
+    if (turnsUntilStop > 0) {
+        Fibers::shared().run(turnsUntilStop, [&] { return ended; });
+        if (!ended) {
+            machine().stopNow(luck_.percent(70) ? Machine::Stop::power : Machine::Stop::kill);
+            off_ = true;
+            cancel_->cancel();
+            synchronizer_->cancel();
+        }
+    }
+    thread.join();
+    for (std::string& change : line_.log)
+        tell("  on the far side: " + std::move(change));
+    line_.log.clear();
+    return report;
+}
+
+void World::crash() {
+    tell("the machine stops in the middle of a run");
+    synchronize(1 + luck_.below(luck_.percent(50) ? 300 : 5000));
+    close();
+    if (off_) {
+        machine().restart();
+        disk_ = machine().disk("/sim/home");
+    }
+    off_ = false;
+    open();
+}
+
+void World::fetchOne() {
+    if (!transfers_)
+        return;
+    std::vector<std::string> promises;
+    disk_->visit(disk_->root(), [&](const std::string& path, const Node& node) {
+        if (path.starts_with("/store/Shelfroot/") && node.kind == NodeKind::file &&
+            hasSidecarForm(nameOf(path)))
+            promises.push_back(path);
+    });
+    if (promises.empty())
+        return;
+    const std::string& sidecar = luck_.of(promises);
+    std::string name(nameOf(sidecar));
+    name = name.substr(1, name.size() - 1 - std::string_view(".promise").size());
+    const std::string path = "/sim/home" + std::string(folderOf(sidecar)) + '/' + name;
+    tell("fetch " + path);
+    std::thread thread([&] {
+        CancelFlag own;
+        const Failure ignored = transfers_->fetch(Url::file(path), own);
+    });
+    thread.join();
+}
+
+std::optional<std::string> World::run() {
+    const int rounds = 2 + static_cast<int>(luck_.below(6));
+    for (int round = 0; round < rounds; ++round) {
+        for (std::uint64_t i = luck_.below(7); i > 0; --i)
+            act();
+        line_.faults.clear();
+        for (std::uint64_t i = luck_.percent(50) ? luck_.below(5) : 0; i > 0; --i)
+            line_.faults[luck_.below(40)] = {static_cast<FarFault::Kind>(luck_.below(4)),
+                                             luck_.percent(50) ? ErrorCode::serverNotAvailable
+                                                               : ErrorCode::timedOut};
+        if (luck_.percent(25)) {
+            crash();
+        } else {
+            tell("run");
+            synchronize();
+        }
+        machine().time().creep(std::chrono::milliseconds(luck_.below(4000)));
+        if (auto lost = missingContent())
+            return lost;
+    }
+    return settle();
+}
+
+std::optional<std::string> World::settle() {
+    line_.faults.clear();
+    tell("nothing fails any more");
+    for (int run = 0; run < runsUntilRest; ++run) {
+        machine().time().creep(between);
+        const Synchronizer::Report report = synchronize();
+        if (report.failure)
+            tell("run: " + report.failure->localizedDescription.value_or("") + " " +
+                 report.failure->localizedFailureReason.value_or(""));
+        if (report.question) {
+            const bool away = luck_.percent(50);
+            tell(away ? "answer: delete them" : "answer: put them back");
+            queue_->sync([&] {
+                const Failure ignored = synchronizer_->answer(away ? DeletionAnswer::deleteThem
+                                                                   : DeletionAnswer::putBack);
+            });
+            continue;
+        }
+        bool agreed = false;
+        queue_->sync([&] { agreed = store_->database->disagreements().empty(); });
+        if (!report.failure && report.changes == 0 && agreed) {
+            if (auto lost = missingContent())
+                return lost;
+            return difference();
+        }
+    }
+    std::string text = "does not come to rest\n";
+    queue_->sync([&] {
+        for (const ItemState& state : store_->database->disagreements()) {
+            const auto place = [](const auto& row) {
+                return row ? std::to_string(row->place.parent) + '/' + row->place.name : "-";
+            };
+            text += std::to_string(state.item.id) + ": " + place(state.local) + " | " +
+                    place(state.remote) + " | " + place(state.base) + '\n';
+        }
+        for (const PendingWork& work : Synchronizer::pending(*store_->database))
+            text += work.kind + ' ' + work.path + ": " + work.cause + '\n';
+    });
+    return text;
+}
+
+void World::collect(const std::string& folder, std::set<std::string>& contents) const {
+    const auto entries = FileManager::entries(folder);
+    if (!entries)
+        return;
+    for (const DirectoryEntry& entry : *entries)
+        if (entry.kind == FileKind::directory)
+            collect(folder + '/' + entry.name, contents);
+        else
+            contents.insert(readAll(folder + '/' + entry.name));
+}
+
+std::optional<std::string> World::missingContent() {
+    std::set<std::string> found;
+    for (const std::string& folder : {layout_.root(), layout_.kept(), layout_.staging()})
+        collect(folder, found);
+    far_->visit([&](const std::string&, const FarItem& item) { found.insert(item.content); });
+    lastThere_.clear();
+    far_->visit([&](const std::string& path, const FarItem& item) {
+        if (!item.folder)
+            lastThere_[path] = item.content;
+    });
+    for (const std::string& content : wanted_)
+        if (!found.contains(content))
+            return "lost: " + content;
+    return std::nullopt;
+}
+
+void World::listHere(const std::string& folder, const std::string& shown,
+                     std::map<std::string, std::string>& tree) const {
+    const auto entries = FileManager::entries(folder);
+    if (!entries)
+        return;
+    for (const DirectoryEntry& entry : *entries) {
+        const std::string path = folder + '/' + entry.name;
+        if (entry.name == ".pelmora-root")
+            continue;
+        if (entry.kind == FileKind::directory) {
+            tree[shown + entry.name + '/'] = "";
+            listHere(path, shown + entry.name + '/', tree);
+        } else if (const auto mark = readMark(path, store_->mark)) {
+            tree[shown + promisedName(entry.name, *mark)] = "a promise";
+        } else {
+            tree[shown + entry.name] = readAll(path);
+        }
+    }
+}
+
+std::optional<std::string> World::difference() {
+    std::map<std::string, std::string> here;
+    std::map<std::string, std::string> there;
+    listHere(layout_.root(), "", here);
+    far_->visit([&](const std::string& path, const FarItem& item) {
+        if (!path.empty() && !path.starts_with(".pelmora"))
+            there[item.folder ? path + '/' : path] = item.content;
+    });
+    for (const auto& [path, content] : here)
+        if (!there.contains(path))
+            return "only here: " + path;
+        else if (content != "a promise" && content != there[path])
+            return "differs: " + path + ": " + content + " and " + there[path];
+    for (const auto& [path, content] : there)
+        if (!here.contains(path))
+            return "only there: " + path;
+    return std::nullopt;
+}
+
+} // namespace simulation
