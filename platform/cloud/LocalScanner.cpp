@@ -138,7 +138,9 @@ void LocalScanner::take(std::size_t visit, const DirectoryEntry& entry) {
     if (!folder && hasSidecarForm(entry.name))
         return takeSidecar(visit, entry.name, *attributes);
     Found found{path, {}, *attributes, 0, 0, visit, false, SIZE_MAX};
-    if (known && (known->item.kind == ItemKind::folder) == folder) {
+    // The folder of that place may have been met elsewhere already; then this is a new one.
+    const bool elsewhere = folder && known && seen_.contains(known->item.id);
+    if (known && !elsewhere && (known->item.kind == ItemKind::folder) == folder) {
         found.item = known->item.id;
         seen_.insert(found.item);
         const bool same = !known->local->promise && sameAsRow(*known->local, *attributes);
