@@ -142,7 +142,10 @@ Result<std::optional<Arrivals::Outcome>> Arrivals::takeOver(const Spot& spot,
                                                             const RemoteEntry& entry,
                                                             const Outcome& outcome) {
     const std::string path = spot.path + '/' + name.text;
-    std::optional<SidecarMark> mark = readMark(path, context_.mark);
+    const Result<std::optional<SidecarMark>> read = examineMark(path, context_.mark);
+    if (!read)
+        return read.error();
+    std::optional<SidecarMark> mark = *read;
     if (!mark || promisedName(name.text, *mark) != entry.name)
         return std::optional<Outcome>();
     Outcome taken = outcome;

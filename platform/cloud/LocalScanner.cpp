@@ -8,6 +8,8 @@
 #include "platform/cloud/SyncTimes.h"
 #include "platform/files/PathText.h"
 
+#include <algorithm>
+
 namespace platform {
 namespace {
 
@@ -95,8 +97,7 @@ Failure LocalScanner::look(std::size_t visit) {
         if (path.empty())
             return entries.error();
         platformLog(LogLevel::warning, "cloud: cannot look into “%@”: %@", path, entries.error());
-        blind_.insert(visits_[visit].item);
-        unsettled_ = true;
+        blind_.insert(visits_[visit].item); // a notice tells when it can be read again
         return std::nullopt;
     }
     for (const DirectoryEntry& entry : *entries)
@@ -119,8 +120,11 @@ void LocalScanner::take(std::size_t visit, const DirectoryEntry& entry) {
         if (!attributes.error().is(ErrorCode::noSuchItem) && known) { // unknown
             seen_.insert(known->item.id);
             blind_.insert(known->item.id);
+        } else if (!attributes.error().is(ErrorCode::noSuchItem) && hasSidecarForm(entry.name)) {
+            noteUnknownPromise(entry.name, attributes.error());
         }
-        unsettled_ = true;
+        if (attributes.error().is(ErrorCode::noSuchItem))
+            lookAfter(settleTime);
         return;
     }
     if (attributes->kind == FileKind::symbolicLink)
@@ -163,10 +167,14 @@ void LocalScanner::take(std::size_t visit, const DirectoryEntry& entry) {
     note(std::move(found), visit, folder);
 }
 
+void LocalScanner::lookAfter(Duration delay) {
+    settlesIn_ = std::max(settlesIn_.value_or(delay), delay);
+}
+
 void LocalScanner::note(Found found, std::size_t visit, bool isFolder) {
     found.folder = visit;
     if (!isFolder && isYoung(found.attributes.modified, context_.clock.now()))
-        unsettled_ = true;
+        lookAfter(settleTimeOf(found.attributes.modified));
     if (isFolder) {
         found.opens = visits_.size();
         visits_.push_back({found.path, found.item});
@@ -174,11 +182,21 @@ void LocalScanner::note(Found found, std::size_t visit, bool isFolder) {
     found_.push_back(std::move(found));
 }
 
+/// Whose it is only its mark would tell: until it can be read no promise counts as gone.
+void LocalScanner::noteUnknownPromise(const std::string& name, const Error& error) {
+    platformLog(LogLevel::warning, "cloud: cannot read the promise “%@”: %@", name, error);
+    unknownPromise_ = true;
+}
+
 void LocalScanner::takeSidecar(std::size_t visit, const std::string& name,
                                const FileAttributes& attributes) {
     const Visit in = visits_[visit];
     const std::string path = joined(in.path, name);
-    const std::optional<SidecarMark> mark = readMark(context_.pathOf(path), context_.mark);
+    const Result<std::optional<SidecarMark>> read =
+        examineMark(context_.pathOf(path), context_.mark);
+    if (!read)
+        return noteUnknownPromise(name, read.error());
+    const std::optional<SidecarMark>& mark = *read;
     if (!mark && isHalfWritten(context_.pathOf(path), context_.mark)) {
         halfWritten_.push_back(path);
         return;
@@ -236,8 +254,9 @@ bool LocalScanner::stands(const Found& found) const {
 Failure LocalScanner::writeDown() {
     // Whatever they are, they are not thrown away.
     for (const std::string& path : halfWritten_) {
-        if (!readMark(context_.pathOf(path), context_.mark) &&
-            isHalfWritten(context_.pathOf(path), context_.mark))
+        const Result<std::optional<SidecarMark>> mark =
+            examineMark(context_.pathOf(path), context_.mark);
+        if (mark && !*mark && isHalfWritten(context_.pathOf(path), context_.mark))
             if (const auto kept = KeptFolder(context_).take(path, true); !kept)
                 platformLog(LogLevel::warning, "cloud: cannot put %@ away: %@", path, kept.error());
     }
@@ -286,6 +305,12 @@ Failure LocalScanner::write(Found& found) {
     if (const std::optional<ItemId> other =
             database.localItemAt({parent, std::string(nameOf(found.path))});
         other && *other != found.item) {
+        const std::optional<ItemState> before = database.state(*other);
+        if (unknownPromise_ && !seen_.contains(*other) && before && before->local &&
+            before->local->promise) { // it may be there still
+            again_ = true;
+            return found.moved ? Failure(late) : std::nullopt;
+        }
         if (!seen_.contains(*other)) {
             database.removeLocal(*other); // its place is another's
             database.setItemPlace(*other, std::nullopt);
@@ -390,8 +415,9 @@ bool LocalScanner::isStillAbsent(ItemId item) const {
         return true; // in a folder that is gone itself
     const std::string path = context_.pathOf(*relative);
     if (state->local->promise) {
-        const auto sidecar = findSidecar(std::string(folderOf(path)), nameOf(path), context_.mark);
-        return !sidecar || sidecar->mark.item != item;
+        const auto sidecar =
+            examineSidecar(std::string(folderOf(path)), nameOf(path), context_.mark);
+        return sidecar && (!*sidecar || (*sidecar)->mark.item != item);
     }
     const Result<FileAttributes> now = context_.disk.attributes(path);
     if (!now)
@@ -401,7 +427,7 @@ bool LocalScanner::isStillAbsent(ItemId item) const {
 
 void LocalScanner::collectVanished() {
     for (const ItemState& state : known_) {
-        if (seen_.contains(state.item.id))
+        if (seen_.contains(state.item.id) || (unknownPromise_ && state.local->promise))
             continue;
         bool unknown = false;
         const ItemState* at = &state;

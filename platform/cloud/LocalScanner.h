@@ -5,6 +5,7 @@
 #include "platform/files/ContentProvider.h"
 
 #include <map>
+#include <optional>
 #include <set>
 #include <unordered_map>
 #include <vector>
@@ -24,8 +25,8 @@ public:
 
     /// Known items that are not on the disk any more. They are still written down as if they were.
     const std::vector<ItemId>& vanished() const { return vanished_; }
-    /// Something may change once more without a sign of it: look again after a while.
-    bool unsettled() const { return unsettled_; }
+    /// Something may change once more without a sign of it: look again after that time.
+    std::optional<Duration> settlesIn() const { return settlesIn_; }
     /// What was found was changed by the look itself, or meanwhile: look again at once.
     bool again() const { return again_; }
     /// The folders of the tree, relative to its root ("" for the root).
@@ -51,6 +52,8 @@ private:
     Failure look(std::size_t visit);
     void take(std::size_t visit, const DirectoryEntry& entry);
     void takeSidecar(std::size_t visit, const std::string& name, const FileAttributes& attributes);
+    void lookAfter(Duration delay);
+    void noteUnknownPromise(const std::string& name, const Error& error);
     void note(Found found, std::size_t visit, bool isFolder);
     const ItemState* knownAt(ItemId folder, std::string_view name) const;
     void refuse(std::size_t visit, const std::string& name, std::string reason);
@@ -83,8 +86,9 @@ private:
     std::vector<ItemId> vanished_;
     std::vector<std::string> folders_;
     std::uint64_t device_ = 0;
-    bool unsettled_ = false;
+    std::optional<Duration> settlesIn_;
     bool again_ = false;
+    bool unknownPromise_ = false;
 };
 
 } // namespace platform

@@ -3,6 +3,7 @@
 #include "platform/cloud/ContentHash.h"
 #include "platform/cloud/SyncNames.h"
 #include "platform/cloud/Tokens.h"
+#include "platform/files/FileDescriptor.h"
 #include "platform/files/FileManager.h"
 
 #include <array>
@@ -31,19 +32,23 @@ std::string_view takeWord(std::string_view& text) {
     return word;
 }
 
-std::optional<std::string> markFromContent(const std::string& path) {
-    const int file = open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK);
-    if (file < 0)
-        return std::nullopt;
+/// Of anything but a file: none.
+Result<std::optional<std::string>> markFromContent(const std::string& path) {
+    const FileDescriptor file(open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK));
+    if (!file && (errno == ENOENT || errno == ENOTDIR || errno == ELOOP || errno == ENXIO))
+        return std::optional<std::string>();
     struct stat status {};
+    if (!file || fstat(file.get(), &status) != 0)
+        return posixError(errno, Url::file(path), false);
+    if (!S_ISREG(status.st_mode))
+        return std::optional<std::string>();
     std::array<char, longestMark + 1> text{};
-    ssize_t length = -1;
-    if (fstat(file, &status) == 0 && S_ISREG(status.st_mode))
-        length = read(file, text.data(), text.size());
-    close(file);
-    if (length <= 0 || length > static_cast<ssize_t>(longestMark))
-        return std::nullopt;
-    return std::string(text.data(), static_cast<std::size_t>(length));
+    const ssize_t length = read(file.get(), text.data(), text.size());
+    if (length < 0)
+        return posixError(errno, Url::file(path), false);
+    if (length == 0 || length > static_cast<ssize_t>(longestMark))
+        return std::optional<std::string>();
+    return std::optional(std::string(text.data(), static_cast<std::size_t>(length)));
 }
 
 } // namespace
@@ -102,17 +107,26 @@ std::string promisedName(std::string_view sidecarName, const SidecarMark& mark) 
     return std::string(sidecarName.substr(1, sidecarName.size() - 1 - suffix.size()));
 }
 
-std::optional<SidecarMark> readMark(const std::string& path, std::string_view store) {
+Result<std::optional<SidecarMark>> examineMark(const std::string& path, std::string_view store) {
     std::array<char, longestMark> text{};
     const ssize_t length = lgetxattr(path.c_str(), sidecarAttribute, text.data(), text.size());
     std::optional<SidecarMark> mark;
     if (length >= 0) {
         mark = decodedMark(std::string_view(text.data(), static_cast<std::size_t>(length)));
     } else if (errno == ENODATA || errno == EOPNOTSUPP) {
-        if (const std::optional<std::string> content = markFromContent(path))
-            mark = decodedMark(*content);
+        const Result<std::optional<std::string>> content = markFromContent(path);
+        if (!content)
+            return content.error();
+        if (*content)
+            mark = decodedMark(**content);
+    } else if (errno != ENOENT && errno != ENOTDIR && errno != ERANGE) {
+        return posixError(errno, Url::file(path), false);
     }
     return mark && mark->store == store ? mark : std::nullopt;
+}
+
+std::optional<SidecarMark> readMark(const std::string& path, std::string_view store) {
+    return examineMark(path, store).toOptional().value_or(std::nullopt);
 }
 
 bool isHalfWritten(const std::string& path, std::string_view store) {
@@ -121,7 +135,8 @@ bool isHalfWritten(const std::string& path, std::string_view store) {
         return false;
     if (status.st_size == 0)
         return true;
-    const std::optional<std::string> content = markFromContent(path);
+    const std::optional<std::string> content =
+        markFromContent(path).toOptional().value_or(std::nullopt);
     if (!content)
         return false;
     std::string head(version);
@@ -132,18 +147,25 @@ bool isHalfWritten(const std::string& path, std::string_view store) {
     return text.size() < head.size() ? head.starts_with(text) : text.starts_with(head);
 }
 
-std::optional<FoundSidecar> findSidecar(const std::string& folder, std::string_view name,
-                                        std::string_view store) {
-    const auto look = [&](const SidecarName& candidate) -> std::optional<FoundSidecar> {
+Result<std::optional<FoundSidecar>> examineSidecar(const std::string& folder, std::string_view name,
+                                                   std::string_view store) {
+    const auto look = [&](const SidecarName& candidate) -> Result<std::optional<FoundSidecar>> {
         std::string path = folder + '/' + candidate.text;
-        const std::optional<SidecarMark> mark = readMark(path, store);
-        if (!mark || promisedName(candidate.text, *mark) != name)
-            return std::nullopt;
-        return FoundSidecar{std::move(path), *mark};
+        const Result<std::optional<SidecarMark>> mark = examineMark(path, store);
+        if (!mark)
+            return mark.error();
+        if (!*mark || promisedName(candidate.text, **mark) != name)
+            return std::optional<FoundSidecar>();
+        return std::optional(FoundSidecar{std::move(path), **mark});
     };
     const SidecarName usual = sidecarNameFor(name);
-    std::optional<FoundSidecar> found = look(usual);
-    return found || usual.needsName ? found : look(shortenedSidecarNameFor(name));
+    Result<std::optional<FoundSidecar>> found = look(usual);
+    return !found || *found || usual.needsName ? found : look(shortenedSidecarNameFor(name));
+}
+
+std::optional<FoundSidecar> findSidecar(const std::string& folder, std::string_view name,
+                                        std::string_view store) {
+    return examineSidecar(folder, name, store).toOptional().value_or(std::nullopt);
 }
 
 bool containsPromise(const std::string& folder, std::string_view store) {

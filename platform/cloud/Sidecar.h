@@ -1,5 +1,7 @@
 #pragma once
 
+#include "platform/base/Result.h"
+
 #include <cstddef>
 #include <cstdint>
 #include <optional>
@@ -48,6 +50,8 @@ std::string promisedName(std::string_view sidecarName, const SidecarMark& mark);
 /// The mark of the file at `path` when it is a promise of `store`; a file without a valid mark is
 /// the user's own.
 std::optional<SidecarMark> readMark(const std::string& path, std::string_view store);
+/// The same for those to whom it matters that it could not be read: that says nothing.
+Result<std::optional<SidecarMark>> examineMark(const std::string& path, std::string_view store);
 
 /// A promise whose making, or whose disk, was interrupted: nothing, zeros, or the beginning of a
 /// mark of `store`. Only for names of the sidecars' form without a valid mark.
@@ -60,6 +64,10 @@ struct FoundSidecar {
 /// The promise of the document `name` in `folder`, under either form of its name.
 std::optional<FoundSidecar> findSidecar(const std::string& folder, std::string_view name,
                                         std::string_view store);
+
+/// The same for those to whom it matters that it could not be read.
+Result<std::optional<FoundSidecar>> examineSidecar(const std::string& folder, std::string_view name,
+                                                   std::string_view store);
 
 /// Whether any document below the folder is only promised.
 bool containsPromise(const std::string& folder, std::string_view store);
