@@ -111,6 +111,16 @@ Failure StateDatabase::prepareSchema(bool thorough) {
     return transaction([] { return Failure(); }); // keeps numbers for this run
 }
 
+Failure StateDatabase::beginNewNumbers() {
+    const std::string epoch = newEpoch();
+    next_ = (numberOf(epoch) << 32) + 1;
+    keptUntil_ = 0;
+    return transaction([&]() -> Failure {
+        setMeta("epoch", epoch);
+        return std::nullopt;
+    });
+}
+
 std::optional<std::int64_t> StateDatabase::keepNumbers() {
     const std::int64_t next = next_.load();
     if (next + numbersOnTheWay <= keptUntil_)
@@ -242,6 +252,12 @@ void StateDatabase::removeItem(ItemId item) {
 void StateDatabase::displaceRemote(ItemId item) {
     handles_->prepared("UPDATE remote SET name = ?2, gen = gen - 1 WHERE item = ?1")
         .with(item, Name{displacedName(item)})
+        .run();
+}
+
+void StateDatabase::displaceRemote(ItemId item, ItemId folder) {
+    handles_->prepared("UPDATE remote SET parent = ?2, name = ?3, gen = ?4 WHERE item = ?1")
+        .with(item, folder, Name{displacedName(item)}, scan(folder, Side::remote).generation - 1)
         .run();
 }
 

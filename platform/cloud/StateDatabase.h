@@ -83,6 +83,8 @@ public:
     /// Runs the work in one transaction and brings it to the disk; when the work, or any step of
     /// it, fails, nothing of it is kept.
     [[nodiscard]] Failure transaction(const std::function<Failure()>& work);
+    /// From now on from a range of its own, as in a database that was made anew.
+    [[nodiscard]] Failure beginNewNumbers();
     ItemId newItemId() { return next_.fetch_add(1, std::memory_order_relaxed); }
 
     // Within a transaction:
@@ -100,6 +102,8 @@ public:
     /// Another one has its place on the remote. Where it is itself, if it still is, the listings of
     /// other folders tell; until then it counts as missing since one listing.
     void displaceRemote(ItemId item);
+    /// The same of one whose folder is no more: it counts as missing from this one.
+    void displaceRemote(ItemId item, ItemId folder);
     /// Forgets an item with all that was known of it; what the user saw in it has no place then.
     void removeItem(ItemId item);
     void putBase(ItemId item, const BaseRow& row);

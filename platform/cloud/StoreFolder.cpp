@@ -72,6 +72,32 @@ Failure adoptDevice(StateDatabase& database, std::uint64_t device) {
     });
 }
 
+/// Promises on the disk have numbers of items. A database that was put back from a copy would give
+/// some of those out a second time: it is told by the session that it remembers, and goes on with
+/// numbers of its own.
+Failure beginSession(const StoreLayout& layout, StoreFileSystem& disk, StateDatabase& database) {
+    constexpr const char* key = "session";
+    const Result<Bytes> last = FileManager::contents(Url::file(layout.session()), largestMark);
+    if (!last && !last.error().is(ErrorCode::noSuchItem))
+        return last.error();
+    const std::string remembered = database.meta(key);
+    const bool same =
+        last &&
+        remembered == std::string_view(reinterpret_cast<const char*>(last->data()), last->size());
+    if (!remembered.empty() && !same) {
+        platformLog(LogLevel::warning, "cloud: the records are not those of the last time");
+        if (Failure failure = database.beginNewNumbers())
+            return failure;
+    }
+    const std::string now = hexText(randomBytes(8));
+    if (Failure failure = database.transaction([&]() -> Failure {
+            database.setMeta(key, now);
+            return std::nullopt;
+        }))
+        return failure;
+    return disk.writeSmallFile(layout.session(), now);
+}
+
 Result<std::unique_ptr<StateDatabase>> openDatabase(const StoreLayout& layout,
                                                     StoreFileSystem& disk, Clock& clock,
                                                     bool afterCrash,
@@ -166,6 +192,8 @@ Result<OpenedStore> openStore(const StoreLayout& layout, StoreFileSystem& disk, 
             }))
             return *failure;
     if (Failure failure = adoptDevice(**database, root->identity.device))
+        return *failure;
+    if (Failure failure = beginSession(layout, disk, **database))
         return *failure;
     return OpenedStore{std::move(*lock), *mark, std::move(*database), std::move(notice)};
 }

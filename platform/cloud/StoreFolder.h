@@ -26,6 +26,8 @@ struct StoreLayout {
     std::string database() const { return folder + "/state.db"; }
     std::string staging() const { return folder + "/staging"; }
     std::string kept() const { return folder + "/kept"; }
+    /// Which of the database's states was the last one.
+    std::string session() const { return folder + "/session"; }
     std::string values() const { return folder + "/keyvalue.json"; }
     std::string lock() const { return folder + "/lock"; }
 };
