@@ -118,7 +118,7 @@ std::optional<SyncExecutor::Work> SyncExecutor::prepare(const SyncStep& step) {
 }
 
 void SyncExecutor::carryOut(const SyncStep& step) {
-    const std::optional<Work> work = prepare(step);
+    std::optional<Work> work = prepare(step);
     if (!work)
         return;
     CancelFlag cancel;
@@ -140,7 +140,7 @@ void SyncExecutor::carryOut(const SyncStep& step) {
     note(*work, failure);
 }
 
-Failure SyncExecutor::make(const Work& work, CancelFlag& cancel) {
+Failure SyncExecutor::make(Work& work, CancelFlag& cancel) {
     std::string aside;
     switch (work.step.kind) {
     case StepKind::adopt:
@@ -178,7 +178,7 @@ Failure SyncExecutor::make(const Work& work, CancelFlag& cancel) {
 void SyncExecutor::note(const Work& work, const Failure& failure) {
     const std::lock_guard lock(mutex_);
     if (!failure) {
-        ++outcome_.done;
+        outcome_.done += work.leftOut ? 0 : 1;
         return;
     }
     if (stopsEverything(*failure)) {
@@ -267,13 +267,15 @@ Failure SyncExecutor::adopt(const Work& work) {
     return std::nullopt;
 }
 
-Failure SyncExecutor::merge(const Work& work) {
+Failure SyncExecutor::merge(Work& work) {
     Failure failure;
     context_.queue.sync([&] {
         StateDatabase& database = context_.database;
         const std::optional<ItemState> other = database.state(work.step.other);
-        if (!other || other->local || !other->remote)
+        if (!other || other->local || !other->remote) {
+            failure = leaveOut(work);
             return;
+        }
         const LocalRow row = *work.state.local;
         failure = database.transaction([&]() -> Failure {
             database.removeLocal(work.step.item);

@@ -9,6 +9,7 @@
 #include <functional>
 #include <map>
 #include <mutex>
+#include <optional>
 #include <set>
 
 namespace platform {
@@ -22,14 +23,14 @@ class RateLimiter;
 class SyncExecutor {
 public:
     struct Outcome {
-        /// Steps that changed something.
+        /// Steps that were made. One whose reason or whose folder is not there is none of them.
         std::size_t done = 0;
         /// The remote has something else in these folders than was known.
         std::set<ItemId> outdated;
         /// The disk has.
         bool diskChanged = false;
-        /// A file is still being written to.
-        bool unsettled = false;
+        /// A file is still being written to; when that may be over.
+        std::optional<Duration> settlesIn;
         /// Why nothing more can be done at all: the remote is away, or somebody cancelled.
         Failure stopped;
         std::map<ItemId, Error> failed;
@@ -48,6 +49,8 @@ private:
         ItemState state;
         std::string localPath;  // relative; of what is on the disk
         std::string remotePath; // of what is on the remote
+        /// Nothing was made: something else has to come first, or the reason is gone.
+        bool leftOut = false;
     };
     struct Staged {
         std::string name;
@@ -57,35 +60,43 @@ private:
 
     void carryOut(const SyncStep& step);
     std::optional<Work> prepare(const SyncStep& step);
-    Failure make(const Work& work, CancelFlag& cancel);
+    Failure make(Work& work, CancelFlag& cancel);
     void note(const Work& work, const Failure& failure);
+    static Failure leaveOut(Work& work) {
+        work.leftOut = true;
+        return std::nullopt;
+    }
     bool isStopped();
 
     // Records.
     Failure adopt(const Work& work);
-    Failure merge(const Work& work);
+    Failure merge(Work& work);
     Failure forget(const Work& work);
     /// The content on the disk is the one that was agreed on after all.
     Failure refreshBase(const Work& work, const FileAttributes& attributes);
 
     // The disk; see SyncExecutorDisk.cpp.
-    Failure arrive(const Work& work, CancelFlag& cancel);
-    Failure moveHere(const Work& work);
+    Failure arrive(Work& work, CancelFlag& cancel);
+    Failure moveHere(Work& work);
     Failure moveOnDisk(const std::string& from, const std::string& to);
     /// `before` hears of each name that is tried.
     Failure moveAside(const Work& work, std::string& place,
                       const std::function<Failure(const std::string& name)>& before);
-    Failure keep(const Work& work);
-    Failure keepNow(const Work& work);
+    Failure keep(Work& work);
+    Failure keepNow(Work& work);
+    Failure keepFileNow(const Work& work, const std::string& path);
+    Failure keepFolderNow(Work& work, const std::string& path);
+    bool holdsNoItem(ItemId folder, const std::string& path);
+    bool isSpareCopy(const std::string& sidecar);
     bool isAsRecorded(const Work& work, const std::string& path);
 
     // The remote; see SyncExecutorRemote.cpp.
-    Failure makeFolder(const Work& work, CancelFlag& cancel);
-    Failure moveThere(const Work& work, CancelFlag& cancel);
+    Failure makeFolder(Work& work, CancelFlag& cancel);
+    Failure moveThere(Work& work, CancelFlag& cancel);
     Failure removeThere(const Work& work, CancelFlag& cancel);
-    Failure upload(const Work& work, CancelFlag& cancel);
-    Failure uploadChange(const Work& work, CancelFlag& cancel);
-    Failure send(const Work& work, const std::string& path, const Place& place,
+    Failure upload(Work& work, CancelFlag& cancel);
+    Failure uploadChange(Work& work, CancelFlag& cancel);
+    Failure send(Work& work, const std::string& path, const Place& place,
                  const RemoteCondition& condition, CancelFlag& cancel);
 
     // Contents that come; see SyncExecutorContents.cpp.

@@ -8,6 +8,8 @@
 #include "platform/files/FileCoordinator.h"
 #include "platform/files/PathText.h"
 
+#include <algorithm>
+
 namespace platform {
 namespace {
 
@@ -18,9 +20,15 @@ std::string joined(const std::string& folder, const std::string& name) {
     return folder.empty() ? name : folder + '/' + name;
 }
 
+/// Whoever wrote the row saw this content, wherever it lies now.
+bool isContentOf(const LocalRow& row, const FileAttributes& attributes) {
+    return attributes.kind == FileKind::file && attributes.identity == row.identity &&
+           attributes.size == row.size && attributes.modified == row.modified;
+}
+
 } // namespace
 
-Failure SyncExecutor::arrive(const Work& work, CancelFlag& cancel) {
+Failure SyncExecutor::arrive(Work& work, CancelFlag& cancel) {
     const RemoteRow& row = *work.state.remote;
     Arrivals::Spot spot;
     std::optional<std::string> folder;
@@ -29,7 +37,7 @@ Failure SyncExecutor::arrive(const Work& work, CancelFlag& cancel) {
                                               : context_.database.localPathOf(row.place.parent);
     });
     if (!folder)
-        return std::nullopt; // its folder comes first
+        return leaveOut(work); // its folder comes first
     spot.folder = row.place.parent;
     spot.relative = *folder;
     spot.path = context_.pathOf(*folder);
@@ -47,7 +55,7 @@ Failure SyncExecutor::arrive(const Work& work, CancelFlag& cancel) {
     if (outcome->refused)
         return makeErrorWithText(ErrorCode::invalidFilename, *outcome->refused);
     if (!outcome->local || outcome->item != work.step.item)
-        return std::nullopt;
+        return leaveOut(work);
     Failure failure;
     context_.queue.sync([&] {
         failure = context_.database.transaction([&]() -> Failure {
@@ -75,7 +83,7 @@ Failure SyncExecutor::moveOnDisk(const std::string& from, const std::string& to)
     return refused ? refused : moving;
 }
 
-Failure SyncExecutor::moveHere(const Work& work) {
+Failure SyncExecutor::moveHere(Work& work) {
     std::optional<std::string> folder;
     context_.queue.sync([&] {
         folder = work.step.to.parent == rootItem
@@ -83,7 +91,7 @@ Failure SyncExecutor::moveHere(const Work& work) {
                      : context_.database.localPathOf(work.step.to.parent);
     });
     if (!folder)
-        return std::nullopt;
+        return leaveOut(work);
     return moveOnDisk(work.localPath, joined(*folder, work.step.to.name));
 }
 
@@ -111,11 +119,69 @@ Failure SyncExecutor::moveAside(const Work& work, std::string& place,
 bool SyncExecutor::isAsRecorded(const Work& work, const std::string& path) {
     const Result<FileAttributes> now = context_.disk.attributes(path);
     const LocalRow& row = *work.state.local;
-    return now && now->kind == FileKind::file && now->identity == row.identity &&
-           now->size == row.size && now->modified == row.modified && now->changed == row.changed;
+    return now && isContentOf(row, *now) && now->changed == row.changed;
 }
 
-Failure SyncExecutor::keep(const Work& work) {
+Failure SyncExecutor::keepFileNow(const Work& work, const std::string& path) {
+    const Error changed = makeError(ErrorCode::changedWhileRead, nameOf(path));
+    if (!isAsRecorded(work, path))
+        return changed;
+    KeptFolder kept(context_);
+    const Result<std::string> taken = kept.take(work.localPath, false);
+    if (!taken)
+        return taken.error();
+    const Result<FileAttributes> now = context_.disk.attributes(*taken);
+    if (now && isContentOf(*work.state.local, *now))
+        return std::nullopt;
+    // Somebody saved in the last moment: an edit beats a deletion.
+    if (context_.disk.rename(*taken, path))
+        if (const auto unsent = kept.takeFrom(*taken, work.localPath, true); !unsent)
+            return unsent.error();
+    return changed;
+}
+
+/// Empty, or with nothing in it but what the store does not take as items: that stays the user's.
+Failure SyncExecutor::keepFolderNow(Work& work, const std::string& path) {
+    if (context_.database.treeOf(work.step.item, Side::local).size() != 1)
+        return leaveOut(work); // what is in it is somebody's; it is planned again
+    const Failure failure = context_.disk.removeFolder(path);
+    if (!failure || !failure->is(ErrorCode::folderNotEmpty))
+        return failure;
+    if (!holdsNoItem(work.step.item, path))
+        return makeError(ErrorCode::changedWhileRead, nameOf(path));
+    const Result<std::string> kept = KeptFolder(context_).take(work.localPath, true);
+    return kept ? Failure() : Failure(kept.error());
+}
+
+bool SyncExecutor::holdsNoItem(ItemId folder, const std::string& path) {
+    const Result<std::vector<DirectoryEntry>> entries = context_.disk.entries(path);
+    if (!entries)
+        return false;
+    std::set<std::string> refused;
+    for (const RefusedRow& row : context_.database.refused(folder, Side::local))
+        refused.insert(row.name);
+    return std::all_of(entries->begin(), entries->end(), [&](const DirectoryEntry& entry) {
+        return refused.contains(entry.name) || isSpareCopy(path + '/' + entry.name);
+    });
+}
+
+/// Of a promise that is where the records have it, or of an item that is forgotten.
+bool SyncExecutor::isSpareCopy(const std::string& sidecar) {
+    const std::optional<SidecarMark> mark = readMark(sidecar, context_.mark);
+    if (!mark)
+        return false;
+    if (!context_.database.state(mark->item))
+        return true;
+    const std::optional<std::string> own = context_.database.localPathOf(mark->item);
+    if (!own)
+        return false;
+    const std::string document = context_.pathOf(*own);
+    const auto found =
+        findSidecar(std::string(folderOf(document)), nameOf(document), context_.mark);
+    return found && found->mark.item == mark->item && found->path != sidecar;
+}
+
+Failure SyncExecutor::keep(Work& work) {
     FileCoordinator coordinator;
     Failure keeping;
     Failure refused = coordinator.coordinateWriting(
@@ -125,33 +191,25 @@ Failure SyncExecutor::keep(const Work& work) {
 }
 
 /// On the store's queue.
-Failure SyncExecutor::keepNow(const Work& work) {
+Failure SyncExecutor::keepNow(Work& work) {
     const std::string path = context_.pathOf(work.localPath);
     const Error changed = makeError(ErrorCode::changedWhileRead, nameOf(path));
     if (context_.database.localPathOf(work.step.item) != work.localPath)
         return changed;
     Failure failure;
     if (work.state.local->promise) {
-        const auto sidecar = findSidecar(std::string(folderOf(path)), nameOf(path), context_.mark);
-        if (sidecar && sidecar->mark.item == work.step.item)
-            failure = context_.disk.removeFile(sidecar->path);
+        const auto sidecar =
+            examineSidecar(std::string(folderOf(path)), nameOf(path), context_.mark);
+        if (!sidecar)
+            return sidecar.error();
+        if (*sidecar && (*sidecar)->mark.item == work.step.item)
+            failure = context_.disk.removeFile((*sidecar)->path);
     } else if (work.state.item.kind == ItemKind::folder) {
-        const bool empty = context_.database.treeOf(work.step.item, Side::local).size() == 1;
-        if (!empty)
-            return std::nullopt; // what is in it is somebody's; it is planned again
-        failure = context_.disk.removeFolder(path);
-        // What the store does not take as an item stays the user's.
-        if (failure && failure->is(ErrorCode::folderNotEmpty)) {
-            const Result<std::string> kept = KeptFolder(context_).take(work.localPath, true);
-            failure = kept ? Failure() : Failure(kept.error());
-        }
-    } else if (!isAsRecorded(work, path)) {
-        return changed;
+        failure = keepFolderNow(work, path);
     } else {
-        const Result<std::string> kept = KeptFolder(context_).take(work.localPath, false);
-        failure = kept ? Failure() : Failure(kept.error());
+        failure = keepFileNow(work, path);
     }
-    if (failure)
+    if (failure || work.leftOut)
         return failure;
     return context_.database.transaction([&]() -> Failure {
         context_.database.removeBase(work.step.item);

@@ -7,10 +7,10 @@
 
 namespace platform {
 
-Failure SyncExecutor::makeFolder(const Work& work, CancelFlag& cancel) {
+Failure SyncExecutor::makeFolder(Work& work, CancelFlag& cancel) {
     const std::optional<std::string> path = remotePlace(work.state.local->place);
     if (!path)
-        return std::nullopt; // the folder above comes first
+        return leaveOut(work); // the folder above comes first
     const Result<RemoteEntry> made = context_.remote.makeFolder(*path, cancel);
     if (!made)
         return made.error();
@@ -31,10 +31,10 @@ Failure SyncExecutor::makeFolder(const Work& work, CancelFlag& cancel) {
     return failure;
 }
 
-Failure SyncExecutor::moveThere(const Work& work, CancelFlag& cancel) {
+Failure SyncExecutor::moveThere(Work& work, CancelFlag& cancel) {
     const std::optional<std::string> to = remotePlace(work.step.to);
     if (!to)
-        return std::nullopt;
+        return leaveOut(work);
     const bool folder = work.state.item.kind == ItemKind::folder;
     const Result<RemoteEntry> moved = context_.remote.move(
         work.remotePath, *to, folder ? std::string() : work.state.remote->etag, cancel);
@@ -62,20 +62,24 @@ Failure SyncExecutor::removeThere(const Work& work, CancelFlag& cancel) {
     Failure failure =
         context_.remote.remove(work.remotePath, work.state.item.kind,
                                folder ? std::string() : work.state.remote->etag, cancel);
-    if (failure && !failure->is(ErrorCode::noSuchItem))
+    // A folder that is not there may have been moved with all that is in it: a listing tells.
+    if (failure && (folder || !failure->is(ErrorCode::noSuchItem)))
         return failure;
     context_.queue.sync([&] {
-        failure = context_.database.transaction([&]() -> Failure {
-            // A folder that could be removed, or is not there, has nothing in it.
-            for (const ItemId item : context_.database.treeOf(work.step.item, Side::remote))
-                context_.database.removeRemote(item);
+        StateDatabase& database = context_.database;
+        failure = database.transaction([&]() -> Failure {
+            // A folder that could be removed had nothing in it any more.
+            for (const ItemId item : database.treeOf(work.step.item, Side::remote))
+                if (item != work.step.item)
+                    database.displaceRemote(item, work.state.remote->place.parent);
+            database.removeRemote(work.step.item);
             return std::nullopt;
         });
     });
     return failure;
 }
 
-Failure SyncExecutor::upload(const Work& work, CancelFlag& cancel) {
+Failure SyncExecutor::upload(Work& work, CancelFlag& cancel) {
     if (work.state.base && !work.state.base->hash.empty()) {
         // Deleted there: only a real edit is a reason to bring it back.
         const Result<LocalContent> content =
@@ -87,10 +91,10 @@ Failure SyncExecutor::upload(const Work& work, CancelFlag& cancel) {
     }
     const Place place = work.state.local->place;
     const std::optional<std::string> path = remotePlace(place);
-    return path ? send(work, *path, place, RemoteCondition::nameFree(), cancel) : std::nullopt;
+    return path ? send(work, *path, place, RemoteCondition::nameFree(), cancel) : leaveOut(work);
 }
 
-Failure SyncExecutor::uploadChange(const Work& work, CancelFlag& cancel) {
+Failure SyncExecutor::uploadChange(Work& work, CancelFlag& cancel) {
     const LocalRow& local = *work.state.local;
     const BaseRow& base = *work.state.base;
     if (local.size == base.size && local.modified == base.modified) {
@@ -106,7 +110,7 @@ Failure SyncExecutor::uploadChange(const Work& work, CancelFlag& cancel) {
                 RemoteCondition::version(work.state.remote->etag), cancel);
 }
 
-Failure SyncExecutor::send(const Work& work, const std::string& path, const Place& place,
+Failure SyncExecutor::send(Work& work, const std::string& path, const Place& place,
                            const RemoteCondition& condition, CancelFlag& cancel) {
     const std::string local = context_.pathOf(work.localPath);
     const Error changed = makeError(ErrorCode::changedWhileRead, nameOf(local));
@@ -127,8 +131,8 @@ Failure SyncExecutor::send(const Work& work, const std::string& path, const Plac
         return changed;
     if (isYoung(before->modified, context_.clock.now())) {
         const std::lock_guard lock(mutex_);
-        outcome_.unsettled = true;
-        return std::nullopt;
+        outcome_.settlesIn = settleTimeOf(before->modified);
+        return leaveOut(work);
     }
     ContentHash hash;
     std::uint64_t hashed = 0;

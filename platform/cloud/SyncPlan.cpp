@@ -151,8 +151,7 @@ bool Planner::survivesThere(const ItemState& folder) const {
 }
 
 bool Planner::isDamaged(const ItemState& state) const {
-    return options_.afterCrash && state.local && state.base && !state.base->hash.empty() &&
-           state.local->size == 0 && state.base->size > 0;
+    return options_.damaged.contains(state.item.id) && looksDamaged(state);
 }
 
 bool Planner::leavesHere(const ItemState& state) const {
@@ -375,6 +374,11 @@ std::vector<SyncStep> Planner::run() {
 }
 
 } // namespace
+
+bool looksDamaged(const ItemState& state) {
+    return state.local && !state.local->promise && state.local->size == 0 && state.base &&
+           !state.base->hash.empty() && state.base->size > 0;
+}
 
 std::vector<SyncStep> planSync(const SyncTrees& trees, const PlanOptions& options) {
     return Planner(trees, options).run();

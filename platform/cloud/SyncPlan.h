@@ -2,7 +2,7 @@
 
 #include "platform/cloud/SyncTrees.h"
 
-#include <functional>
+#include <set>
 #include <string>
 #include <vector>
 
@@ -41,10 +41,13 @@ struct SyncStep {
 };
 
 struct PlanOptions {
-    /// The machine may have stopped in the middle of writing: a file that has lost all its bytes
-    /// since is damage.
-    bool afterCrash = false;
+    /// Files that had lost all their bytes when the machine had stopped in the middle of writing:
+    /// that is damage, and no edit.
+    std::set<ItemId> damaged;
 };
+
+/// The content may be what is left of one that was being written when the machine stopped.
+bool looksDamaged(const ItemState& state);
 
 /// What can be done now, in an order in which it can be done. What has to wait for it is in a later
 /// plan. A pure function: depends on the trees alone. An empty plan means that they agree.

@@ -3,6 +3,7 @@
 #include "platform/base/Describe.h"
 #include "platform/base/Log.h"
 #include "platform/cloud/LocalScanner.h"
+#include "platform/cloud/SyncTimes.h"
 
 #include <algorithm>
 
@@ -17,6 +18,7 @@ constexpr int triesAtOnce = 3;
 /// How often a tree that changes while it is looked at is looked at again before that waits.
 constexpr int looksAtOnce = 4;
 constexpr const char* troubleKind = "sync";
+constexpr const char* damageKind = "damaged";
 
 bool onlyCameTooLate(const Error& error) {
     return error.is(ErrorCode::changedRemotely) || error.is(ErrorCode::changedWhileRead) ||
@@ -35,7 +37,9 @@ Synchronizer::Synchronizer(StoreContext& context, TransferQueue& transfers, Rate
       afterCrash_(afterCrash) {
     // Whatever failed for the program before is tried anew.
     for (const OpRow& op : context_.database.operations())
-        if (op.kind == troubleKind)
+        if (op.kind == damageKind)
+            damaged_.emplace(op.item, op.id);
+        else if (op.kind == troubleKind)
             troubles_.emplace(op.item, Trouble{Backoff(static_cast<std::uint64_t>(op.item)), op.id,
                                                op.tries, 0, Date{}});
 }
@@ -49,7 +53,7 @@ Synchronizer::Report Synchronizer::run(const Request& request) {
             trouble.nextAt = {};
         }
     }
-    if (request.lookAtDisk)
+    if (request.lookAtDisk || afterCrash_)
         report.failure = look(report);
     if (!report.failure && !report.question)
         report.failure = list(request.folders, request.everything);
@@ -61,9 +65,10 @@ Synchronizer::Report Synchronizer::run(const Request& request) {
     });
     if (!report.failure && !report.question)
         report.failure = carryOutAll(report);
-    for (const auto& [item, trouble] : troubles_)
-        if (!report.retryAt || trouble.nextAt < *report.retryAt)
-            report.retryAt = trouble.nextAt;
+    if (!report.failure && !report.question)
+        for (const auto& [item, trouble] : troubles_)
+            if (!report.retryAt || trouble.nextAt < *report.retryAt)
+                report.retryAt = trouble.nextAt;
     return report;
 }
 
@@ -74,9 +79,16 @@ Failure Synchronizer::look(Report& report) {
             return failure;
         if (scanner.again() && attempt < looksAtOnce)
             continue;
-        report.unsettled = report.unsettled || scanner.unsettled() || scanner.again();
         report.folders = scanner.folders();
-        return scanner.again() ? std::nullopt : settleLocal(scanner.vanished(), report);
+        report.settle(scanner.settlesIn());
+        if (scanner.again()) {
+            report.settle(settleTime);
+            return std::nullopt;
+        }
+        if (afterCrash_)
+            if (Failure failure = noteDamage())
+                return failure;
+        return settleLocal(scanner.vanished(), report);
     }
 }
 
@@ -90,7 +102,21 @@ Failure Synchronizer::list(const std::vector<ItemId>& folders, bool everything) 
 }
 
 std::vector<SyncStep> Synchronizer::plan() {
-    std::vector<SyncStep> steps = planSync(trees(), {afterCrash_});
+    if (!damaged_.empty())
+        forgetRepaired();
+    PlanOptions options;
+    for (const auto& [item, op] : damaged_)
+        options.damaged.insert(item);
+    std::vector<SyncStep> steps = planSync(trees(), options);
+    std::set<ItemId> wanted;
+    for (const SyncStep& step : steps)
+        wanted.insert(step.item);
+    std::vector<ItemId> over; // what failed, and need not be done any more
+    for (const auto& [item, trouble] : troubles_)
+        if (!wanted.contains(item))
+            over.push_back(item);
+    for (const ItemId item : over)
+        forgetTrouble(item);
     std::erase_if(steps, [this](const SyncStep& step) { return !mayTry(step.item); });
     return steps;
 }
@@ -141,17 +167,49 @@ Failure Synchronizer::carryOutAll(Report& report) {
             return failure;
         if (report.question || (outcome.done == 0 && outcome.failed.empty()))
             break;
-        if (outcome.unsettled && outcome.done + outcome.failed.size() == steps.size())
+        if (outcome.settlesIn && outcome.done + outcome.failed.size() == steps.size())
             break; // what is being written to is all that is left
     }
-    if (!report.question)
-        afterCrash_ = false;
     return std::nullopt;
+}
+
+Failure Synchronizer::noteDamage() {
+    Failure failure;
+    context_.queue.sync([&] {
+        StateDatabase& database = context_.database;
+        const std::vector<ItemState> states = database.disagreements();
+        failure = database.transaction([&]() -> Failure {
+            for (const ItemState& state : states)
+                if (looksDamaged(state) && isChangedHere(state) &&
+                    !damaged_.contains(state.item.id))
+                    damaged_[state.item.id] = database.putOperation(
+                        {0, state.item.id, damageKind, "", "", "", {}, 0, 0, {}, {}});
+            return std::nullopt;
+        });
+    });
+    if (!failure)
+        afterCrash_ = false;
+    return failure;
+}
+
+void Synchronizer::forgetRepaired() {
+    context_.queue.sync([&] {
+        StateDatabase& database = context_.database;
+        std::erase_if(damaged_, [&](const auto& damaged) {
+            const std::optional<ItemState> state = database.state(damaged.first);
+            if (state && looksDamaged(*state))
+                return false;
+            return !database.transaction([&]() -> Failure {
+                database.removeOperation(damaged.second);
+                return std::nullopt;
+            });
+        });
+    });
 }
 
 Failure Synchronizer::digest(SyncExecutor::Outcome& outcome, const std::vector<SyncStep>& steps,
                              Report& report) {
-    report.unsettled = report.unsettled || outcome.unsettled;
+    report.settle(outcome.settlesIn);
     for (const SyncStep& step : steps)
         if (const auto failed = outcome.failed.find(step.item); failed != outcome.failed.end())
             noteTrouble(step, failed->second);

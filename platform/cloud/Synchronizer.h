@@ -30,8 +30,8 @@ public:
     };
     struct Report {
         Failure failure;
-        /// Files that are being written to, or folders that could not be read: look again soon.
-        bool unsettled = false;
+        /// Files are being written to: look again after that time.
+        std::optional<Duration> settlesIn;
         /// Something is missing on the remote since one listing.
         bool secondLook = false;
         /// When something that failed is to be tried again.
@@ -40,6 +40,11 @@ public:
         /// Of the disk, relative to the store's root; empty when it was not looked at.
         std::vector<std::string> folders;
         std::size_t changes = 0;
+
+        void settle(std::optional<Duration> delay) {
+            if (delay && (!settlesIn || *settlesIn < *delay))
+                settlesIn = delay;
+        }
     };
 
     Synchronizer(StoreContext& context, TransferQueue& transfers, RateLimiter& limiter,
@@ -69,9 +74,13 @@ private:
     Failure settleRemote(bool commanded, Report& report);
     Failure ask(const DeletionQuestion& question, Report& report);
     Failure withdraw(Side side);
+    void forgetAnswer(Side side);
     bool isAlarming(const std::vector<ItemId>& items, Side side);
     Failure carryOutAll(Report& report);
     std::vector<SyncStep> plan();
+    /// What the disk has lost while the machine stopped; remembered until it is there again.
+    Failure noteDamage();
+    void forgetRepaired();
     SyncTrees trees();
     Failure digest(SyncExecutor::Outcome& outcome, const std::vector<SyncStep>& steps,
                    Report& report);
@@ -84,7 +93,8 @@ private:
     RemoteLister::Written written_;
     SyncExecutor executor_;
     std::map<ItemId, Trouble> troubles_;
-    bool afterCrash_ = false;
+    bool afterCrash_ = false;                // and not looked for damage yet
+    std::map<ItemId, std::int64_t> damaged_; // with the operation that tells of it
 };
 
 } // namespace platform

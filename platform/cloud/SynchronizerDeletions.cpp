@@ -73,15 +73,26 @@ bool Synchronizer::isAlarming(const std::vector<ItemId>& items, Side side) {
     return false;
 }
 
-/// What was asked about is there again.
+/// Nothing is missing on that side any more: neither a question nor an answer stands.
 Failure Synchronizer::withdraw(Side side) {
-    const std::optional<DeletionQuestion> asked = question(context_.database);
-    if (!asked || asked->side != side)
+    StateDatabase& database = context_.database;
+    const std::optional<DeletionQuestion> asked = question(database);
+    const bool stands = asked && asked->side == side;
+    if (!stands && database.meta(permissionKey) != nameOf(side) &&
+        database.meta(putBackKey) != nameOf(side))
         return std::nullopt;
-    return context_.database.transaction([&]() -> Failure {
-        context_.database.setMeta(questionKey, "");
+    return database.transaction([&]() -> Failure {
+        if (stands)
+            database.setMeta(questionKey, "");
+        forgetAnswer(side);
         return std::nullopt;
     });
+}
+
+void Synchronizer::forgetAnswer(Side side) {
+    for (const std::string_view key : {permissionKey, putBackKey})
+        if (context_.database.meta(key) == nameOf(side))
+            context_.database.setMeta(key, "");
 }
 
 Failure Synchronizer::settleLocal(const std::vector<ItemId>& vanished, Report& report) {
@@ -104,8 +115,7 @@ Failure Synchronizer::settleLocal(const std::vector<ItemId>& vanished, Report& r
                 if (putBack) // nothing was agreed on: what the remote has arrives anew
                     database.removeBase(item);
             }
-            database.setMeta(permissionKey, "");
-            database.setMeta(putBackKey, "");
+            forgetAnswer(Side::local);
             return std::nullopt;
         });
     });
@@ -151,8 +161,7 @@ Failure Synchronizer::settleRemote(bool commanded, Report& report) {
                 if (putBack)
                     database.removeBase(item);
             }
-            database.setMeta(permissionKey, "");
-            database.setMeta(putBackKey, "");
+            forgetAnswer(Side::remote);
             return std::nullopt;
         });
     });

@@ -142,8 +142,8 @@ TEST(Plan, OfOneFileFollowsTheTable) {
 TEST(Plan, AFileThatLostItsBytesInACrashIsNoEdit) {
     Item item = file(one).here(r, "x", 'b').there(r, "x", 'a').agreed(r, "x", 'a');
     item.state.local->size = 0;
-    EXPECT_EQ(planOf({item}, {true}), Plan{"download 10"});
-    EXPECT_EQ(planOf({item}, {false}), Plan{"upload change 10"});
+    EXPECT_EQ(planOf({item}, {{10}}), Plan{"download 10"});
+    EXPECT_EQ(planOf({item}, {}), Plan{"upload change 10"});
 }
 
 TEST(Plan, FoldersAreMadeBeforeAndDeletedAfterWhatIsInThem) {
