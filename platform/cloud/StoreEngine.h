@@ -116,7 +116,9 @@ private:
     std::shared_ptr<Synchronizer> synchronizer() const;
 
     // On the listing queue.
-    Failure synchronize(const Synchronizer::Request& request);
+    Synchronizer::Report synchronize(const Synchronizer::Request& request);
+    /// What is being written to is waited for, so many times.
+    void syncNow(Done done, int times);
     void plan(const Synchronizer::Report& report);
     void watchFolders(const std::vector<std::string>& folders);
     void watchRemote();
@@ -147,11 +149,12 @@ private:
 
     mutable std::mutex mutex_;
     std::condition_variable unused_;
-    int uses_ = 0; // guarded by mutex_, as are the next eleven
+    int uses_ = 0; // guarded by mutex_, as are the next twelve
     std::shared_ptr<Synchronizer> synchronizer_;
     std::optional<DeletionQuestion> question_;
     std::optional<Synchronizer::Request> wanted_;
     std::map<Alarm, Pending> alarms_;
+    Date nextLook_; // because of a notice
     std::optional<std::string> problem_;
     std::optional<std::string> notice_; // what had to be done at the start
     std::shared_ptr<Transfers> transfers_;

@@ -141,8 +141,9 @@ Failure StoreEngine::refreshNow(const std::optional<Url>& folder) {
         });
     if (!item)
         return makeError(ErrorCode::noSuchItem, folder->lastPathComponent());
-    return synchronize(
-        {false, !folder, folder ? std::vector{*item} : std::vector<ItemId>{}, !folder, false});
+    return synchronize({false, !folder, folder ? std::vector{*item} : std::vector<ItemId>{},
+                        !folder, false})
+        .failure;
 }
 
 void StoreEngine::freeBytes(std::function<void(const Result<std::uint64_t>&)> done) {

@@ -9,6 +9,13 @@
 namespace platform {
 namespace {
 
+/// After a look the engine rests for so many times as long as it took, at most so long.
+constexpr std::int64_t restFactor = 2;
+constexpr Duration longestRest = std::chrono::seconds(10);
+
+/// How often a command waits until what is being written to may be read.
+constexpr int settlingAtMost = 5;
+
 /// Both wishes in one.
 void merge(Synchronizer::Request& into, const Synchronizer::Request& other) {
     into.commanded = into.commanded || other.commanded;
@@ -50,6 +57,10 @@ void StoreEngine::wantAfter(Alarm alarm, Duration delay, const Synchronizer::Req
         merge(pending.request, wanted);
         return;
     }
+    if (alarm == Alarm::notice) // of a file that is written to all the time there is no end
+        delay = std::clamp<Duration>(
+            Duration(nextLook_.nanoseconds - services_.clock.now().nanoseconds), delay,
+            longestRest);
     services_.clock.cancelAlarm(pending.id);
     pending.request = wanted;
     pending.id = services_.clock.setAlarm(delay, [weak = weak_from_this(), alarm] {
@@ -75,22 +86,31 @@ void StoreEngine::runWanted() {
         return;
     Failure failure = followRemote();
     if (!failure || !concernsWholeStore(*failure))
-        failure = synchronize(request);
+        failure = synchronize(request).failure;
     if (!failure || concernsWholeStore(*failure))
         setProblem(failure);
 }
 
-Failure StoreEngine::synchronize(const Synchronizer::Request& request) {
+Synchronizer::Report StoreEngine::synchronize(const Synchronizer::Request& request) {
     const std::shared_ptr<Synchronizer> synchronizer = this->synchronizer();
-    if (!synchronizer)
-        return notOpen();
+    if (!synchronizer) {
+        Synchronizer::Report closed;
+        closed.failure = notOpen();
+        return closed;
+    }
+    const Date begun = services_.clock.now();
     const Synchronizer::Report report = synchronizer->run(request);
+    if (request.lookAtDisk) {
+        const Date ended = services_.clock.now();
+        const std::lock_guard lock(mutex_);
+        nextLook_ = Date{ended.nanoseconds + (ended.nanoseconds - begun.nanoseconds) * restFactor};
+    }
     if (report.failure && report.failure->is(ErrorCode::serverNotAvailable)) {
         connected_ = false;
         followed_ = false;
     }
     plan(report);
-    return report.failure;
+    return report;
 }
 
 /// What comes after a run.
@@ -106,16 +126,20 @@ void StoreEngine::plan(const Synchronizer::Report& report) {
         else
             publish();
     });
+    bool news = false;
     {
         const std::lock_guard lock(mutex_);
+        news = question_ != report.question;
         question_ = report.question;
     }
+    if (news)
+        services_.conditionChanged();
     if (!report.folders.empty())
         watchFolders(report.folders);
     watchRemote();
     const Synchronizer::Request disk{false, true, {}, false, false};
-    if (report.unsettled)
-        wantAfter(Alarm::settle, coarseSettleTime, disk);
+    if (report.settlesIn)
+        wantAfter(Alarm::settle, *report.settlesIn, disk);
     if (report.secondLook)
         wantAfter(Alarm::secondLook, secondLookDelay, {false, false, {}, false, true});
     if (report.retryAt)
@@ -184,15 +208,31 @@ void StoreEngine::watchRemote() {
 }
 
 void StoreEngine::sync(Done done) {
-    listing_->async([this, done = std::move(done)] {
+    syncNow(std::move(done), settlingAtMost);
+}
+
+void StoreEngine::syncNow(Done done, int times) {
+    listing_->async([this, done = std::move(done), times] {
         queue_->sync([] {}); // an opening that is under way comes first
         Failure failure = transfers() ? followRemote() : Failure(notOpen());
-        if (transfers() && (!failure || !concernsWholeStore(*failure)))
-            failure = synchronize({true, true, {}, true, false});
+        std::optional<Duration> settlesIn;
+        if (transfers() && (!failure || !concernsWholeStore(*failure))) {
+            const Synchronizer::Report report = synchronize({true, true, {}, true, false});
+            failure = report.failure;
+            settlesIn = report.question ? std::nullopt : report.settlesIn;
+        }
         if (transfers() && (!failure || concernsWholeStore(*failure)))
             setProblem(failure);
-        if (done)
+        if (!failure && settlesIn && times > 0) {
+            services_.clock.setAlarm(*settlesIn, [weak = weak_from_this(), done, times] {
+                if (const std::shared_ptr<StoreEngine> self = weak.lock())
+                    self->syncNow(done, times - 1);
+                else if (done)
+                    done(makeError(ErrorCode::userCancelled));
+            });
+        } else if (done) {
             done(failure);
+        }
     });
 }
 

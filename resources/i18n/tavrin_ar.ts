@@ -844,8 +844,20 @@
         <translation>يقع على قرص غير قرص مجلد الحساب.</translation>
     </message>
     <message>
-        <source>It took the place of something else on the account.</source>
-        <translation>حلّ محل شيء آخر في الحساب.</translation>
+        <source>It lies on another disk than the store.</source>
+        <translation>إنه على قرص غير قرص المخزن.</translation>
+    </message>
+    <message>
+        <source>%1$@ items have vanished from this device. Nothing is deleted on your account until you say so: quit this program and run “pelmora sync --delete” to delete them there as well, or “pelmora sync --put-back” to bring them back.</source>
+        <translation>عدد العناصر التي اختفت من هذا الجهاز: %1$@. لن يُحذف شيء من حسابك حتى تقرّر ذلك: أغلق البرنامج ونفّذ «pelmora sync --delete» لحذفها هناك أيضًا، أو «pelmora sync --put-back» لاستعادتها.</translation>
+    </message>
+    <message>
+        <source>%1$@ items have vanished from your account. Nothing is deleted on this device until you say so: quit this program and run “pelmora sync --delete” to delete them here as well, or “pelmora sync --put-back” to bring them back.</source>
+        <translation>عدد العناصر التي اختفت من حسابك: %1$@. لن يُحذف شيء من هذا الجهاز حتى تقرّر ذلك: أغلق البرنامج ونفّذ «pelmora sync --delete» لحذفها هنا أيضًا، أو «pelmora sync --put-back» لاستعادتها.</translation>
+    </message>
+    <message>
+        <source>The folder “%1$@” is not there. Connect its disk; nothing was changed.</source>
+        <translation>المجلد «%1$@» غير موجود. صِل قرصه؛ لم يتغيّر شيء.</translation>
     </message>
     <message>
         <source>The disk cannot have an item of that name.</source>

@@ -816,8 +816,20 @@
         <translation>Es liegt auf einem anderen Laufwerk als der Ordner des Kontos.</translation>
     </message>
     <message>
-        <source>It took the place of something else on the account.</source>
-        <translation>Es hat im Konto die Stelle von etwas anderem eingenommen.</translation>
+        <source>It lies on another disk than the store.</source>
+        <translation>Es liegt auf einem anderen Datenträger als die Ablage.</translation>
+    </message>
+    <message>
+        <source>%1$@ items have vanished from this device. Nothing is deleted on your account until you say so: quit this program and run “pelmora sync --delete” to delete them there as well, or “pelmora sync --put-back” to bring them back.</source>
+        <translation>%1$@ Objekte sind von diesem Gerät verschwunden. Im Konto wird nichts gelöscht, bis Sie es sagen: Beenden Sie das Programm und führen Sie „pelmora sync --delete“ aus, um sie auch dort zu löschen, oder „pelmora sync --put-back“, um sie zurückzuholen.</translation>
+    </message>
+    <message>
+        <source>%1$@ items have vanished from your account. Nothing is deleted on this device until you say so: quit this program and run “pelmora sync --delete” to delete them here as well, or “pelmora sync --put-back” to bring them back.</source>
+        <translation>%1$@ Objekte sind aus Ihrem Konto verschwunden. Auf diesem Gerät wird nichts gelöscht, bis Sie es sagen: Beenden Sie das Programm und führen Sie „pelmora sync --delete“ aus, um sie auch hier zu löschen, oder „pelmora sync --put-back“, um sie zurückzuholen.</translation>
+    </message>
+    <message>
+        <source>The folder “%1$@” is not there. Connect its disk; nothing was changed.</source>
+        <translation>Der Ordner „%1$@“ ist nicht da. Schließen Sie seinen Datenträger an; es wurde nichts geändert.</translation>
     </message>
     <message>
         <source>The disk cannot have an item of that name.</source>

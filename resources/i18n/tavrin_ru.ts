@@ -823,8 +823,20 @@
         <translation>Объект находится не на том диске, где папка учётной записи.</translation>
     </message>
     <message>
-        <source>It took the place of something else on the account.</source>
-        <translation>Объект занял в учётной записи место другого.</translation>
+        <source>It lies on another disk than the store.</source>
+        <translation>Объект находится не на том диске, на котором хранилище.</translation>
+    </message>
+    <message>
+        <source>%1$@ items have vanished from this device. Nothing is deleted on your account until you say so: quit this program and run “pelmora sync --delete” to delete them there as well, or “pelmora sync --put-back” to bring them back.</source>
+        <translation>Объектов, пропавших с этого устройства: %1$@. В учётной записи ничего не будет удалено без вашего указания: закройте программу и выполните «pelmora sync --delete», чтобы удалить их и там, или «pelmora sync --put-back», чтобы вернуть их.</translation>
+    </message>
+    <message>
+        <source>%1$@ items have vanished from your account. Nothing is deleted on this device until you say so: quit this program and run “pelmora sync --delete” to delete them here as well, or “pelmora sync --put-back” to bring them back.</source>
+        <translation>Объектов, пропавших из вашей учётной записи: %1$@. На этом устройстве ничего не будет удалено без вашего указания: закройте программу и выполните «pelmora sync --delete», чтобы удалить их и здесь, или «pelmora sync --put-back», чтобы вернуть их.</translation>
+    </message>
+    <message>
+        <source>The folder “%1$@” is not there. Connect its disk; nothing was changed.</source>
+        <translation>Папки «%1$@» нет на месте. Подключите её диск; ничего не было изменено.</translation>
     </message>
     <message>
         <source>The disk cannot have an item of that name.</source>
