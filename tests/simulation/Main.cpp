@@ -5,8 +5,9 @@
 #include <cstdlib>
 #include <string>
 
-// simulation [SEEDS [FIRST]]: runs so many seeds from that one on. A failing one is printed, with
-// its story, and run again by "simulation 1 SEED".
+// simulation [SEEDS [FIRST]]: runs so many seeds from that one on; without a number as many as
+// TAVRIN_SIMULATION_SEEDS says. A failing one is printed, with its story and the way to run it
+// again.
 
 int main(int argc, char** argv) {
     const bool verbose = std::getenv("SIMULATION_VERBOSE") != nullptr;
@@ -14,7 +15,8 @@ int main(int argc, char** argv) {
                           [](int, const std::string& message, const std::source_location&) {
                               std::fprintf(stderr, "%s\n", message.c_str());
                           }});
-    const unsigned long count = argc > 1 ? std::strtoul(argv[1], nullptr, 10) : 500;
+    const char* const wanted = argc > 1 ? argv[1] : std::getenv("TAVRIN_SIMULATION_SEEDS");
+    const unsigned long count = wanted ? std::strtoul(wanted, nullptr, 10) : 10'000;
     const unsigned long first = argc > 2 ? std::strtoul(argv[2], nullptr, 10) : 1;
     int failures = 0;
     for (unsigned long seed = first; seed < first + count; ++seed) {
@@ -25,6 +27,8 @@ int main(int argc, char** argv) {
         std::printf("seed %lu: %s\n", seed, fault->c_str());
         for (const std::string& line : world.story())
             std::printf("    %s\n", line.c_str());
+        std::printf("    again: SIMULATION_VERBOSE=1 %s 1 %lu\n", argv[0], seed);
+        std::fflush(stdout);
         if (++failures == 5)
             break;
     }

@@ -67,6 +67,7 @@ World::World(std::uint64_t seed) : luck_(seed) {
     setup.attributes = luck_.percent(90);
     disk_ = std::make_shared<Disk>(setup, [] { return machine().stamp(); });
     machine().mount("/sim/home", disk_);
+    machine().setListener(&trouble_);
     far_ = std::make_unique<FarSide>(habitsOf(luck_), [] { return machine().wall(); });
     line_.luck = luck_.split();
     line_.keepsLog = true;
@@ -81,6 +82,7 @@ World::World(std::uint64_t seed) : luck_(seed) {
 
 World::~World() {
     close();
+    machine().setListener(nullptr);
     files_.reset();
     machine().unmountAll();
     machine().time().forgetAlarms();
@@ -127,8 +129,11 @@ Synchronizer::Report World::synchronize(std::size_t turnsUntilStop) {
         return report;
     bool ended = false;
     std::thread thread([&] {
-        if (const Result<std::string> mark = remote_->connect(*cancel_); !mark)
+        const Result<std::string> mark = remote_->connect(*cancel_);
+        if (!mark)
             report.failure = mark.error();
+        else if (*mark != SimRemote::mark) // as the owner of the engine sees to
+            report.failure = makeError(ErrorCode::serverNotAvailable);
         else
             report = synchronizer_->run({true, true, {}, true, false});
         ended = true;
@@ -142,10 +147,19 @@ Synchronizer::Report World::synchronize(std::size_t turnsUntilStop) {
             synchronizer_->cancel();
         }
     }
+    while (busyUsers_ && !ended && !off_) {
+        Fibers::shared().run(1 + luck_.below(2000), [&] { return ended; });
+        if (!ended && luck_.percent(30))
+            actMeanwhile();
+        else if (Fibers::shared().allWait())
+            break;
+    }
     thread.join();
     for (std::string& change : line_.log)
         tell("  on the far side: " + std::move(change));
     line_.log.clear();
+    for (std::string& call : std::exchange(trouble_.failed, {}))
+        tell("  failed: " + std::move(call));
     return report;
 }
 
@@ -189,18 +203,23 @@ std::optional<std::string> World::run() {
     for (int round = 0; round < rounds; ++round) {
         for (std::uint64_t i = luck_.below(7); i > 0; --i)
             act();
-        line_.faults.clear();
-        for (std::uint64_t i = luck_.percent(50) ? luck_.below(5) : 0; i > 0; --i)
-            line_.faults[luck_.below(40)] = {static_cast<FarFault::Kind>(luck_.below(4)),
-                                             luck_.percent(50) ? ErrorCode::serverNotAvailable
-                                                               : ErrorCode::timedOut};
+        if (!store_)
+            open();
+        chooseFaults();
         if (luck_.percent(25)) {
             crash();
         } else {
             tell("run");
             synchronize();
         }
+        endFaults();
         machine().time().creep(std::chrono::milliseconds(luck_.below(4000)));
+        if (luck_.percent(5)) {
+            tell("the clock is set");
+            machine().time().jump(std::chrono::seconds(luck_.between(-40000, 40000)));
+        }
+        if (luck_.percent(8))
+            harmDatabase();
         if (auto lost = missingContent())
             return lost;
     }
@@ -208,10 +227,13 @@ std::optional<std::string> World::run() {
 }
 
 std::optional<std::string> World::settle() {
-    line_.faults.clear();
     tell("nothing fails any more");
     for (int run = 0; run < runsUntilRest; ++run) {
         machine().time().creep(between);
+        if (!store_)
+            open();
+        if (!store_)
+            return "the store cannot be opened";
         const Synchronizer::Report report = synchronize();
         if (report.failure)
             tell("run: " + report.failure->localizedDescription.value_or("") + " " +

@@ -5,6 +5,7 @@
 #include "platform/cloud/Synchronizer.h"
 #include "platform/cloud/Transfers.h"
 #include "platform/files/Progress.h"
+#include "tests/simulation/DiskTrouble.h"
 #include "tests/simulation/far/SimRemote.h"
 #include "tests/simulation/machine/Disk.h"
 
@@ -34,6 +35,9 @@ public:
 private:
     // Users.
     void act();
+    /// While the engine works: between any two of its steps.
+    void actMeanwhile();
+    bool holdsPromise(const std::string& path) const;
     void actHere();
     void actThere();
     void writeHere(const std::string& path);
@@ -51,6 +55,12 @@ private:
     void fetchOne();
     void crash();
 
+    // What goes wrong; see WorldFaults.cpp.
+    void chooseFaults();
+    void endFaults();
+    void harmDatabase();
+    void copyDatabase(const std::string& from, const std::string& to);
+
     // The oracle.
     std::optional<std::string> settle();
     std::optional<std::string> missingContent();
@@ -65,6 +75,9 @@ private:
     std::unique_ptr<FarSide> far_;
     FarLine line_;
     std::vector<std::string> story_;
+    DiskTrouble trouble_;
+    bool busyUsers_ = false;                       // they do not wait until the engine rests
+    bool hasYesterday_ = false;                    // a copy of the database
     std::set<std::string> wanted_;                 // contents that nobody gave up
     std::map<std::string, std::string> lastThere_; // contents of the far side after the last run
     int lastContent_ = 0;

@@ -4,6 +4,7 @@
 #include "platform/files/PathText.h"
 #include "tests/simulation/machine/Machine.h"
 
+#include <algorithm>
 #include <fcntl.h>
 #include <unistd.h>
 
@@ -38,6 +39,23 @@ void World::act() {
     else
         actThere();
     Machine::shared().time().creep(std::chrono::milliseconds(luck_.below(1500)));
+}
+
+void World::actMeanwhile() {
+    if (luck_.percent(50))
+        actHere();
+    else
+        actThere();
+}
+
+bool World::holdsPromise(const std::string& path) const {
+    bool folder = false;
+    if (!FileManager::exists(path, &folder) || !folder)
+        return false;
+    const auto entries = FileManager::entries(path);
+    return !entries || std::any_of(entries->begin(), entries->end(), [&](const auto& entry) {
+        return hasSidecarForm(entry.name) || holdsPromise(path + '/' + entry.name);
+    });
 }
 
 namespace {
@@ -86,6 +104,9 @@ void World::actHere() {
             tell("move here " + path + " to " + other);
         break;
     case 4:
+        // What a promise stands for at this very moment only the engine knows.
+        if (busyUsers_ && holdsPromise(path))
+            break;
         if (FileManager::exists(path) && path != layout_.root() + "/Documents") {
             tell("delete here " + path);
             releaseTreeHere(path);

@@ -109,7 +109,7 @@ Result<std::string> SimRemote::connect(CancelFlag& cancel) {
         return *failure;
     if (Failure failure = finish(call, cancel))
         return *failure;
-    return std::string(line_.otherDisk ? "another far side" : "the far side");
+    return std::string(line_.otherDisk ? "another far side" : mark);
 }
 
 Result<RemoteListing> SimRemote::list(const std::string& path, CancelFlag& cancel) {

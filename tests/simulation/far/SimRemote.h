@@ -48,6 +48,7 @@ struct FarLine {
 class SimRemote final : public platform::Remote {
 public:
     SimRemote(FarSide& far, FarLine& line) : far_(far), line_(line) {}
+    static constexpr const char* mark = "the far side";
 
     platform::Result<std::string> connect(platform::CancelFlag& cancel) override;
     platform::Result<platform::RemoteListing> list(const std::string& path,
