@@ -124,8 +124,11 @@ TEST_F(Download, endsBeforeTheProgramDoes) {
 }
 
 TEST_F(Download, tellsThatTheFileWentInTheMiddle) {
+    for (int i = 0; i < 4; ++i)
+        givenPromise("Other " + std::to_string(i), 10);
     givenRunningDownload();
-    fs::remove(remoteFile("Big.txt"));
+    // So much at once that nothing of it counts as deleted before somebody has said so.
+    fs::rename(remote + "/Documents", home / "away");
     ASSERT_TRUE(whileTimePasses([this] { return alert() != nullptr; }));
     EXPECT_EQ(alertText(), ": “Big.txt” is no longer there. It may have been moved or deleted.");
     EXPECT_TRUE(showsIdle());
@@ -135,6 +138,21 @@ TEST_F(Download, tellsThatTheFileWentInTheMiddle) {
     tap(*button("OK"));
     advance(1s);
     EXPECT_EQ(topPresented(), nullptr);
+}
+
+TEST_F(Download, endsWithItsScreenWhenTheFileIsDeletedOnTheAccount) {
+    rateLimit = 1000;
+    givenPromise("Big.txt", 1'000'000);
+    start();
+    preview("Big.txt");
+    ASSERT_TRUE(untilReceived());
+    fs::remove(remoteFile("Big.txt"));
+    ASSERT_TRUE(whileTimePasses([this] { return download() == nullptr; }));
+    EXPECT_TRUE(whileTimePasses([this] { return !networkIsBusy(); }));
+    EXPECT_EQ(titles().back(), "Documents");
+    EXPECT_EQ(alertText(), "");
+    EXPECT_FALSE(documents().isPromised(url("Big.txt")));
+    EXPECT_EQ(partialFiles(), 0U);
 }
 
 TEST_F(Download, tellsThatTheFileMayNotBeRead) {
