@@ -4,6 +4,7 @@
 #include "platform/base/Text.h"
 #include "platform/cloud/KeptFolder.h"
 #include "platform/cloud/StoreFileSystem.h"
+#include "platform/cloud/StoreMoves.h"
 #include "platform/cloud/SyncNames.h"
 #include "platform/cloud/SyncTimes.h"
 #include "platform/files/PathText.h"
@@ -18,6 +19,12 @@ constexpr std::string_view rootMarkName = ".pelmora-root";
 
 std::string joined(const std::string& folder, std::string_view name) {
     return folder.empty() ? std::string(name) : folder + '/' + std::string(name);
+}
+
+/// The path of another name in the same folder.
+std::string beside(const std::string& path, std::string_view name) {
+    const std::size_t slash = path.rfind('/');
+    return joined(slash == std::string::npos ? std::string() : path.substr(0, slash), name);
 }
 
 bool sameAsRow(const LocalRow& row, const FileAttributes& attributes) {
@@ -225,9 +232,11 @@ void LocalScanner::takeSidecar(std::size_t visit, const std::string& name,
 void LocalScanner::matchMoved() {
     for (Found& found : found_) {
         if (found.promised != 0) {
-            // A copy of a promise that is still at its place is nobody's.
-            if (found.moved && !seen_.insert(found.item).second)
+            // A copy of a promise, or of one whose content has come, is nobody's.
+            if (found.moved && !seen_.insert(found.item).second) {
                 found.item = -1;
+                spare_.push_back(found.sidecar);
+            }
             continue;
         }
         if (found.item != 0 || found.attributes.kind == FileKind::directory)
@@ -344,13 +353,15 @@ Failure LocalScanner::write(Found& found) {
     return std::nullopt;
 }
 
-Failure LocalScanner::moveAside(Found& found, ItemId promise) {
-    const std::optional<ItemState> other = context_.database.state(promise);
+Failure LocalScanner::moveAside(Found& found, ItemId owner) {
+    if (found.promised != 0)
+        return movePromiseAside(found);
+    const std::optional<ItemState> other = context_.database.state(owner);
     const std::string path = context_.pathOf(found.path);
     const std::string folder(folderOf(path));
     const auto sidecar = findSidecar(folder, nameOf(path), context_.mark);
-    if (found.promised != 0 || !other || !other->local || !other->local->promise || !sidecar ||
-        sidecar->mark.item != promise) {
+    if (!other || !other->local || !other->local->promise || !sidecar ||
+        sidecar->mark.item != owner) {
         again_ = true;
         return makeError(ErrorCode::changedWhileRead, nameOf(path));
     }
@@ -367,9 +378,7 @@ Failure LocalScanner::moveAside(Found& found, ItemId promise) {
             continue;
         if (failure)
             return failure;
-        const std::size_t slash = found.path.rfind('/');
-        found.path =
-            joined(slash == std::string::npos ? std::string() : found.path.substr(0, slash), name);
+        found.path = beside(found.path, name);
         const Result<FileAttributes> now = context_.disk.attributes(context_.pathOf(found.path));
         if (!now)
             return now.error();
@@ -380,6 +389,36 @@ Failure LocalScanner::moveAside(Found& found, ItemId promise) {
     return failure ? failure : makeError(ErrorCode::fileExists, nameOf(path));
 }
 
+/// The promise came to a name that something else has.
+Failure LocalScanner::movePromiseAside(Found& found) {
+    const std::string sidecar = context_.pathOf(found.sidecar);
+    const std::string folder(folderOf(sidecar));
+    const Result<std::optional<SidecarMark>> mark = examineMark(sidecar, context_.mark);
+    again_ = true;
+    if (!mark || !*mark)
+        return makeError(ErrorCode::changedWhileRead, nameOf(found.path));
+    Failure failure = makeError(ErrorCode::fileExists, nameOf(found.path));
+    for (int number = 1; number <= namesAside; ++number) {
+        const std::string name = conflictName(nameOf(found.path), ItemKind::file,
+                                              context_.clock.now(), deviceName(), number);
+        if (context_.disk.attributes(folder + '/' + name) ||
+            findSidecar(folder, name, context_.mark))
+            continue;
+        const Result<FoundSidecar> moved =
+            StoreMoves(context_).renameSidecar({sidecar, **mark}, folder, name);
+        if (!moved)
+            return moved.error();
+        const Result<FileAttributes> now = context_.disk.attributes(moved->path);
+        if (!now)
+            return now.error();
+        found.path = beside(found.path, name);
+        found.sidecar = beside(found.sidecar, nameOf(moved->path));
+        found.attributes = *now;
+        return std::nullopt;
+    }
+    return failure;
+}
+
 void LocalScanner::writeNew(const Found& found, const Place& place, bool folder) {
     StateDatabase& database = context_.database;
     if (const std::optional<ItemId> shown = database.itemAt(place))
@@ -388,7 +427,7 @@ void LocalScanner::writeNew(const Found& found, const Place& place, bool folder)
     database.putLocal(found.item, localRowOf(place, found.attributes, found.promised != 0));
 }
 
-/// A promise whose content has come to its place promises nothing any more.
+/// A promise whose content is there, or that is there twice, promises nothing any more.
 void LocalScanner::removeSpareSidecars() {
     for (const std::string& relative : spare_) {
         const std::string path = context_.pathOf(relative);
@@ -396,14 +435,26 @@ void LocalScanner::removeSpareSidecars() {
         const std::optional<ItemState> state =
             mark ? context_.database.state(mark->item) : std::optional<ItemState>();
         // It may have been evicted since, and then this is all that is left of it here.
-        if (!state || !state->local || state->local->promise ||
-            !context_.disk.attributes(std::string(folderOf(path)) + '/' +
-                                      promisedName(nameOf(path), *mark)))
+        if (!state || !state->local || !standsElsewhere(*state, path))
             continue;
         if (const Failure failure = context_.disk.removeFile(path))
             platformLog(LogLevel::warning, "cloud: cannot remove the promise %@: %@", path,
                         *failure);
     }
+}
+
+/// The item has its content, or another promise, at the place that it is known at.
+bool LocalScanner::standsElsewhere(const ItemState& state, const std::string& sidecar) const {
+    const std::optional<std::string> relative = context_.database.localPathOf(state.item.id);
+    if (!relative)
+        return false;
+    const std::string path = context_.pathOf(*relative);
+    if (!state.local->promise) {
+        const Result<FileAttributes> own = context_.disk.attributes(path);
+        return own && own->identity == state.local->identity;
+    }
+    const auto own = findSidecar(std::string(folderOf(path)), nameOf(path), context_.mark);
+    return own && own->mark.item == state.item.id && own->path != sidecar;
 }
 
 bool LocalScanner::isStillAbsent(ItemId item) const {

@@ -64,10 +64,12 @@ private:
     Failure writeDown();
     Failure write(Found& found);
     /// The user made something at a name that is only promised: it cannot have that name.
-    Failure moveAside(Found& found, ItemId promise);
+    Failure moveAside(Found& found, ItemId owner);
+    Failure movePromiseAside(Found& found);
     void writeNew(const Found& found, const Place& place, bool folder);
     bool stands(const Found& found) const;
     bool isStillAbsent(ItemId item) const;
+    bool standsElsewhere(const ItemState& state, const std::string& sidecar) const;
     void removeSpareSidecars();
 
     StoreContext& context_;

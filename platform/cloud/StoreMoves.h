@@ -16,13 +16,15 @@ public:
     /// Never replaces: fileExists when something stands, or is promised, at `to`. One of the two
     /// may lie outside the store, but what is only promised cannot leave it (unsupportedOperation).
     [[nodiscard]] Failure move(const Url& from, const Url& to);
+    /// Gives the promise's own file the place of the promise of `name` in `folder`; nothing is
+    /// recorded.
+    Result<FoundSidecar> renameSidecar(const FoundSidecar& promise, const std::string& folder,
+                                       const std::string& name);
 
 private:
     std::optional<std::string> relative(const Url& url) const;
     Failure movePresent(const Url& from, const Url& to, bool directory);
     Failure movePromise(const Url& from, const Url& to, const FoundSidecar& promise);
-    Result<FoundSidecar> renameSidecar(const FoundSidecar& promise, const std::string& folder,
-                                       const std::string& name);
     Failure recordMove(ItemId item, const std::string& to, const FileAttributes& attributes,
                        bool promise);
     /// Puts back on the disk what could not be recorded, so that the answer is true; the error for
