@@ -2,6 +2,7 @@
 
 #include "platform/base/Log.h"
 #include "platform/base/Text.h"
+#include "platform/cloud/KeptFolder.h"
 #include "platform/cloud/LocalContent.h"
 #include "platform/cloud/StoreFileSystem.h"
 #include "platform/cloud/Tokens.h"
@@ -175,19 +176,20 @@ Failure Eviction::removeContent(const Subject& subject, const OpRow& op) {
 
 void Eviction::resume(StoreContext& context, const OpRow& op) {
     const std::optional<std::string> relative = context.database.pathOf(op.item);
+    const std::string path = relative ? context.pathOf(*relative) : std::string();
+    const std::string staged = context.layout.staging() + '/' + op.staged;
+    // It was not looked at any more: it goes back, unless its name, or its folder, is not its own
+    // any more.
+    if (context.disk.attributes(staged) && (!relative || context.disk.rename(staged, path)))
+        if (const Result<std::string> kept =
+                KeptFolder(context).takeFrom(staged, relative.value_or(op.staged), true);
+            !kept) {
+            platformLog(LogLevel::error, "cloud: cannot put %@ back: %@", path, kept.error());
+            return;
+        }
     if (!relative) {
         endOperation(context, op.id);
         return;
-    }
-    const std::string path = context.pathOf(*relative);
-    const std::string staged = context.layout.staging() + '/' + op.staged;
-    if (context.disk.attributes(staged)) {
-        // It was not looked at any more: it goes back, unless its name was taken since.
-        if (const Failure failure = context.disk.rename(staged, path);
-            failure && !failure->is(ErrorCode::fileExists)) {
-            platformLog(LogLevel::error, "cloud: cannot put %@ back: %@", path, *failure);
-            return;
-        }
     }
     const Result<FileAttributes> file = context.disk.attributes(path);
     const std::optional<FoundSidecar> promise =

@@ -11,6 +11,7 @@
 #include "platform/files/Progress.h"
 
 #include <algorithm>
+#include <set>
 
 namespace platform {
 namespace {
@@ -227,9 +228,17 @@ void Transfers::recover(StoreContext& context) {
     const Result<std::vector<DirectoryEntry>> left = context.disk.entries(context.layout.staging());
     if (!left)
         return;
+    // What could not be finished may be the only place of its content: the next start tries again.
+    std::set<std::string> needed;
+    for (const OpRow& op : context.database.operations())
+        needed.insert(op.staged);
+    if (context.database.takeFault())
+        return;
     for (const DirectoryEntry& entry : *left)
-        if (const Failure failure =
-                context.disk.removeFile(context.layout.staging() + '/' + entry.name))
+        if (needed.contains(entry.name))
+            continue;
+        else if (const Failure failure =
+                     context.disk.removeFile(context.layout.staging() + '/' + entry.name))
             platformLog(LogLevel::warning, "cloud: cannot remove %@: %@", entry.name, *failure);
 }
 
