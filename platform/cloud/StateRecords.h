@@ -103,6 +103,10 @@ struct OpRow {
     std::string error;
 };
 
+/// Set in the records when they were put back from a copy: what of them is not on the disk was not
+/// deleted by anybody, as far as they tell.
+inline constexpr const char* restoredKey = "restored";
+
 /// How far the listing of a folder is.
 struct ScanRow {
     std::int64_t generation = 0;

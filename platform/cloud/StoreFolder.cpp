@@ -91,6 +91,8 @@ Failure beginSession(const StoreLayout& layout, StoreFileSystem& disk, StateData
     }
     const std::string now = hexText(randomBytes(8));
     if (Failure failure = database.transaction([&]() -> Failure {
+            if (!remembered.empty() && !same)
+                database.setMeta(restoredKey, now);
             database.setMeta(key, now);
             return std::nullopt;
         }))

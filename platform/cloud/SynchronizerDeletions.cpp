@@ -53,6 +53,8 @@ bool Synchronizer::isAlarming(const std::vector<ItemId>& items, Side side) {
     for (const std::string_view key : {permissionKey, putBackKey})
         if (database.meta(key) == nameOf(side))
             return false;
+    if (side == Side::local && !database.meta(restoredKey).empty())
+        return false; // nothing counts as deleted
     std::int64_t count = 0;
     std::map<ItemId, std::int64_t> inFolder;
     for (const ItemId item : items) {
@@ -78,7 +80,8 @@ Failure Synchronizer::withdraw(Side side) {
     StateDatabase& database = context_.database;
     const std::optional<DeletionQuestion> asked = question(database);
     const bool stands = asked && asked->side == side;
-    if (!stands && database.meta(permissionKey) != nameOf(side) &&
+    const bool restored = side == Side::local && !database.meta(restoredKey).empty();
+    if (!stands && !restored && database.meta(permissionKey) != nameOf(side) &&
         database.meta(putBackKey) != nameOf(side))
         return std::nullopt;
     return database.transaction([&]() -> Failure {
@@ -90,6 +93,8 @@ Failure Synchronizer::withdraw(Side side) {
 }
 
 void Synchronizer::forgetAnswer(Side side) {
+    if (side == Side::local && !context_.database.meta(restoredKey).empty())
+        context_.database.setMeta(restoredKey, "");
     for (const std::string_view key : {permissionKey, putBackKey})
         if (context_.database.meta(key) == nameOf(side))
             context_.database.setMeta(key, "");
@@ -108,7 +113,8 @@ Failure Synchronizer::settleLocal(const std::vector<ItemId>& vanished, Report& r
             return;
         }
         failure = database.transaction([&]() -> Failure {
-            const bool putBack = database.meta(putBackKey) == nameOf(Side::local);
+            const bool putBack = database.meta(putBackKey) == nameOf(Side::local) ||
+                                 !database.meta(restoredKey).empty();
             for (const ItemId item : vanished) {
                 database.removeLocal(item);
                 database.setItemPlace(item, std::nullopt);

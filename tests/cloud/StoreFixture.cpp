@@ -124,6 +124,22 @@ private:
     const bool dieAfter_;
 };
 
+class MeddlingFileSystem final : public SteppingFileSystem {
+public:
+    MeddlingFileSystem(std::string kind, std::function<void()> act)
+        : kind_(std::move(kind)), act_(std::move(act)) {}
+    Failure before(const char* what) override {
+        if (what == kind_)
+            if (const auto act = std::exchange(act_, nullptr))
+                act();
+        return std::nullopt;
+    }
+
+private:
+    const std::string kind_;
+    std::function<void()> act_;
+};
+
 class FullFileSystem final : public SteppingFileSystem {
 public:
     Failure before(const char* what) override {
@@ -138,6 +154,10 @@ public:
 
 std::unique_ptr<StoreFileSystem> dyingFileSystem(int step, bool after) {
     return std::make_unique<DyingFileSystem>(step, after);
+}
+
+std::unique_ptr<StoreFileSystem> meddlingFileSystem(std::string kind, std::function<void()> act) {
+    return std::make_unique<MeddlingFileSystem>(std::move(kind), std::move(act));
 }
 
 std::unique_ptr<StoreFileSystem> fullFileSystem() {

@@ -129,6 +129,10 @@ int inAnotherProcess(const std::function<int()>& work);
 std::unique_ptr<platform::StoreFileSystem> dyingFileSystem(int step, bool after);
 inline constexpr int diedOnTheWay = 77;
 
+/// A disk where somebody else acts right before the first change of that kind ("rename", "remove").
+std::unique_ptr<platform::StoreFileSystem> meddlingFileSystem(std::string kind,
+                                                              std::function<void()> act);
+
 /// A disk on which making promises and staging fail as on a full one.
 std::unique_ptr<platform::StoreFileSystem> fullFileSystem();
 

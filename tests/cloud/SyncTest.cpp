@@ -1,6 +1,8 @@
 #include "tests/cloud/StoreFixture.h"
 
+#include <cerrno>
 #include <set>
+#include <sys/stat.h>
 #include <unistd.h>
 
 using namespace platform;
@@ -43,6 +45,12 @@ struct Sync : test::StoreFixture {
             found.push_back(entry.name);
         std::sort(found.begin(), found.end());
         return found;
+    }
+    /// From now on somebody acts right before the engine's first change of that kind.
+    void givenSomebodyBefore(const std::string& kind, std::function<void()> act) {
+        close();
+        disk = test::meddlingFileSystem(kind, std::move(act));
+        ASSERT_EQ(open(), std::nullopt);
     }
     std::size_t keptContents() const { return names(layout.kept()).size(); }
 };
@@ -143,6 +151,82 @@ TEST_F(Sync, AFolderDeletedThereGoesUnlessSomethingOfItWasEdited) {
     EXPECT_FALSE(FileManager::exists(url("A").path()));
     EXPECT_EQ(remoteContent("B/in/two"), "edited");
     EXPECT_FALSE(local("B/in/three"));
+}
+
+TEST_F(Sync, WhatIsMadeInAFolderWhileItIsDeletedStays) {
+    givenSynced({"A/in/one"});
+    removeRemote("A/in");
+    givenSomebodyBefore("remove", [this] { givenLocal("A/in/new", "new"); });
+    synced();
+    EXPECT_EQ(local("A/in/new"), "new");
+    EXPECT_EQ(remoteContent("A/in/new"), "new");
+}
+
+TEST_F(Sync, WhatIsSavedWhileItIsDeletedStays) {
+    givenSynced({"A/one"});
+    removeRemote("A/one");
+    givenSomebodyBefore("rename", [this] { givenLocal("A/one", "saved just now"); });
+    synced();
+    EXPECT_EQ(local("A/one"), "saved just now");
+    EXPECT_EQ(remoteContent("A/one"), "saved just now");
+}
+
+struct MovingAway final : test::ForwardingRemote {
+    MovingAway(std::unique_ptr<Remote> real, std::function<void()> first)
+        : ForwardingRemote(std::move(real)), act(std::move(first)) {}
+    Result<RemoteEntry> move(const std::string& from, const std::string& to,
+                             const std::string& etag, CancelFlag& cancel) override {
+        if (const auto first = std::exchange(act, nullptr))
+            first();
+        return real_->move(from, to, etag, cancel);
+    }
+    std::function<void()> act;
+};
+
+TEST_F(Sync, WhatLeavesAFolderThatGoesIsNotTakenForDeleted) {
+    remote =
+        std::make_unique<MovingAway>(std::move(remote), [this] { moveRemote("A/x", "Rest/x"); });
+    givenSynced({"A/x"});
+    moveLocal("A/x", "x");
+    removeLocal("A");
+    EXPECT_EQ(sync().failure, std::nullopt);
+    synced();
+    EXPECT_EQ(local("Rest/x"), "A/x");
+    EXPECT_FALSE(local("x"));
+    EXPECT_EQ(keptContents(), 0U);
+}
+
+TEST_F(Sync, APromiseThatCannotBeReadIsNotGone) {
+    if (::geteuid() == 0)
+        GTEST_SKIP() << "the superuser reads everything";
+    givenSynced({});
+    ASSERT_EQ(chmod(sidecar("Rest/3")->path.c_str(), 0), 0);
+    synced();
+    EXPECT_TRUE(remoteHas("Rest/3"));
+}
+
+TEST_F(Sync, RecordsOfYesterdayDeleteNothing) {
+    givenSynced({"A/one"});
+    close();
+    const Result<Bytes> records = FileManager::contents(Url::file(layout.database()), SIZE_MAX);
+    ASSERT_TRUE(records);
+    ASSERT_EQ(open(), std::nullopt);
+    givenRemote("A/two", "two");
+    removeLocal("A/one");
+    synced();
+    givenRemote("A/one", "again");
+    close();
+    for (const char* part : {"-wal", "-shm"})
+        EXPECT_EQ(unlink((layout.database() + part).c_str()) == 0 || errno == ENOENT, true);
+    ASSERT_EQ(FileManager::writeAtomically(
+                  Url::file(layout.database()),
+                  {reinterpret_cast<const char*>(records->data()), records->size()}),
+              std::nullopt);
+    ASSERT_EQ(open(), std::nullopt);
+    synced();
+    EXPECT_EQ(remoteContent("A/one"), "again");
+    EXPECT_TRUE(isPromised("A/one"));
+    EXPECT_TRUE(isPromised("A/two"));
 }
 
 TEST_F(Sync, TwoPopulatedSidesAreMerged) {
