@@ -220,7 +220,7 @@ std::optional<std::string> World::run() {
         }
         if (luck_.percent(8))
             harmDatabase();
-        if (auto lost = missingContent())
+        if (auto lost = missingContent(false))
             return lost;
     }
     return settle();
@@ -250,7 +250,7 @@ std::optional<std::string> World::settle() {
         bool agreed = false;
         queue_->sync([&] { agreed = store_->database->disagreements().empty(); });
         if (!report.failure && report.changes == 0 && agreed) {
-            if (auto lost = missingContent())
+            if (auto lost = missingContent(true))
                 return lost;
             return difference();
         }
@@ -281,10 +281,12 @@ void World::collect(const std::string& folder, std::set<std::string>& contents) 
             contents.insert(readAll(folder + '/' + entry.name));
 }
 
-std::optional<std::string> World::missingContent() {
+std::optional<std::string> World::missingContent(bool atRest) {
     std::set<std::string> found;
-    for (const std::string& folder : {layout_.root(), layout_.kept(), layout_.staging()})
+    for (const std::string& folder : {layout_.root(), layout_.kept()})
         collect(folder, found);
+    if (!atRest)
+        collect(layout_.staging(), found);
     far_->visit([&](const std::string&, const FarItem& item) { found.insert(item.content); });
     lastThere_.clear();
     far_->visit([&](const std::string& path, const FarItem& item) {

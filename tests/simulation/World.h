@@ -63,7 +63,7 @@ private:
 
     // The oracle.
     std::optional<std::string> settle();
-    std::optional<std::string> missingContent();
+    std::optional<std::string> missingContent(bool atRest);
     std::optional<std::string> difference();
     void collect(const std::string& folder, std::set<std::string>& contents) const;
     void listHere(const std::string& folder, const std::string& shown,
