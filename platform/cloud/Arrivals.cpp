@@ -160,6 +160,8 @@ Result<std::optional<Arrivals::Outcome>> Arrivals::takeOver(const Spot& spot,
             return *failure;
     }
     const Result<FileAttributes> attributes = context_.disk.attributes(path);
+    if (!attributes && attributes.error().is(ErrorCode::noSuchItem)) // moved a moment ago
+        return makeError(ErrorCode::fileExists, entry.name);
     if (!attributes)
         return attributes.error();
     const Place place{spot.folder, entry.name};

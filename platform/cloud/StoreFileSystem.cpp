@@ -122,7 +122,9 @@ public:
             unlink(path.c_str()); // made here a moment ago and empty
             return *failure;
         }
-        return FileManager::attributes(path, FollowLinks::no);
+        // By the open file: somebody may have moved it already.
+        return FileManager::attributes("/proc/self/fd/" + std::to_string(file.get()),
+                                       FollowLinks::yes);
     }
 
     Failure setMark(const std::string& path, const std::string& mark) override {
