@@ -1,13 +1,15 @@
 // Measures the store against what people know: `cp`, and the bare system calls. Prints each
 // figure's median and the ratio; wants a folder on the disk that is meant, with 4 GiB free.
 //
-//   cloud_bench FOLDER [listing|download|attributes]...
+//   cloud_bench FOLDER [listing|download|attributes|uploads|notice|unchanged]...
 
 #include "platform/base/Runtime.h"
 #include "platform/cloud/AccountFile.h"
 #include "platform/cloud/CloudDocumentService.h"
 #include "platform/cloud/CloudService.h"
 #include "platform/cloud/Remote.h"
+#include "platform/cloud/StateDatabase.h"
+#include "platform/cloud/SyncPlan.h"
 #include "platform/cloud/Tokens.h"
 #include "platform/files/ContentProvider.h"
 #include "platform/files/DirectoryWatcher.h"
@@ -88,6 +90,12 @@ public:
         if (done.get_future().get())
             std::abort();
     }
+    void sync() {
+        std::promise<Failure> done;
+        cloud_->sync([&](const Failure& failure) { done.set_value(failure); });
+        if (done.get_future().get())
+            std::abort();
+    }
     CloudService& cloud() { return *cloud_; }
     Url url(const std::string& path) {
         return Url::file(cloud_->documents().shelfroot()->path() + '/' + path);
@@ -158,6 +166,87 @@ void download(const std::string& base) {
     report("download, 1 GiB", ours, "cp and sync", copies);
 }
 
+/// Old enough for the engine to believe that nobody writes to it any more.
+void writeOld(const std::string& path, const std::string& content) {
+    std::ofstream(path) << content;
+    const timespec times[2] = {{0, UTIME_OMIT}, {1'600'000'000, 5}};
+    utimensat(AT_FDCWD, path.c_str(), times, 0);
+}
+
+void uploads(const std::string& base) {
+    constexpr int files = 10'000;
+    std::vector<double> ours;
+    std::vector<double> copies;
+    for (int round = 0; round < rounds; ++round) {
+        const std::string number = std::to_string(round);
+        const std::string remote = base + "/up" + number;
+        fs::create_directories(remote + "/Library");
+        Service service(base + "/up-home" + number, remote);
+        service.sync();
+        const std::string folder = service.url("Library").path();
+        for (int i = 0; i < files; ++i)
+            writeOld(folder + '/' + std::to_string(i), std::string(4096, 'x'));
+        ours.push_back(secondsOf([&] { service.sync(); }));
+        const std::string copy = base + "/up-copy" + number;
+        copies.push_back(
+            secondsOf([&] { run("cp -r " + folder + ' ' + copy + " && sync -f " + copy); }));
+    }
+    report("upload, 10,000 of 4 KiB", ours, "cp -r and sync", copies);
+}
+
+/// From a save here until the account has it, with nobody asking for it.
+void notice(const std::string& base) {
+    const std::string remote = base + "/notice";
+    fs::create_directories(remote + "/Library");
+    Service service(base + "/notice-home", remote);
+    service.sync();
+    service.sync();
+    std::vector<double> young;
+    std::vector<double> old;
+    for (int round = 0; round < rounds; ++round)
+        for (const bool fresh : {true, false}) {
+            const std::string name = "/Library/" + std::to_string(round) + (fresh ? "f" : "o");
+            const std::string path = service.url(name.substr(1)).path();
+            (fresh ? young : old).push_back(secondsOf([&] {
+                if (fresh)
+                    std::ofstream(path) << "content";
+                else
+                    writeOld(path, "content");
+                while (!fs::exists(remote + name)) {
+                }
+            }));
+        }
+    report("saved here, on the remote", young, "of a file not written now", old);
+}
+
+/// A whole look at both sides that finds nothing; and what of it is finding out what to do.
+void unchanged(const std::string& base) {
+    const std::string remote = base + "/same";
+    for (int folder = 0; folder < folders; ++folder) {
+        const std::string path = remote + "/Library/Folder " + std::to_string(folder);
+        fs::create_directories(path);
+        for (int i = 0; i < filesInFolder; ++i)
+            std::ofstream(path + "/Document " + std::to_string(i) + ".pdf");
+    }
+    Service service(base + "/same-home", remote);
+    service.sync();
+    const auto reader = StateReader::open(service.cloud().status()->folder + "/state.db");
+    if (!reader)
+        std::abort();
+    std::vector<double> whole;
+    std::vector<double> planning;
+    for (int round = 0; round < rounds; ++round) {
+        whole.push_back(secondsOf([&] { service.sync(); }));
+        planning.push_back(secondsOf([&] {
+            std::vector<ItemState> states =
+                (*reader)->ask([](StateQueries& queries) { return queries.disagreements(); });
+            if (!planSync(SyncTrees(std::move(states))).empty())
+                std::abort();
+        }));
+    }
+    report("sync of 100,000 unchanged", whole, "planning alone", planning);
+}
+
 void attributes(const std::string& base) {
     const std::string remote = base + "/few";
     fs::create_directories(remote + "/Library");
@@ -207,7 +296,9 @@ void attributes(const std::string& base) {
 
 int main(int argc, char** argv) {
     if (argc < 2) {
-        std::fputs("usage: cloud_bench FOLDER [listing|download|attributes]...\n", stderr);
+        std::fputs(
+            "usage: cloud_bench FOLDER [listing|download|attributes|uploads|notice|unchanged]...\n",
+            stderr);
         return 2;
     }
     std::string base = std::string(argv[1]) + "/cloud-bench-XXXXXX";
@@ -221,6 +312,12 @@ int main(int argc, char** argv) {
         attributes(base);
     if (wanted("download"))
         download(base);
+    if (wanted("uploads"))
+        uploads(base);
+    if (wanted("notice"))
+        notice(base);
+    if (wanted("unchanged"))
+        unchanged(base);
     if (wanted("listing"))
         listing(base);
     fs::remove_all(base);
