@@ -3,6 +3,7 @@
 #include "platform/base/Log.h"
 #include "platform/base/Text.h"
 #include "platform/cloud/StoreFileSystem.h"
+#include "platform/files/PathText.h"
 
 #include <algorithm>
 
@@ -15,15 +16,6 @@ constexpr std::size_t batchSize = 4096;
 /// Folders that are read from the remote ahead of the one that is worked on.
 constexpr unsigned foldersAhead = 2;
 
-/// Failures that are not of one folder: going on would only repeat them.
-bool stopsEverything(const Error& error) {
-    constexpr std::array codes{ErrorCode::serverNotAvailable, ErrorCode::authenticationFailed,
-                               ErrorCode::userCancelled,      ErrorCode::outOfSpace,
-                               ErrorCode::readOnlyVolume,     ErrorCode::databaseUnusable,
-                               ErrorCode::readCorrupt,        ErrorCode::itemBusy};
-    return std::any_of(codes.begin(), codes.end(), [&](ErrorCode code) { return error.is(code); });
-}
-
 bool sameObservation(const RemoteRow& row, const RemoteEntry& entry) {
     return row.etag == entry.etag && row.size == entry.size && row.remoteId == entry.remoteId &&
            row.role == entry.role && row.tags == entry.tags;
@@ -34,6 +26,14 @@ std::string joined(const std::string& folder, const std::string& name) {
 }
 
 } // namespace
+
+bool RemoteLister::stopsEverything(const Error& error) {
+    constexpr std::array codes{ErrorCode::serverNotAvailable, ErrorCode::authenticationFailed,
+                               ErrorCode::userCancelled,      ErrorCode::outOfSpace,
+                               ErrorCode::readOnlyVolume,     ErrorCode::databaseUnusable,
+                               ErrorCode::readCorrupt,        ErrorCode::itemBusy};
+    return std::any_of(codes.begin(), codes.end(), [&](ErrorCode code) { return error.is(code); });
+}
 
 RemoteLister::RemoteLister(StoreContext& context, CancelFlag& cancel, Written written)
     : context_(context),
@@ -232,7 +232,7 @@ Failure RemoteLister::takeKnown(Visit& visit, const RemoteEntry& entry, const It
         return std::nullopt;
     }
     ListingBatch::Change change{state.item, false, rowOf(visit, entry), {}, {}};
-    if (state.base && state.local && state.local->promise) {
+    if (state.base && state.local && state.local->promise && promiseStands(state)) {
         // A promise has no content of its own: the record follows the remote.
         change.base = state.base;
         change.base->etag = entry.etag;
@@ -246,6 +246,17 @@ Failure RemoteLister::takeKnown(Visit& visit, const RemoteEntry& entry, const It
     }
     batch_.changes.push_back(std::move(change));
     return std::nullopt;
+}
+
+/// One that the user deleted a moment ago was one of the version before.
+bool RemoteLister::promiseStands(const ItemState& state) {
+    std::optional<std::string> relative;
+    context_.queue.sync([&] { relative = context_.database.localPathOf(state.item.id); });
+    if (!relative)
+        return false;
+    const std::string path = context_.pathOf(*relative);
+    const auto sidecar = findSidecar(std::string(folderOf(path)), nameOf(path), context_.mark);
+    return sidecar && sidecar->mark.item == state.item.id;
 }
 
 Failure RemoteLister::takeNew(Visit& visit, const RemoteEntry& entry, const ItemState* state) {

@@ -20,6 +20,9 @@ namespace platform {
 /// anywhere, a later run goes on where the last written batch ends.
 class RemoteLister {
 public:
+    /// Failures that are not of one folder: going on would only repeat them.
+    static bool stopsEverything(const Error& error);
+
     enum class Depth {
         /// The given folders, and below them what is new.
         newFolders,
@@ -79,6 +82,7 @@ private:
     Result<Arrivals::Spot> spotOf(const Folder& folder);
     Failure take(Visit& visit, const RemoteEntry& entry);
     Failure takeKnown(Visit& visit, const RemoteEntry& entry, const ItemState& state);
+    bool promiseStands(const ItemState& state);
     Failure takeNew(Visit& visit, const RemoteEntry& entry, const ItemState* state);
     void addRemoteOnly(Visit& visit, const RemoteEntry& entry);
     /// The known item that was elsewhere on the remote and is this one now.

@@ -2,6 +2,7 @@
 
 #include "platform/base/Log.h"
 #include "platform/cloud/StoreFileSystem.h"
+#include "platform/files/PathText.h"
 
 #include <array>
 
@@ -249,8 +250,22 @@ Failure SyncExecutor::flush(CancelFlag& cancel) {
     return failure;
 }
 
+/// A folder or a promise is on the disk, and not in the records alone.
+bool SyncExecutor::standsHere(const Work& work) {
+    const std::string path = context_.pathOf(work.localPath);
+    if (work.state.local->promise) {
+        const auto sidecar = findSidecar(std::string(folderOf(path)), nameOf(path), context_.mark);
+        return sidecar && sidecar->mark.item == work.step.item;
+    }
+    const Result<FileAttributes> now = context_.disk.attributes(path);
+    return now && now->identity == work.state.local->identity;
+}
+
 Failure SyncExecutor::adopt(const Work& work) {
     const ItemState& state = work.state;
+    // What the user has deleted meanwhile was never this version.
+    if (!standsHere(work))
+        return makeError(ErrorCode::changedWhileRead, nameOf(work.localPath));
     BaseRow base;
     if (state.base)
         base = *state.base;

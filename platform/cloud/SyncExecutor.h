@@ -70,6 +70,7 @@ private:
 
     // Records.
     Failure adopt(const Work& work);
+    bool standsHere(const Work& work);
     Failure merge(Work& work);
     Failure forget(const Work& work);
     /// The content on the disk is the one that was agreed on after all.

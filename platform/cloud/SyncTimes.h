@@ -26,7 +26,10 @@ inline constexpr Duration noticeDelay = std::chrono::milliseconds(50);
 inline constexpr Duration pollInterval = std::chrono::minutes(1);
 /// How often everything is looked at although no notice came.
 inline constexpr Duration sweepInterval = std::chrono::hours(1);
-/// When what vanished is looked for a second time before it counts as deleted.
-inline constexpr Duration secondLookDelay = std::chrono::milliseconds(500);
+/// When what vanished is looked for a second time before it counts as deleted: by then whoever
+/// deletes a tree has come further, and more is gone.
+inline constexpr Duration secondLookDelay = std::chrono::milliseconds(1000);
+/// Deletions of so long a time are counted together where it is asked whether they are too many.
+inline constexpr Duration deletionMemory = std::chrono::minutes(5);
 
 } // namespace platform

@@ -56,7 +56,7 @@ Synchronizer::Report Synchronizer::run(const Request& request) {
     if (request.lookAtDisk || afterCrash_)
         report.failure = look(report);
     if (!report.failure && !report.question)
-        report.failure = list(request.folders, request.everything);
+        report.failure = list(request.folders, request.everything, report);
     if (!report.failure && !report.question)
         report.failure = settleRemote(request.commanded || request.lookAgain, report);
     context_.queue.sync([&] {
@@ -69,6 +69,8 @@ Synchronizer::Report Synchronizer::run(const Request& request) {
         for (const auto& [item, trouble] : troubles_)
             if (!report.retryAt || trouble.nextAt < *report.retryAt)
                 report.retryAt = trouble.nextAt;
+    if (!report.failure)
+        report.failure = report.incomplete;
     return report;
 }
 
@@ -92,13 +94,16 @@ Failure Synchronizer::look(Report& report) {
     }
 }
 
-Failure Synchronizer::list(const std::vector<ItemId>& folders, bool everything) {
-    if (everything)
-        return RemoteLister(context_, cancel_, written_)
-            .run({rootItem}, RemoteLister::Depth::everything);
-    if (folders.empty())
+Failure Synchronizer::list(const std::vector<ItemId>& folders, bool everything, Report& report) {
+    if (!everything && folders.empty())
         return std::nullopt;
-    return RemoteLister(context_, cancel_, written_).run(folders, RemoteLister::Depth::newFolders);
+    RemoteLister lister(context_, cancel_, written_);
+    Failure failure = everything ? lister.run({rootItem}, RemoteLister::Depth::everything)
+                                 : lister.run(folders, RemoteLister::Depth::newFolders);
+    if (!failure || RemoteLister::stopsEverything(*failure))
+        return failure;
+    report.incomplete = std::move(failure);
+    return std::nullopt;
 }
 
 std::vector<SyncStep> Synchronizer::plan() {
@@ -117,7 +122,12 @@ std::vector<SyncStep> Synchronizer::plan() {
             over.push_back(item);
     for (const ItemId item : over)
         forgetTrouble(item);
-    std::erase_if(steps, [this](const SyncStep& step) { return !mayTry(step.item); });
+    const std::set<ItemId>& vanishing = vanishing_[Side::local].items;
+    std::erase_if(steps, [&](const SyncStep& step) {
+        // Of what vanished only the records still say that it is there.
+        return !mayTry(step.item) || vanishing.contains(step.item) ||
+               vanishing.contains(step.other);
+    });
     return steps;
 }
 
@@ -222,7 +232,7 @@ Failure Synchronizer::digest(SyncExecutor::Outcome& outcome, const std::vector<S
             return failure;
     if (report.question)
         return std::nullopt;
-    return list({outcome.outdated.begin(), outcome.outdated.end()}, false);
+    return list({outcome.outdated.begin(), outcome.outdated.end()}, false, report);
 }
 
 bool Synchronizer::mayTry(ItemId item) {

@@ -7,6 +7,7 @@
 
 #include <map>
 #include <optional>
+#include <set>
 #include <string>
 #include <vector>
 
@@ -40,6 +41,8 @@ public:
         /// Of the disk, relative to the store's root; empty when it was not looked at.
         std::vector<std::string> folders;
         std::size_t changes = 0;
+        /// Folders of the remote could not be read: of those nothing is known, all else goes on.
+        Failure incomplete;
 
         void settle(std::optional<Duration> delay) {
             if (delay && (!settlesIn || *settlesIn < *delay))
@@ -68,7 +71,7 @@ private:
     };
 
     Failure look(Report& report);
-    Failure list(const std::vector<ItemId>& folders, bool everything);
+    Failure list(const std::vector<ItemId>& folders, bool everything, Report& report);
     /// What vanished counts as deleted, unless it is too much.
     Failure settleLocal(const std::vector<ItemId>& vanished, Report& report);
     Failure settleRemote(bool commanded, Report& report);
@@ -76,6 +79,11 @@ private:
     Failure withdraw(Side side);
     void forgetAnswer(Side side);
     bool isAlarming(const std::vector<ItemId>& items, Side side);
+    /// Nothing more has vanished for a while: who deletes has come to the end.
+    bool isSteady(Side side, const std::vector<ItemId>& vanished, Report& report);
+    bool isAnswered(Side side);
+    std::int64_t recentlyDeleted(Side side);
+    void countDeleted(Side side, std::int64_t items);
     Failure carryOutAll(Report& report);
     std::vector<SyncStep> plan();
     /// What the disk has lost while the machine stopped; remembered until it is there again.
@@ -93,6 +101,11 @@ private:
     RemoteLister::Written written_;
     SyncExecutor executor_;
     std::map<ItemId, Trouble> troubles_;
+    struct Vanishing {
+        std::set<ItemId> items;
+        Duration since{0};
+    };
+    std::map<Side, Vanishing> vanishing_;
     bool afterCrash_ = false;                // and not looked for damage yet
     std::map<ItemId, std::int64_t> damaged_; // with the operation that tells of it
 };

@@ -1,6 +1,8 @@
 #include "platform/base/Log.h"
+#include "platform/cloud/SyncTimes.h"
 #include "platform/cloud/Synchronizer.h"
 
+#include <algorithm>
 #include <charconv>
 #include <set>
 
@@ -17,6 +19,8 @@ constexpr std::string_view questionKey = "question";
 // What the user answered, for the side that it was asked of.
 constexpr std::string_view permissionKey = "deletions";
 constexpr std::string_view putBackKey = "putBack";
+/// With the side behind it: how many were deleted of late, and when the last ones were.
+constexpr std::string_view deletedKey = "deleted.";
 
 std::string_view nameOf(Side side) {
     return side == Side::local ? "local" : "remote";
@@ -48,15 +52,59 @@ Failure Synchronizer::ask(const DeletionQuestion& question, Report& report) {
     });
 }
 
-bool Synchronizer::isAlarming(const std::vector<ItemId>& items, Side side) {
+bool Synchronizer::isAnswered(Side side) {
     StateDatabase& database = context_.database;
-    for (const std::string_view key : {permissionKey, putBackKey})
-        if (database.meta(key) == nameOf(side))
-            return false;
-    if (side == Side::local && !database.meta(restoredKey).empty())
-        return false; // nothing counts as deleted
-    std::int64_t count = 0;
-    std::map<ItemId, std::int64_t> inFolder;
+    return database.meta(permissionKey) == nameOf(side) ||
+           database.meta(putBackKey) == nameOf(side) ||
+           // Nothing counts as deleted.
+           (side == Side::local && !database.meta(restoredKey).empty());
+}
+
+std::int64_t Synchronizer::recentlyDeleted(Side side) {
+    const std::string text =
+        context_.database.meta(std::string(deletedKey) + std::string(nameOf(side)));
+    std::int64_t items = 0;
+    std::int64_t at = 0;
+    const std::size_t blank = text.find(' ');
+    if (blank == std::string::npos)
+        return 0;
+    std::from_chars(text.data(), text.data() + blank, items);
+    std::from_chars(text.data() + blank + 1, text.data() + text.size(), at);
+    const Duration age(context_.clock.now().nanoseconds - at);
+    return age >= Duration::zero() && age < deletionMemory ? items : 0;
+}
+
+/// Within a transaction.
+void Synchronizer::countDeleted(Side side, std::int64_t items) {
+    context_.database.setMeta(std::string(deletedKey) + std::string(nameOf(side)),
+                              std::to_string(items) + ' ' +
+                                  std::to_string(context_.clock.now().nanoseconds));
+}
+
+bool Synchronizer::isSteady(Side side, const std::vector<ItemId>& vanished, Report& report) {
+    const Duration now = context_.clock.monotonic();
+    Vanishing& before = vanishing_[side];
+    const bool more = std::any_of(vanished.begin(), vanished.end(),
+                                  [&](ItemId item) { return !before.items.contains(item); });
+    if (more)
+        before.since = now;
+    before.items = std::set<ItemId>(vanished.begin(), vanished.end());
+    const Duration left = secondLookDelay - (now - before.since);
+    if (left <= Duration::zero()) {
+        vanishing_.erase(side);
+        return true;
+    }
+    report.settle(left);
+    return false;
+}
+
+bool Synchronizer::isAlarming(const std::vector<ItemId>& items, Side side) {
+    if (isAnswered(side))
+        return false;
+    StateDatabase& database = context_.database;
+    const std::int64_t before = recentlyDeleted(side);
+    std::int64_t count = before;
+    std::map<ItemId, std::int64_t> inFolder{{rootItem, before}};
     for (const ItemId item : items) {
         std::optional<ItemState> state = database.state(item);
         if (!state || !state->base)
@@ -67,10 +115,13 @@ bool Synchronizer::isAlarming(const std::vector<ItemId>& items, Side side) {
             state = database.state(state->base->place.parent);
         }
     }
-    if (count >= smallestAlarm && count * 2 > database.agreedItems())
+    if (count == before)
+        return false;
+    if (count >= smallestAlarm && count * 2 > database.agreedItems() + before)
         return true;
     for (const auto& [folder, gone] : inFolder)
-        if (gone > fewItems && gone * 3 > database.agreedItemsIn(folder))
+        if (gone > fewItems &&
+            gone * 3 > database.agreedItemsIn(folder) + (folder == rootItem ? before : 0))
             return true;
     return false;
 }
@@ -105,6 +156,7 @@ Failure Synchronizer::settleLocal(const std::vector<ItemId>& vanished, Report& r
     context_.queue.sync([&] {
         StateDatabase& database = context_.database;
         if (vanished.empty()) {
+            vanishing_.erase(Side::local);
             failure = withdraw(Side::local);
             return;
         }
@@ -112,6 +164,14 @@ Failure Synchronizer::settleLocal(const std::vector<ItemId>& vanished, Report& r
             failure = ask({Side::local, static_cast<std::int64_t>(vanished.size())}, report);
             return;
         }
+        const bool answered = isAnswered(Side::local);
+        if (answered)
+            vanishing_.erase(Side::local);
+        if (!answered && !isSteady(Side::local, vanished, report))
+            return;
+        const std::int64_t all =
+            answered ? 0
+                     : recentlyDeleted(Side::local) + static_cast<std::int64_t>(vanished.size());
         failure = database.transaction([&]() -> Failure {
             const bool putBack = database.meta(putBackKey) == nameOf(Side::local) ||
                                  !database.meta(restoredKey).empty();
@@ -122,6 +182,7 @@ Failure Synchronizer::settleLocal(const std::vector<ItemId>& vanished, Report& r
                     database.removeBase(item);
             }
             forgetAnswer(Side::local);
+            countDeleted(Side::local, all);
             return std::nullopt;
         });
     });
@@ -137,12 +198,13 @@ Failure Synchronizer::settleRemote(bool commanded, Report& report) {
                 again.insert(state->remote->place.parent);
     });
     if (again.empty()) {
+        vanishing_.erase(Side::remote);
         Failure failure;
         context_.queue.sync([&] { failure = withdraw(Side::remote); });
         return failure;
     }
     if (commanded)
-        if (Failure failure = list({again.begin(), again.end()}, false))
+        if (Failure failure = list({again.begin(), again.end()}, false, report))
             return failure;
     Failure failure;
     context_.queue.sync([&] {
@@ -160,6 +222,13 @@ Failure Synchronizer::settleRemote(bool commanded, Report& report) {
             failure = ask({Side::remote, static_cast<std::int64_t>(items.size())}, report);
             return;
         }
+        const bool answered = isAnswered(Side::remote);
+        if (!answered && !isSteady(Side::remote, database.missingFromRemote(1), report)) {
+            report.secondLook = true;
+            return;
+        }
+        const std::int64_t all =
+            answered ? 0 : recentlyDeleted(Side::remote) + static_cast<std::int64_t>(items.size());
         failure = database.transaction([&]() -> Failure {
             const bool putBack = database.meta(putBackKey) == nameOf(Side::remote);
             for (const ItemId item : items) {
@@ -168,6 +237,7 @@ Failure Synchronizer::settleRemote(bool commanded, Report& report) {
                     database.removeBase(item);
             }
             forgetAnswer(Side::remote);
+            countDeleted(Side::remote, all);
             return std::nullopt;
         });
     });

@@ -126,7 +126,9 @@ TEST_F(Changes, ALibraryGoesOnBothSidesOrNotAtAll) {
 struct Following : Changes {
     /// Lets time pass until it holds.
     void until(const std::function<bool()>& holds) {
+        const auto deadline = std::chrono::steady_clock::now() + std::chrono::seconds(30);
         while (!holds()) {
+            ASSERT_LT(std::chrono::steady_clock::now(), deadline) << "it never came";
             clock.advance(std::chrono::milliseconds(100));
             std::this_thread::yield();
         }

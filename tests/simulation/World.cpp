@@ -249,7 +249,8 @@ std::optional<std::string> World::settle() {
         }
         bool agreed = false;
         queue_->sync([&] { agreed = store_->database->disagreements().empty(); });
-        if (!report.failure && report.changes == 0 && agreed) {
+        if (!report.failure && !report.settlesIn && !report.secondLook && report.changes == 0 &&
+            agreed) {
             if (auto lost = missingContent(true))
                 return lost;
             return difference();
