@@ -63,6 +63,7 @@ bool AppDelegate::applicationWillFinishLaunchingWithOptions(
     root->setRestorationIdentifier("Root");
     rootWindow_->makeKeyAndVisible();
     statusStrip_ = std::make_unique<StatusStrip>(*rootWindow_);
+    vanishedItems_ = std::make_unique<VanishedItems>(*rootWindow_);
     return true;
 }
 

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "app/StatusStrip.h"
+#include "app/VanishedItems.h"
 #include "platform/ui/Application.h"
 #include "platform/ui/Window.h"
 
@@ -34,6 +35,7 @@ private:
 
     std::unique_ptr<platform::Window> rootWindow_;
     std::unique_ptr<StatusStrip> statusStrip_; // shows itself in the window
+    std::unique_ptr<VanishedItems> vanishedItems_;
 };
 
 } // namespace tavrin

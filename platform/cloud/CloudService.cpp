@@ -219,6 +219,11 @@ void CloudService::sync(std::function<void(const Failure& failure)> done) {
         done(makeError(ErrorCode::noAccount));
 }
 
+std::optional<DeletionQuestion> CloudService::question() const {
+    const std::shared_ptr<StoreEngine> engine = state_->current();
+    return engine ? engine->question() : std::nullopt;
+}
+
 Failure CloudService::answer(DeletionAnswer answer) {
     const std::shared_ptr<StoreEngine> engine = state_->current();
     return engine ? engine->answer(answer) : Failure(makeError(ErrorCode::noAccount));

@@ -84,7 +84,10 @@ public:
                  std::function<void(const Failure& failure)> done);
     /// Makes both sides agree now, whatever has failed before; `done` as above.
     void sync(std::function<void(const Failure& failure)> done);
-    /// Answers the question that CloudStatus tells of; what follows from it is done soon.
+    /// So much has vanished that the user is to say what it means, as in CloudStatus. Waits for
+    /// nothing; cloudProblemDidChangeNotification tells of a change.
+    std::optional<DeletionQuestion> question() const;
+    /// Answers the question that CloudStatus tells of; waits for the store's queue; what follows from it is done soon.
     [[nodiscard]] Failure answer(DeletionAnswer answer);
     /// What could not be done yet, and why.
     std::vector<PendingWork> pending() const;

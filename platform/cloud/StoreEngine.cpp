@@ -255,16 +255,13 @@ std::optional<std::string> StoreEngine::problem() const {
     if (problem_)
         return problem_;
     if (question_)
-        return localizedFormat(
-            question_->side == Side::local
-                ? "%1$@ items have vanished from this device. Nothing is deleted on your account "
-                  "until you say so: quit this program and run “pelmora sync --delete” to delete "
-                  "them there as well, or “pelmora sync --put-back” to bring them back."
-                : "%1$@ items have vanished from your account. Nothing is deleted on this device "
-                  "until you say so: quit this program and run “pelmora sync --delete” to delete "
-                  "them here as well, or “pelmora sync --put-back” to bring them back.",
-            std::to_string(question_->items));
+        return textOf(*question_);
     return notice_;
+}
+
+std::optional<DeletionQuestion> StoreEngine::question() const {
+    const std::lock_guard lock(mutex_);
+    return question_;
 }
 
 void StoreEngine::setProblem(const Failure& failure) {

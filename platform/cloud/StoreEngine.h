@@ -80,6 +80,7 @@ public:
     void refresh(const std::optional<Url>& folder, Done done);
     /// Makes both sides agree now, whatever has failed before. `done` as above.
     void sync(Done done);
+    std::optional<DeletionQuestion> question() const;
     [[nodiscard]] Failure answer(DeletionAnswer answer);
     void freeBytes(std::function<void(const Result<std::uint64_t>&)> done);
 

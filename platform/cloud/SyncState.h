@@ -16,6 +16,9 @@ struct DeletionQuestion {
     std::int64_t items = 0;
     bool operator==(const DeletionQuestion&) const = default;
 };
+/// For people: what has vanished where, and that nothing follows from it before they say so.
+std::string textOf(const DeletionQuestion& question);
+
 enum class DeletionAnswer {
     /// It is deleted on the other side as well, recoverably.
     deleteThem,

@@ -1,4 +1,5 @@
 #include "platform/base/Log.h"
+#include "platform/base/Text.h"
 #include "platform/cloud/SyncTimes.h"
 #include "platform/cloud/Synchronizer.h"
 
@@ -26,11 +27,20 @@ std::string_view nameOf(Side side) {
     return side == Side::local ? "local" : "remote";
 }
 
-std::string textOf(const DeletionQuestion& question) {
+std::string recordOf(const DeletionQuestion& question) {
     return std::string(nameOf(question.side)) + ' ' + std::to_string(question.items);
 }
 
 } // namespace
+
+std::string textOf(const DeletionQuestion& question) {
+    return localizedFormat(question.side == Side::local
+                               ? "%1$@ items have vanished from this device. Nothing is deleted on "
+                                 "your account until you say so."
+                               : "%1$@ items have vanished from your account. Nothing is deleted "
+                                 "on this device until you say so.",
+                           std::to_string(question.items));
+}
 
 std::optional<DeletionQuestion> Synchronizer::question(StateQueries& queries) {
     const std::string text = queries.meta(questionKey);
@@ -47,7 +57,7 @@ Failure Synchronizer::ask(const DeletionQuestion& question, Report& report) {
     platformLog(LogLevel::warning, "cloud: %@ items have vanished from %@; the user is asked",
                 question.items, question.side == Side::local ? "the device" : "the account");
     return context_.database.transaction([&]() -> Failure {
-        context_.database.setMeta(questionKey, textOf(question));
+        context_.database.setMeta(questionKey, recordOf(question));
         return std::nullopt;
     });
 }

@@ -848,12 +848,32 @@
         <translation>إنه على قرص غير قرص المخزن.</translation>
     </message>
     <message>
-        <source>%1$@ items have vanished from this device. Nothing is deleted on your account until you say so: quit this program and run “pelmora sync --delete” to delete them there as well, or “pelmora sync --put-back” to bring them back.</source>
-        <translation>عدد العناصر التي اختفت من هذا الجهاز: %1$@. لن يُحذف شيء من حسابك حتى تقرّر ذلك: أغلق البرنامج ونفّذ «pelmora sync --delete» لحذفها هناك أيضًا، أو «pelmora sync --put-back» لاستعادتها.</translation>
+        <source>Delete or Bring Back?</source>
+        <translation>حذف أم استعادة؟</translation>
     </message>
     <message>
-        <source>%1$@ items have vanished from your account. Nothing is deleted on this device until you say so: quit this program and run “pelmora sync --delete” to delete them here as well, or “pelmora sync --put-back” to bring them back.</source>
-        <translation>عدد العناصر التي اختفت من حسابك: %1$@. لن يُحذف شيء من هذا الجهاز حتى تقرّر ذلك: أغلق البرنامج ونفّذ «pelmora sync --delete» لحذفها هنا أيضًا، أو «pelmora sync --put-back» لاستعادتها.</translation>
+        <source>Bring Them Back</source>
+        <translation>استعادة العناصر</translation>
+    </message>
+    <message>
+        <source>Delete on the Account Too</source>
+        <translation>حذفها من الحساب أيضًا</translation>
+    </message>
+    <message>
+        <source>Delete on This Device Too</source>
+        <translation>حذفها من هذا الجهاز أيضًا</translation>
+    </message>
+    <message>
+        <source>Decide Later</source>
+        <translation>القرار لاحقًا</translation>
+    </message>
+    <message>
+        <source>%1$@ items have vanished from this device. Nothing is deleted on your account until you say so.</source>
+        <translation>عدد العناصر التي اختفت من هذا الجهاز: %1$@. لن يُحذف شيء من حسابك حتى تقرّر ذلك.</translation>
+    </message>
+    <message>
+        <source>%1$@ items have vanished from your account. Nothing is deleted on this device until you say so.</source>
+        <translation>عدد العناصر التي اختفت من حسابك: %1$@. لن يُحذف شيء من هذا الجهاز حتى تقرّر ذلك.</translation>
     </message>
     <message>
         <source>The folder “%1$@” is not there. Connect its disk; nothing was changed.</source>

@@ -820,12 +820,32 @@
         <translation>Es liegt auf einem anderen Datenträger als die Ablage.</translation>
     </message>
     <message>
-        <source>%1$@ items have vanished from this device. Nothing is deleted on your account until you say so: quit this program and run “pelmora sync --delete” to delete them there as well, or “pelmora sync --put-back” to bring them back.</source>
-        <translation>%1$@ Objekte sind von diesem Gerät verschwunden. Im Konto wird nichts gelöscht, bis Sie es sagen: Beenden Sie das Programm und führen Sie „pelmora sync --delete“ aus, um sie auch dort zu löschen, oder „pelmora sync --put-back“, um sie zurückzuholen.</translation>
+        <source>Delete or Bring Back?</source>
+        <translation>Löschen oder zurückholen?</translation>
     </message>
     <message>
-        <source>%1$@ items have vanished from your account. Nothing is deleted on this device until you say so: quit this program and run “pelmora sync --delete” to delete them here as well, or “pelmora sync --put-back” to bring them back.</source>
-        <translation>%1$@ Objekte sind aus Ihrem Konto verschwunden. Auf diesem Gerät wird nichts gelöscht, bis Sie es sagen: Beenden Sie das Programm und führen Sie „pelmora sync --delete“ aus, um sie auch hier zu löschen, oder „pelmora sync --put-back“, um sie zurückzuholen.</translation>
+        <source>Bring Them Back</source>
+        <translation>Zurückholen</translation>
+    </message>
+    <message>
+        <source>Delete on the Account Too</source>
+        <translation>Auch im Konto löschen</translation>
+    </message>
+    <message>
+        <source>Delete on This Device Too</source>
+        <translation>Auch auf diesem Gerät löschen</translation>
+    </message>
+    <message>
+        <source>Decide Later</source>
+        <translation>Später entscheiden</translation>
+    </message>
+    <message>
+        <source>%1$@ items have vanished from this device. Nothing is deleted on your account until you say so.</source>
+        <translation>%1$@ Objekte sind von diesem Gerät verschwunden. Im Konto wird nichts gelöscht, bis Sie es sagen.</translation>
+    </message>
+    <message>
+        <source>%1$@ items have vanished from your account. Nothing is deleted on this device until you say so.</source>
+        <translation>%1$@ Objekte sind aus Ihrem Konto verschwunden. Auf diesem Gerät wird nichts gelöscht, bis Sie es sagen.</translation>
     </message>
     <message>
         <source>The folder “%1$@” is not there. Connect its disk; nothing was changed.</source>

@@ -827,12 +827,32 @@
         <translation>Объект находится не на том диске, на котором хранилище.</translation>
     </message>
     <message>
-        <source>%1$@ items have vanished from this device. Nothing is deleted on your account until you say so: quit this program and run “pelmora sync --delete” to delete them there as well, or “pelmora sync --put-back” to bring them back.</source>
-        <translation>Объектов, пропавших с этого устройства: %1$@. В учётной записи ничего не будет удалено без вашего указания: закройте программу и выполните «pelmora sync --delete», чтобы удалить их и там, или «pelmora sync --put-back», чтобы вернуть их.</translation>
+        <source>Delete or Bring Back?</source>
+        <translation>Удалить или вернуть?</translation>
     </message>
     <message>
-        <source>%1$@ items have vanished from your account. Nothing is deleted on this device until you say so: quit this program and run “pelmora sync --delete” to delete them here as well, or “pelmora sync --put-back” to bring them back.</source>
-        <translation>Объектов, пропавших из вашей учётной записи: %1$@. На этом устройстве ничего не будет удалено без вашего указания: закройте программу и выполните «pelmora sync --delete», чтобы удалить их и здесь, или «pelmora sync --put-back», чтобы вернуть их.</translation>
+        <source>Bring Them Back</source>
+        <translation>Вернуть</translation>
+    </message>
+    <message>
+        <source>Delete on the Account Too</source>
+        <translation>Удалить и в учётной записи</translation>
+    </message>
+    <message>
+        <source>Delete on This Device Too</source>
+        <translation>Удалить и на этом устройстве</translation>
+    </message>
+    <message>
+        <source>Decide Later</source>
+        <translation>Решить позже</translation>
+    </message>
+    <message>
+        <source>%1$@ items have vanished from this device. Nothing is deleted on your account until you say so.</source>
+        <translation>Объектов, пропавших с этого устройства: %1$@. В учётной записи ничего не будет удалено без вашего указания.</translation>
+    </message>
+    <message>
+        <source>%1$@ items have vanished from your account. Nothing is deleted on this device until you say so.</source>
+        <translation>Объектов, пропавших из вашей учётной записи: %1$@. На этом устройстве ничего не будет удалено без вашего указания.</translation>
     </message>
     <message>
         <source>The folder “%1$@” is not there. Connect its disk; nothing was changed.</source>

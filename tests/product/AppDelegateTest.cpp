@@ -1,12 +1,15 @@
 #include "items/VXItem.h"
 #include "platform/base/Process.h"
 #include "platform/cloud/CloudDocumentService.h"
+#include "platform/cloud/CloudService.h"
 #include "platform/system/NetworkActivityIndicator.h"
 #include "platform/system/SourceApplications.h"
 #include "preview/PreviewItemManager.h"
 #include "services/NetworkIndicator.h"
 #include "services/NetworkWatcher.h"
 #include "tests/product/ProductFixture.h"
+
+#include <filesystem>
 
 using testing::Contains;
 using testing::Not;
@@ -152,6 +155,35 @@ TEST_F(Entry, showsAccountNetworkAndActivityInTheStrip) {
     EXPECT_TRUE(until([&] { return window().statusStrip().activity; }));
     indicator->hide("copying");
     EXPECT_TRUE(until([&] { return !window().statusStrip().activity; }));
+}
+
+TEST_F(Entry, asksWhatItMeansThatMuchHasVanished) {
+    const std::vector<std::string> names = {"One.txt", "Two.txt", "Three.txt"};
+    for (const std::string& name : names)
+        givenRemote("My Notes/" + name, name);
+    givenStore();
+    const auto inTime = [&](const std::function<bool()>& holds) {
+        return untilElsewhere([&] {
+            advance(50ms);
+            return holds();
+        });
+    };
+    ASSERT_TRUE(inTime([&] { return documents().isPromised(url("My Notes/Two.txt")); }));
+    for (const auto& entry : std::filesystem::directory_iterator(url("My Notes").path()))
+        std::filesystem::remove_all(entry.path());
+    const auto isAsked = [&] { return alertText().starts_with("Delete or Bring Back?: 4 items"); };
+    ASSERT_TRUE(inTime(isAsked));
+    tap(*button("Decide Later"));
+    advance(1s);
+    EXPECT_EQ(alertText(), "") << "until the program becomes active again";
+    application->setActive(false);
+    application->setActive(true);
+    ASSERT_TRUE(inTime(isAsked));
+    tap(*button("Bring Them Back"));
+    EXPECT_TRUE(inTime([&] { return documents().isPromised(url("My Notes/Two.txt")); }));
+    EXPECT_TRUE(inTime([&] { return !platform::Platform::current().cloud().question(); }));
+    EXPECT_TRUE(home.has("remote/Documents/My Notes/Two.txt"));
+    EXPECT_EQ(alertText(), "");
 }
 
 } // namespace
