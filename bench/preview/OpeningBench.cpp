@@ -1,0 +1,187 @@
+#include "bench/preview/MadeDocuments.h"
+#include "bench/preview/PreviewBench.h"
+#include "platform/documents/PlatformPreviewController.h"
+#include "platform/documents/preview/PagesContent.h"
+#include "platform/documents/preview/ZoomWidget.h"
+#include "tests/documents/ScreenHouse.h"
+
+#include <QApplication>
+#include <QBackingStore>
+#include <QEvent>
+#include <QEventLoop>
+#include <QImage>
+#include <QImageReader>
+#include <QPainter>
+#include <QPdfDocument>
+
+#include <cmath>
+#include <cstdio>
+#include <cstdlib>
+#include <functional>
+#include <utility>
+
+namespace {
+
+using namespace platform;
+
+constexpr int rounds = 21;
+constexpr int pages = 500;
+
+/// The preview of one document.
+class OneDocument : public PlatformPreviewController,
+                    public PlatformPreviewDataSource,
+                    public PlatformPreviewDelegate {
+public:
+    explicit OneDocument(Url document) : document_(std::move(document)) {
+        setDataSource(this);
+        setDelegate(this);
+    }
+    std::size_t numberOfPreviewItemsInPreviewController(PlatformPreviewController&) override {
+        return 1;
+    }
+    std::optional<Url> previewControllerPreviewItemAtIndex(PlatformPreviewController&,
+                                                           std::size_t) override {
+        return document_;
+    }
+    void previewControllerDidShowItem(PlatformPreviewController&, const Url&) override {
+        shown = SteadyClock::now();
+    }
+    /// When the document took the place of the empty screen.
+    SteadyClock::time_point shown;
+
+private:
+    Url document_;
+};
+
+/// Looks at what has been painted into the window, not at what was asked to be.
+class Eye : public QObject {
+public:
+    Eye() { QCoreApplication::instance()->installEventFilter(this); }
+    bool eventFilter(QObject* object, QEvent* event) override {
+        if (event->type() == QEvent::Paint)
+            if (auto* const found = dynamic_cast<ZoomWidget*>(object))
+                widget = painted_ = found;
+        return false;
+    }
+    /// The red mark of the document is on the screen, `below` pixels under the preview's top edge.
+    bool seesMark(const std::function<int(const ZoomWidget&)>& below) {
+        const ZoomWidget* const painted = std::exchange(painted_, nullptr);
+        if (!painted)
+            return false;
+        const auto* const screen = dynamic_cast<QImage*>(painted->backingStore()->paintDevice());
+        const QPoint point =
+            painted->mapTo(painted->window(), QPoint(painted->width() / 2, below(*painted)));
+        if (!screen || !screen->rect().contains(point))
+            std::abort();
+        const QColor color = screen->pixelColor(point);
+        return color.red() > 150 && color.green() < 90 && color.blue() < 90;
+    }
+    ZoomWidget* widget = nullptr;
+
+private:
+    ZoomWidget* painted_ = nullptr;
+};
+
+struct Opening {
+    double toScreen = 0;
+    double toShown = 0;
+    double zoom = 1;
+};
+
+Opening open(test::ScreenHouse& house, const Url& document,
+             const std::function<int(const ZoomWidget&)>& below) {
+    Eye eye;
+    Opening opening;
+    const auto start = SteadyClock::now();
+    const auto screen = std::make_shared<OneDocument>(document);
+    house.navigation->setViewControllers({screen}, false);
+    while (!eye.seesMark(below))
+        QCoreApplication::processEvents(QEventLoop::WaitForMoreEvents);
+    opening.toScreen = millisecondsSince(start);
+    opening.toShown = std::chrono::duration<double, std::milli>(screen->shown - start).count();
+    opening.zoom = eye.widget->zoom();
+    house.navigation->setViewControllers({std::make_shared<ViewController>()}, false);
+    settle(std::chrono::milliseconds(150));
+    return opening;
+}
+
+/// The width in pixels for which the preview asks at such a zoom.
+int renderedWidth(QSizeF page, double zoom) {
+    int width = 0;
+    PagesContent content([&](const auto& wishes) { width = wishes.front().second; }, 12);
+    content.set({page}, 1);
+    QImage image(1, 1, QImage::Format_RGB32);
+    QPainter painter(&image);
+    content.paintContent(painter, QRectF(QPointF(), page), zoom);
+    return width;
+}
+
+double barePage(const std::string& path, double zoom, bool asPreview) {
+    const auto start = SteadyClock::now();
+    QPdfDocument document;
+    if (document.load(QString::fromStdString(path)) != QPdfDocument::Error::None)
+        std::abort();
+    const QSizeF page = document.pagePointSize(0);
+    const int width =
+        asPreview ? renderedWidth(page, zoom) : static_cast<int>(std::lround(page.width() * zoom));
+    const QSize size(width, static_cast<int>(std::lround(width * page.height() / page.width())));
+    if (document.render(0, size).isNull())
+        std::abort();
+    return millisecondsSince(start);
+}
+
+double barePicture(const std::string& path) {
+    const auto start = SteadyClock::now();
+    if (QImageReader(QString::fromStdString(path)).read().isNull())
+        std::abort();
+    return millisecondsSince(start);
+}
+
+void measurePdf(test::ScreenHouse& house) {
+    const std::string path = house.givenFile("Report.pdf", madePdf(pages));
+    const auto below = [](const ZoomWidget& widget) {
+        return 12 + static_cast<int>((markTop + markBottom) / 2 * widget.zoom());
+    };
+    settle(std::chrono::seconds(2)); // the store takes note of it
+    const double zoom = open(house, Url::file(path), below).zoom;
+    std::vector<double> ours;
+    std::vector<double> shown;
+    std::vector<double> bare;
+    std::vector<double> bareAsSeen;
+    for (int i = 0; i < rounds; ++i) {
+        bare.push_back(barePage(path, zoom, true));
+        const Opening opening = open(house, Url::file(path), below);
+        ours.push_back(opening.toScreen);
+        shown.push_back(opening.toShown);
+        bareAsSeen.push_back(barePage(path, zoom, false));
+    }
+    print("first page of a 500-page PDF on screen", ours, "QPdfDocument, the page at the same size",
+          bare, "≤ 1.2");
+    print("until its place is on screen, still white", shown,
+          "QPdfDocument, the page not larger than seen", bareAsSeen, "–");
+}
+
+void measurePicture(test::ScreenHouse& house) {
+    const std::string path = house.givenFile("Coast.jpg", madePhoto(6000, 4000));
+    const auto below = [](const ZoomWidget& widget) { return widget.height() / 2; };
+    settle(std::chrono::seconds(2));
+    open(house, Url::file(path), below);
+    std::vector<double> ours;
+    std::vector<double> shown;
+    std::vector<double> bare;
+    for (int i = 0; i < rounds; ++i) {
+        bare.push_back(barePicture(path));
+        const Opening opening = open(house, Url::file(path), below);
+        ours.push_back(opening.toScreen);
+        shown.push_back(opening.toShown);
+    }
+    print("a JPEG of 24 megapixels on screen", ours, "QImageReader", bare, "≤ 1.2");
+    std::printf("of that until it was read and scaled: %.2f ms\n", at(shown, 0.5));
+}
+
+} // namespace
+
+void measureOpening(test::ScreenHouse& house) {
+    measurePdf(house);
+    measurePicture(house);
+}
