@@ -67,7 +67,7 @@ void paintScene(QImage& image) {
 
 } // namespace
 
-std::string madePdf(int pages) {
+std::string madePdf(int pages, Cover cover) {
     QBuffer buffer;
     buffer.open(QIODevice::WriteOnly);
     QPdfWriter writer(&buffer);
@@ -76,6 +76,11 @@ std::string madePdf(int pages) {
     writer.setResolution(72);
     QPainter painter(&writer);
     painter.fillRect(QRectF(0, markTop, writer.width(), markBottom - markTop), mark);
+    if (cover == Cover::photograph) {
+        QImage photo(2400, 1600, QImage::Format_RGB32);
+        paintScene(photo);
+        painter.drawImage(QRectF(50, 100, 495, 330), photo);
+    }
     for (int page = 0; page < pages; ++page) {
         if (page > 0)
             writer.newPage();

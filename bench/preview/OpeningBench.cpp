@@ -137,8 +137,8 @@ double barePicture(const std::string& path) {
     return millisecondsSince(start);
 }
 
-void measurePdf(test::ScreenHouse& house) {
-    const std::string path = house.givenFile("Report.pdf", madePdf(pages));
+void measurePdf(test::ScreenHouse& house, Cover cover, const char* what) {
+    const std::string path = house.givenFile("Report.pdf", madePdf(pages, cover));
     const auto below = [](const ZoomWidget& widget) {
         return 12 + static_cast<int>((markTop + markBottom) / 2 * widget.zoom());
     };
@@ -155,8 +155,7 @@ void measurePdf(test::ScreenHouse& house) {
         shown.push_back(opening.toShown);
         bareAsSeen.push_back(barePage(path, zoom, false));
     }
-    print("first page of a 500-page PDF on screen", ours, "QPdfDocument, the page at the same size",
-          bare, "≤ 1.2");
+    print(what, ours, "QPdfDocument, the page at the same size", bare, "≤ 1.2");
     print("until its place is on screen, still white", shown,
           "QPdfDocument, the page not larger than seen", bareAsSeen, "–");
 }
@@ -182,6 +181,7 @@ void measurePicture(test::ScreenHouse& house) {
 } // namespace
 
 void measureOpening(test::ScreenHouse& house) {
-    measurePdf(house);
+    measurePdf(house, Cover::plain, "first page of a 500-page PDF on screen");
+    measurePdf(house, Cover::photograph, "the same, a photograph of 4 megapixels on it");
     measurePicture(house);
 }
