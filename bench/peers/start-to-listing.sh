@@ -47,6 +47,7 @@ mkdir -p "$home/remote/Documents"
 "$bin/pelmora" ls >/dev/null
 folder=$(echo "$XDG_DATA_HOME"/pelmora/*/Shelfroot/Documents)
 for ((i = 0; i < entries; i++)); do : >"$folder/IMG $i.jpg"; done
+"$bin/pelmora" sync >/dev/null # so that nothing is left to be sent while it is measured
 
 now() { echo $((${EPOCHREALTIME/./} / 1000)); }
 # Processor time of a process in hundredths of a second; nothing once it has ended.
