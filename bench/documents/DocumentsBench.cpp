@@ -10,6 +10,7 @@
 #include "platform/Platform.h"
 #include "platform/cloud/AccountFile.h"
 #include "platform/cloud/CloudDocumentService.h"
+#include "platform/cloud/CloudService.h"
 #include "platform/documents/ListScreen.h"
 #include "platform/documents/list/ListWidget.h"
 #include "platform/ui/Application.h"
@@ -128,6 +129,14 @@ struct Screen {
             ::close(::open(file.c_str(), O_CREAT | O_WRONLY | O_CLOEXEC, 0644));
         }
         return folder;
+    }
+
+    /// Until the account has all of it, so that nothing is sent while the list is measured.
+    void sendAll() const {
+        std::atomic<bool> sent = false;
+        platform->cloud().sync([&](const Failure&) { sent = true; });
+        while (!sent)
+            QCoreApplication::processEvents(QEventLoop::AllEvents, 50);
     }
 
     /// To the first paint with rows in it.
@@ -277,6 +286,7 @@ int main(int argc, char** argv) {
     {
         Screen screen(home);
         const std::string folder = screen.bigFolder(entries);
+        screen.sendAll();
         std::printf("%d entries\n", entries);
         screen.open(folder);
         measureOpening(screen, folder);
