@@ -20,7 +20,7 @@ Function* realCall(const char* name) {
 } // namespace simulation
 
 /// Defines the C library's function `name` for the whole program, libraries included. Under a name
-/// of its own in the source, so that no header's attributes or exception specification interfere.
+/// of its own in the source, so that no header's attributes or `noexcept` interfere.
 #define SIMULATED(result, name, ...)                                                               \
     extern "C" __attribute__((visibility("default"))) result sim_##name(__VA_ARGS__) __asm__(#name); \
     extern "C" result sim_##name(__VA_ARGS__)
