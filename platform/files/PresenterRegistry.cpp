@@ -121,6 +121,7 @@ void PresenterRegistry::setPath(const PresenterRecordPointer& record, const std:
         record->state = {};
         record->handle = {};
         record->entries.clear();
+        record->postponed.clear();
         record->missingSince.reset();
         ++record->version;
         watch.swap(record->watch);
@@ -203,6 +204,7 @@ void PresenterRegistry::endWrite(const WriteScope& scope) {
             finishWrite(scope, record);
     const std::lock_guard lock(mutex_);
     std::erase(scopes_, &scope);
+    takeUpPostponed();
 }
 
 void PresenterRegistry::finishWrite(const WriteScope& scope, const PresenterRecordPointer& record) {
@@ -261,8 +263,11 @@ bool PresenterRegistry::changedByWrite(const WriteScope& scope,
 void PresenterRegistry::noteEntries(PresenterRecord& record, const WriteScope& scope,
                                     const std::string& folder) {
     const auto noteOne = [&](const std::string& path) {
-        if (folderOf(path) == folder)
-            entryChanged(record, std::string(nameOf(path)), PresentedItemState::read(path));
+        if (folderOf(path) != folder)
+            return;
+        const PresentedItemState now = PresentedItemState::read(path);
+        const std::lock_guard lock(mutex_);
+        noteEntry(record, std::string(nameOf(path)), now);
     };
     for (const auto& [from, to] : scope.moves) {
         noteOne(from);
@@ -286,18 +291,26 @@ void PresenterRegistry::noteAllEntries(PresenterRecord& record, const std::strin
         for (const auto& known : record.entries)
             names.insert(known.first);
     }
-    for (const std::string& name : names)
-        entryChanged(record, name, PresentedItemState::read(folder + '/' + name));
+    for (const std::string& name : names) {
+        const PresentedItemState now = PresentedItemState::read(folder + '/' + name);
+        const std::lock_guard lock(mutex_);
+        noteEntry(record, name, now);
+    }
 }
 
-/// Remembers the entry's state. Answers whether it is another one than the presenter knows of.
-bool PresenterRegistry::entryChanged(PresenterRecord& record, const std::string& name,
-                                     const PresentedItemState& now) {
-    const std::lock_guard lock(mutex_);
-    const auto [known, isNew] = record.entries.try_emplace(name, now);
-    if (!isNew && known->second == now)
+/// Called with the lock held: remembers the entry's state. Answers whether it is another one than
+/// the presenter knows of. A hidden file that came and went unseen served somebody's saving.
+bool PresenterRegistry::noteEntry(PresenterRecord& record, const std::string& name,
+                                  const PresentedItemState& now) {
+    const auto known = record.entries.find(name);
+    if (known == record.entries.end()) {
+        if (now.presence == PresentedItemState::Presence::absent && name.starts_with('.'))
+            return false;
+    } else if (known->second == now) {
         return false;
-    known->second = now;
+    }
+    record.entries.insert_or_assign(name, now);
+    ++record.entriesVersion;
     if (record.entries.size() > entryLimit)
         record.entries.clear();
     return true;

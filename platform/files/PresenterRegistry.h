@@ -31,6 +31,10 @@ struct PresenterRecord : std::enable_shared_from_this<PresenterRecord> {
     std::uint64_t version = 0;
     /// Of a folder: the state of its direct entries that the presenter knows, by name.
     std::map<std::string, PresentedItemState> entries;
+    /// Counts every change of `entries`.
+    std::uint64_t entriesVersion = 0;
+    /// Notices of entries that came while somebody wrote, to be looked into when he has finished.
+    std::vector<DirectoryChange> postponed;
     /// When the item was first found missing; it is given a moment to come back.
     std::optional<Duration> missingSince;
     std::unique_ptr<ItemWatch> watch;
@@ -106,10 +110,14 @@ private:
     void itemMissing(const PresenterRecordPointer& record, std::uint64_t version);
     void itemGone(const PresenterRecordPointer& record, std::uint64_t version);
     void watchEntries(PresenterRecord& record);
+    void takeUpPostponed();
     void entriesChanged(const PresenterRecordPointer& record,
                         const std::vector<DirectoryChange>& changes);
-    bool entryChanged(PresenterRecord& record, const std::string& name,
-                      const PresentedItemState& now);
+    std::optional<PresentedItemState> newEntryState(PresenterRecord& record,
+                                                    const std::string& folder,
+                                                    const DirectoryChange& change);
+    static bool noteEntry(PresenterRecord& record, const std::string& name,
+                          const PresentedItemState& now);
     void noteEntries(PresenterRecord& record, const WriteScope& scope, const std::string& folder);
     void noteAllEntries(PresenterRecord& record, const std::string& folder);
     bool beingWritten(std::string_view path) const;

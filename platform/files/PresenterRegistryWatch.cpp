@@ -144,6 +144,41 @@ void PresenterRegistry::watchEntries(PresenterRecord& record) {
         });
 }
 
+/// Called with the lock held, when a write has ended.
+void PresenterRegistry::takeUpPostponed() {
+    for (const PresenterRecordPointer& record : records_)
+        if (!record->postponed.empty() && !beingWritten(record->path))
+            queue_.async([this, weak = std::weak_ptr(record),
+                          changes = std::exchange(record->postponed, {})] {
+                if (const auto alive = weak.lock())
+                    entriesChanged(alive, changes);
+            });
+}
+
+/// The entry's state when it is another one than the presenter knows of; it is known from then on.
+/// None also when a write of the folder has begun; the change is looked into after it.
+std::optional<PresentedItemState> PresenterRegistry::newEntryState(PresenterRecord& record,
+                                                                   const std::string& folder,
+                                                                   const DirectoryChange& change) {
+    const std::string path = folder + '/' + change.name;
+    std::unique_lock lock(mutex_);
+    for (;;) {
+        const std::uint64_t version = record.entriesVersion;
+        lock.unlock();
+        const PresentedItemState now = PresentedItemState::read(path);
+        lock.lock();
+        if (record.path != folder)
+            return std::nullopt;
+        if (beingWritten(folder)) {
+            record.postponed.push_back(change);
+            return std::nullopt;
+        }
+        // A write that began and ended since the look knows better.
+        if (version == record.entriesVersion)
+            return noteEntry(record, change.name, now) ? std::optional(now) : std::nullopt;
+    }
+}
+
 void PresenterRegistry::entriesChanged(const PresenterRecordPointer& record,
                                        const std::vector<DirectoryChange>& changes) {
     const std::string folder = pathOf(*record);
@@ -151,8 +186,12 @@ void PresenterRegistry::entriesChanged(const PresenterRecordPointer& record,
         return; // the folder went with its entries, which examine() tells
     {
         const std::lock_guard lock(mutex_);
-        if (record->path != folder || beingWritten(folder))
+        if (record->path != folder)
             return;
+        if (beingWritten(folder)) {
+            record->postponed.insert(record->postponed.end(), changes.begin(), changes.end());
+            return;
+        }
     }
     bool told = false; // one notice a batch that the folder changed
     for (const DirectoryChange& change : changes) {
@@ -161,10 +200,11 @@ void PresenterRegistry::entriesChanged(const PresenterRecordPointer& record,
         if (change.name.empty() && !overflow)
             continue;
         const Url entry = Url::file(folder + '/' + change.name, change.isDirectory);
-        const auto now = PresentedItemState::read(entry.path());
-        if (!overflow && !entryChanged(*record, change.name, now))
+        const auto now = overflow ? PresentedItemState::read(folder)
+                                  : newEntryState(*record, folder, change);
+        if (!now)
             continue;
-        const bool absent = now.presence == PresentedItemState::Presence::absent;
+        const bool absent = now->presence == PresentedItemState::Presence::absent;
         if (absent && leftFolder(change, changes) && !change.name.starts_with('.'))
             post(record, [entry](FilePresenter& presenter) {
                 presenter.accommodatePresentedSubitemDeletionAtURL(entry, [](const Failure&) {});
