@@ -15,7 +15,7 @@ using platform::ButtonType;
 using platform::layoutRequired;
 using platform::localized;
 
-constexpr double stackSpacing = 8;
+constexpr double barSpacing = 8;
 constexpr double pieSide = 32;
 constexpr int grayPie = 1;
 
@@ -41,7 +41,7 @@ DownloadView::DownloadView(platform::Rect frame) : StackView(frame) {
     setAxis(Axis::vertical);
     setDistribution(platform::StackDistribution::fill);
     setAlignment(platform::StackAlignment::center);
-    setSpacing(stackSpacing);
+    setSpacing(barSpacing);
     buildLabels();
     buildPie();
     buildButtons();

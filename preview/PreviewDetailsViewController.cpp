@@ -26,7 +26,6 @@ constexpr double nameSpacing = 7;
 constexpr double sideInset = 8;
 constexpr double titlePoints = 24;
 constexpr double nameHeightInLines = 1.2;
-constexpr platform::LayoutPriority takesSpareRoom = 249;
 constexpr platform::LayoutPriority almostRequired = 999;
 
 platform::Font titleFont() {

@@ -17,7 +17,6 @@ using platform::Orientation;
 /// Larger files do not start on a cellular network. 100 MiB; exactly so much is allowed.
 constexpr std::uint64_t cellularDownloadLimit = 104'857'600;
 constexpr double stackSpacing = 15;
-constexpr platform::LayoutPriority takesSpareRoom = 249;
 /// The widget hears of at most one report a frame.
 constexpr platform::Duration frameTime{16'666'667};
 

@@ -10,6 +10,9 @@
 
 namespace tavrin {
 
+/// How firmly a picture keeps its own size: less than anything else on its screen.
+inline constexpr platform::LayoutPriority takesSpareRoom = 249;
+
 /// An item's thumbnail, or its type's icon, with a small progress pie in its corner. A thumbnail
 /// that is still to be made takes the icon's place when it is there. Main thread.
 class ThumbnailImageView : public platform::View {

@@ -15,7 +15,6 @@
 namespace platform {
 namespace {
 
-constexpr std::size_t pieceSize = 1024 * 1024;
 /// A folder that others change all the time is read again this often before it is left for later.
 constexpr int listingTries = 3;
 constexpr std::uint64_t largestMark = 256;

@@ -37,6 +37,8 @@ public:
     std::optional<std::string> watchableFolder() const override;
 
 private:
+    /// Contents go either way in pieces of so many bytes.
+    static constexpr std::size_t pieceSize = std::size_t{1024} * 1024;
     struct Upload;
     Error away() const;
     /// The folder that connect() saw still stands at the address.

@@ -15,7 +15,6 @@
 namespace platform {
 namespace {
 
-constexpr std::size_t pieceSize = std::size_t{1024} * 1024;
 /// How many names beside its own are tried for what was displaced by mistake.
 constexpr int placesBeside = 50;
 

@@ -7,7 +7,7 @@
 namespace platform {
 namespace {
 
-constexpr std::size_t pieceSize = std::size_t{1024} * 1024;
+constexpr std::size_t localPieceSize = std::size_t{1024} * 1024;
 
 } // namespace
 
@@ -20,7 +20,7 @@ Result<LocalContent> readLocalContent(StoreFileSystem& disk, const std::string& 
     if (!before)
         return before.error();
     ContentHash hash;
-    std::vector<std::byte> piece(std::min<std::uint64_t>(pieceSize, before->size + 1));
+    std::vector<std::byte> piece(std::min<std::uint64_t>(localPieceSize, before->size + 1));
     for (std::uint64_t offset = 0;;) {
         if (cancel.isCancelled())
             return makeError(ErrorCode::userCancelled);

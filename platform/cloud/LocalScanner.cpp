@@ -14,7 +14,6 @@
 namespace platform {
 namespace {
 
-constexpr int namesAside = 100;
 constexpr std::string_view rootMarkName = ".pelmora-root";
 
 std::string joined(const std::string& folder, std::string_view name) {

@@ -12,7 +12,7 @@ namespace platform {
 namespace {
 
 constexpr auto kept = std::chrono::hours(24 * 30);
-constexpr int attempts = 3;
+constexpr int namesTried = 3;
 
 } // namespace
 
@@ -23,7 +23,7 @@ std::string RemoteTrash::placeFor(const std::string& itemPath, int attempt) cons
     // Replaced more than once a day; or a file of the trash has the name of a folder of the path.
     const std::string mark = '~' + hexText(randomBytes(4));
     const std::string name(cutAtCharacter(nameOf(itemPath), longestItemName - mark.size()));
-    const bool flat = attempt == attempts || itemPath.find('/') == std::string::npos;
+    const bool flat = attempt == namesTried || itemPath.find('/') == std::string::npos;
     return day + (flat ? "" : std::string(folderOf(itemPath)) + '/') + name + mark;
 }
 
@@ -39,7 +39,7 @@ Result<std::string> RemoteTrash::findPlace(const std::string& itemPath,
             failure = arrive(place);
         if (!failure)
             return place;
-        if (attempt == attempts ||
+        if (attempt == namesTried ||
             (!failure->is(ErrorCode::fileExists) && !failure->is(ErrorCode::noSuchItem)))
             return *failure;
     }

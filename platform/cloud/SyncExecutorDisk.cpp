@@ -13,9 +13,6 @@
 namespace platform {
 namespace {
 
-/// How many names are tried for what has to leave its own to another.
-constexpr int namesAside = 100;
-
 std::string joined(const std::string& folder, const std::string& name) {
     return folder.empty() ? name : folder + '/' + name;
 }

@@ -17,7 +17,7 @@ namespace platform {
 namespace {
 
 /// How often a content that changes while it is read is begun anew.
-constexpr int attempts = 3;
+constexpr int fetchAttempts = 3;
 
 } // namespace
 
@@ -142,7 +142,7 @@ Failure Transfers::run(Transfer& transfer) {
     transfer.progress->update(0, static_cast<std::int64_t>(size));
     const auto published = progress_.publish(transfer.url, transfer.progress);
     Failure failure;
-    for (int i = 0; i < attempts; ++i) {
+    for (int i = 0; i < fetchAttempts; ++i) {
         failure = attempt(transfer, *remotePath, size);
         if (!failure || !failure->is(ErrorCode::changedWhileRead))
             break;

@@ -15,7 +15,7 @@ namespace {
 /// How often a document may turn into a promise again between its arrival and the read.
 constexpr int fetchLimit = 8;
 
-AccessKind kindOf(WritingOptions options) {
+AccessKind accessKind(WritingOptions options) {
     const bool structural =
         options == WritingOptions::forDeleting || options == WritingOptions::forMoving;
     return structural ? AccessKind::structuralWrite : AccessKind::contentWrite;
@@ -186,7 +186,7 @@ Failure FileCoordinator::State::write(const Targets& targets,
     AccessClaim claim(this, own.get(), cancelled);
     // Who makes a new item wants it there, wherever what was there before has gone.
     for (const Target& target : targets)
-        claim.add(standardPath(target.item), kindOf(target.options),
+        claim.add(standardPath(target.item), accessKind(target.options),
                   target.options != WritingOptions::forReplacing);
     if (Failure failure = acquire(claim, targets))
         return failure;

@@ -14,7 +14,7 @@ namespace {
 /// One system call's worth of entries: a few thousand names.
 constexpr std::size_t bufferSize = 256UL * 1024;
 
-FileKind kindOf(unsigned char type) {
+FileKind kindOfEntryType(unsigned char type) {
     switch (type) {
     case DT_REG:
         return FileKind::file;
@@ -46,7 +46,7 @@ int listOpenFolder(int folder, const std::function<bool(const DirectoryEntry&)>&
             if (isDotOrDotDot(raw->d_name))
                 continue;
             entry.name.assign(raw->d_name);
-            entry.kind = kindOf(raw->d_type);
+            entry.kind = kindOfEntryType(raw->d_type);
             if (!take(entry))
                 return 0;
         }

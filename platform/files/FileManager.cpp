@@ -13,7 +13,7 @@
 namespace platform {
 namespace {
 
-FileKind kindOf(std::uint32_t mode) {
+FileKind kindOfMode(std::uint32_t mode) {
     switch (mode & S_IFMT) {
     case S_IFREG:
         return FileKind::file;
@@ -32,7 +32,7 @@ Date dateOf(const struct statx_timestamp& stamp) {
 
 FileAttributes attributesOf(const struct statx& info) {
     FileAttributes out;
-    out.kind = kindOf(info.stx_mode);
+    out.kind = kindOfMode(info.stx_mode);
     out.size = info.stx_size;
     out.modified = dateOf(info.stx_mtime);
     out.changed = dateOf(info.stx_ctime);

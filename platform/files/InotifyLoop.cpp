@@ -17,7 +17,7 @@ constexpr std::uint32_t watchedEvents = IN_CREATE | IN_DELETE | IN_MODIFY | IN_C
                                         IN_ATTRIB | IN_MOVED_FROM | IN_MOVED_TO | IN_DELETE_SELF |
                                         IN_MOVE_SELF | IN_EXCL_UNLINK | IN_ONLYDIR;
 
-DirectoryChange::Kind kindOf(std::uint32_t mask) {
+DirectoryChange::Kind kindOfEvent(std::uint32_t mask) {
     using Kind = DirectoryChange::Kind;
     if (mask & (IN_DELETE_SELF | IN_MOVE_SELF | IN_UNMOUNT | IN_IGNORED))
         return Kind::folderGone;
@@ -68,7 +68,7 @@ std::size_t readEvents(int instance, std::span<char> buffer) {
 
 /// The folder's own change of attributes arrives without a name; its watchers hear of entries only.
 bool concernsWatcher(const inotify_event& event) {
-    const bool gone = kindOf(event.mask) == DirectoryChange::Kind::folderGone;
+    const bool gone = kindOfEvent(event.mask) == DirectoryChange::Kind::folderGone;
     return gone || event.len > 0;
 }
 
@@ -222,7 +222,7 @@ void InotifyLoop::sort(const inotify_event& event, Batch& batch) const {
     if (!concernsWatcher(event) || !watches_.contains(event.wd))
         return;
     DirectoryChange change;
-    change.kind = kindOf(event.mask);
+    change.kind = kindOfEvent(event.mask);
     change.isDirectory = (event.mask & IN_ISDIR) != 0;
     change.cookie = event.cookie;
     if (event.len > 0)

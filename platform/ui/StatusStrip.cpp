@@ -17,7 +17,7 @@ namespace {
 constexpr int spinnerSpokes = 8;
 /// One spoke further, so a turn takes 0.8 s.
 constexpr Duration spinnerStep = std::chrono::milliseconds(100);
-constexpr double gap = 6;
+constexpr double partGap = 6;
 
 std::shared_ptr<Label> makeLabel() {
     auto label = std::make_shared<Label>();
@@ -109,7 +109,7 @@ void StatusStrip::layoutSubviews() {
     if (content_.activity) {
         spinner_->setFrame(
             mirrored({end - spinnerSize, middle, spinnerSize, spinnerSize}, area.width));
-        end -= spinnerSize + gap;
+        end -= spinnerSize + partGap;
     }
     // The network's few words stand whole; a long account gives way.
     const double wanted = network_->intrinsicContentSize().width;

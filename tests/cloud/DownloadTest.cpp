@@ -66,10 +66,10 @@ TEST_F(Download, PutsTheWholeContentInPlaceOfThePromise) {
     const auto attributes = FileManager::attributes(url("A/one.txt").path(), FollowLinks::no);
     EXPECT_EQ(attributes->modified, Date::fromParts(1'500'000'000, 123));
     EXPECT_EQ(extendedAttribute(url("A/one.txt").path(), "user.xdg.tags"), "green");
-    const auto one = state("A/one.txt");
-    EXPECT_EQ(one->local->identity, attributes->identity);
-    EXPECT_FALSE(one->local->promise);
-    EXPECT_EQ(one->base->hash.size(), 32U);
+    const auto record = state("A/one.txt");
+    EXPECT_EQ(record->local->identity, attributes->identity);
+    EXPECT_FALSE(record->local->promise);
+    EXPECT_EQ(record->base->hash.size(), 32U);
     EXPECT_EQ(fetch("A/one.txt"), std::nullopt) << "a local file is no work";
 }
 

@@ -159,8 +159,8 @@ TEST_F(Listing, ARemoteThatGoesAwayIsUnknownAndNotEmpty) {
     home.makeFolder("remote"); // the empty mount point of a disk that is not there
     EXPECT_TRUE(refresh()->is(ErrorCode::serverNotAvailable));
     EXPECT_TRUE(isPromised("A/one.txt"));
-    const auto one = state("A/one.txt");
-    EXPECT_EQ(one->remote->generation, 1);
+    const auto record = state("A/one.txt");
+    EXPECT_EQ(record->remote->generation, 1);
 }
 
 TEST_F(Listing, ADeletionOnTheRemoteIsOnlyNotedAndNeedsTwoListings) {

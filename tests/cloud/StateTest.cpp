@@ -118,10 +118,10 @@ TEST_F(State, ADeviceWithAnotherNumberIsTheSameTreeAfterARestart) {
     sql("UPDATE local SET dev = 1; UPDATE base SET dev = 1;"
         "UPDATE meta SET value = '1' WHERE name = 'device'");
     ASSERT_EQ(open(), std::nullopt);
-    const auto one = state("A/one.txt");
+    const auto record = state("A/one.txt");
     const auto attributes = FileManager::attributes(sidecar("A/one.txt")->path, FollowLinks::no);
-    EXPECT_EQ(one->local->identity, attributes->identity);
-    EXPECT_EQ(one->base->identity, attributes->identity);
+    EXPECT_EQ(record->local->identity, attributes->identity);
+    EXPECT_EQ(record->base->identity, attributes->identity);
 }
 
 } // namespace

@@ -18,7 +18,7 @@ namespace {
 
 const std::string homeScreen(platform::homeScreenApplicationIdentifier);
 const std::string testRunner(platform::testRunnerApplicationIdentifier);
-const std::string url = "tavrinapp:///a%2520b?mode=details";
+const std::string deepLink = "tavrinapp:///a%2520b?mode=details";
 
 /// A user's desk: the programs in a folder of their own and an environment to start them in.
 struct Desk : ::testing::Test {
@@ -64,12 +64,12 @@ struct Desk : ::testing::Test {
 
 TEST_F(Desk, TheOpenerStartsTheProgramAndStandsForTheHomeScreen) {
     givenRuntimeFolder();
-    givenCold("tavrin-open", {url});
-    EXPECT_EQ(nextLine(), homeScreen + " " + url);
+    givenCold("tavrin-open", {deepLink});
+    EXPECT_EQ(nextLine(), homeScreen + " " + deepLink);
     EXPECT_EQ(cold->wait(), 0) << "the opener, with the request taken";
-    EXPECT_EQ(run("tavrin-open", {"TavrinApp:///x", url}).status, 0);
+    EXPECT_EQ(run("tavrin-open", {"TavrinApp:///x", deepLink}).status, 0);
     EXPECT_EQ(nextLine(), homeScreen + " TavrinApp:///x") << "as it was given";
-    EXPECT_EQ(nextLine(), homeScreen + " " + url);
+    EXPECT_EQ(nextLine(), homeScreen + " " + deepLink);
     EXPECT_EQ(run("tavrin-open").status, 0) << "only to come forward";
     EXPECT_EQ(run("tavrin-open", {"tavrinapp:///end"}).status, 0);
     EXPECT_EQ(nextLine(), homeScreen + " tavrinapp:///end");
@@ -80,31 +80,31 @@ TEST_F(Desk, TheOpenerStartsTheProgramAndStandsForTheHomeScreen) {
 TEST_F(Desk, ASecondStartIsKnownAsItselfAndTheTestRunnerAsSuch) {
     fs::copy(OPENER, bin + "/tavrin-test-runner");
     givenRuntimeFolder();
-    givenCold("tavrin", {"-style", "fusion", url});
-    EXPECT_EQ(nextLine(), bin + "/tavrin " + url) << "its own arguments vouch for nobody";
-    const Outcome second = run("tavrin", {url});
+    givenCold("tavrin", {"-style", "fusion", deepLink});
+    EXPECT_EQ(nextLine(), bin + "/tavrin " + deepLink) << "its own arguments vouch for nobody";
+    const Outcome second = run("tavrin", {deepLink});
     EXPECT_EQ(second.status, 0);
     EXPECT_THAT(second.output, HasSubstr("runs already"));
-    EXPECT_EQ(nextLine(), bin + "/tavrin " + url);
-    EXPECT_EQ(run("tavrin-test-runner", {url}).status, 0);
-    EXPECT_EQ(nextLine(), testRunner + " " + url);
+    EXPECT_EQ(nextLine(), bin + "/tavrin " + deepLink);
+    EXPECT_EQ(run("tavrin-test-runner", {deepLink}).status, 0);
+    EXPECT_EQ(nextLine(), testRunner + " " + deepLink);
 }
 
 TEST_F(Desk, WithoutRuntimeFolderAndBusAllOfItWorks) {
-    givenCold("tavrin-open", {url});
-    EXPECT_EQ(nextLine(), homeScreen + " " + url);
-    EXPECT_EQ(run("tavrin", {url}).status, 0);
-    EXPECT_EQ(nextLine(), bin + "/tavrin " + url);
+    givenCold("tavrin-open", {deepLink});
+    EXPECT_EQ(nextLine(), homeScreen + " " + deepLink);
+    EXPECT_EQ(run("tavrin", {deepLink}).status, 0);
+    EXPECT_EQ(nextLine(), bin + "/tavrin " + deepLink);
 }
 
 TEST_F(Desk, ACrashedProgramIsNotInTheWay) {
     givenRuntimeFolder();
-    givenCold("tavrin-open", {url});
+    givenCold("tavrin-open", {deepLink});
     nextLine();
     ::kill(running, SIGKILL);
     EXPECT_EQ(nextLine(), "(ended)");
-    givenCold("tavrin-open", {url});
-    EXPECT_EQ(nextLine(), homeScreen + " " + url);
+    givenCold("tavrin-open", {deepLink});
+    EXPECT_EQ(nextLine(), homeScreen + " " + deepLink);
 }
 
 TEST_F(Desk, ABusCallerIsHeardByItsOwnName) {
@@ -115,9 +115,9 @@ TEST_F(Desk, ABusCallerIsHeardByItsOwnName) {
     givenCold("tavrin");
     const std::string call = "exec busctl --user call com.pelmora.Tavrin /com/pelmora/Tavrin "
                              "org.freedesktop.Application Open 'asa{sv}' 1 '" +
-                             url + "' 0";
+                             deepLink + "' 0";
     EXPECT_EQ(test::run({{"/bin/sh", "-c", call}, environment}).status, 0);
-    EXPECT_THAT(nextLine(), HasSubstr("/busctl " + url));
+    EXPECT_THAT(nextLine(), HasSubstr("/busctl " + deepLink));
 }
 
 TEST_F(Desk, InstalledItOpensTheAddressesOfItsScheme) {
@@ -134,11 +134,11 @@ TEST_F(Desk, InstalledItOpensTheAddressesOfItsScheme) {
     ASSERT_EQ(test::run({{INSTALLER, "--programs", bin}, environment}).status, 0);
     const std::string entry = home / ".local/share/applications/com.pelmora.Tavrin.desktop";
     EXPECT_EQ(test::run({{"desktop-file-validate", entry}}).output, "");
-    cold = std::make_unique<Program>(Program::Start{{"xdg-open", url}, environment});
+    cold = std::make_unique<Program>(Program::Start{{"xdg-open", deepLink}, environment});
     const std::string line = nextLine();
     ASSERT_THAT(line, StartsWith("launched "));
     running = std::stoi(line.substr(9));
-    EXPECT_EQ(nextLine(), homeScreen + " " + url);
+    EXPECT_EQ(nextLine(), homeScreen + " " + deepLink);
     EXPECT_EQ(install("--uninstall").status, 0);
     EXPECT_FALSE(fs::exists(entry));
     EXPECT_TRUE(fs::is_empty(home / ".local/bin"));
@@ -154,9 +154,9 @@ TEST_F(Desk, TheOpenerSaysWhatStandsInTheWay) {
     says(run("tavrin-open", {"tavrinapp:/" + std::string(100'000, 'x')}), 2, "names no document");
     says(run("tavrin", {"tavrinapp:/" + std::string(100'000, 'x')}), 2, "names no document");
     fs::remove(bin + "/tavrin");
-    says(run("tavrin-open", {url}), 1, "Install Tavrin again");
+    says(run("tavrin-open", {deepLink}), 1, "Install Tavrin again");
     fs::copy("/bin/false", bin + "/tavrin");
-    says(run("tavrin-open", {url}), 1, "exit status 1");
+    says(run("tavrin-open", {deepLink}), 1, "exit status 1");
 }
 
 } // namespace

@@ -9,6 +9,10 @@
 
 namespace test {
 
+inline constexpr std::uint32_t wifi = platform::reachabilityReachable;
+inline constexpr std::uint32_t cellular =
+    platform::reachabilityReachable | platform::reachabilityCellular;
+
 /// What a target reports, in order.
 class NetworkReports {
 public:

@@ -18,12 +18,12 @@
 #include <sys/wait.h>
 
 using namespace platform;
+using test::cellular;
 using test::NetworkReports;
+using test::wifi;
 
 namespace {
 
-constexpr std::uint32_t wifi = reachabilityReachable;
-constexpr std::uint32_t cellular = reachabilityReachable | reachabilityCellular;
 constexpr int noNamespaces = 77;
 
 /// Gives the process a network of its own, in which nothing is up.

@@ -9,12 +9,11 @@
 
 namespace fs = std::filesystem;
 using namespace platform;
+using test::cellular;
 using test::NetworkReports;
+using test::wifi;
 
 namespace {
-
-constexpr std::uint32_t wifi = reachabilityReachable;
-constexpr std::uint32_t cellular = reachabilityReachable | reachabilityCellular;
 
 struct Scripted : ::testing::Test {
     test::TemporaryFolder folder;

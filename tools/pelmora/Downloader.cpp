@@ -1,6 +1,5 @@
 #include "tools/pelmora/Downloader.h"
 
-#include "platform/base/ByteCount.h"
 #include "platform/files/FileManager.h"
 #include "tools/pelmora/Command.h"
 #include "tools/pelmora/ItemList.h"
@@ -9,15 +8,7 @@
 #include <unistd.h>
 
 namespace pelmora {
-namespace {
-
 using namespace platform;
-
-std::string sizeText(std::int64_t bytes) {
-    return byteCountText(static_cast<std::uint64_t>(bytes), ByteCountStyle::file);
-}
-
-} // namespace
 
 Downloader::Downloader(Session& session) : session_(session), terminal_(isatty(STDOUT_FILENO)) {
 }

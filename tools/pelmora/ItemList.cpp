@@ -1,5 +1,6 @@
 #include "tools/pelmora/ItemList.h"
 
+#include "platform/base/ByteCount.h"
 #include "platform/files/FileManager.h"
 
 #include <algorithm>
@@ -53,6 +54,10 @@ Result<std::vector<ListedItem>> itemsAt(const CloudDocumentService& documents, c
     for (const auto& [name, each] : found)
         items.push_back(itemAt(documents, each));
     return items;
+}
+
+std::string sizeText(std::int64_t bytes) {
+    return byteCountText(static_cast<std::uint64_t>(bytes), ByteCountStyle::file);
 }
 
 } // namespace pelmora

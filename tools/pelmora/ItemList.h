@@ -23,4 +23,7 @@ struct ListedItem {
 platform::Result<std::vector<ListedItem>> itemsAt(const platform::CloudDocumentService& documents,
                                                   const platform::Url& url);
 
+/// For people: "6.3 MB".
+std::string sizeText(std::int64_t bytes);
+
 } // namespace pelmora

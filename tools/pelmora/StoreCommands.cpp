@@ -1,4 +1,3 @@
-#include "platform/base/ByteCount.h"
 #include "platform/base/DateFormat.h"
 #include "tools/pelmora/Command.h"
 #include "tools/pelmora/Downloader.h"
@@ -11,10 +10,6 @@ namespace pelmora {
 namespace {
 
 using namespace platform;
-
-std::string sizeText(std::int64_t bytes) {
-    return byteCountText(static_cast<std::uint64_t>(bytes), ByteCountStyle::file);
-}
 
 void printStatus(const AccountSummary& account, const CloudStatus& status) {
     std::printf("Account:   %s\n", account.name.c_str());

@@ -30,7 +30,7 @@ constexpr std::size_t mostNameBytes = 24UL << 20;
 constexpr rlim_t mostMemory = 512UL << 20;
 /// Seconds of work; the preview, which counts other seconds, ends a silent lister as well.
 constexpr rlim_t mostWork = 120;
-constexpr std::size_t readSize = 64UL << 10;
+constexpr std::size_t archiveReadSize = 64UL << 10;
 constexpr std::size_t flushSize = 64UL << 10;
 constexpr std::chrono::milliseconds flushTime(200);
 
@@ -184,7 +184,7 @@ bool isReadable(archive* reader) {
 
 ArchiveRecord list(archive* reader, Output& output) {
     supportFormats(reader);
-    if (::archive_read_open_fd(reader, STDIN_FILENO, readSize) != ARCHIVE_OK)
+    if (::archive_read_open_fd(reader, STDIN_FILENO, archiveReadSize) != ARCHIVE_OK)
         return endOf(reader, Kind::damaged);
     std::size_t entries = 0;
     std::size_t nameBytes = 0;

@@ -9,11 +9,6 @@ namespace {
 /// Several screens of rows.
 constexpr std::size_t mostContents = 512;
 
-DocumentEntry entryOf(const ContentsTree::Node& node) {
-    return {node.name, node.item.folder ? EntryKind::folder : EntryKind::file, node.item.promised,
-            nullptr};
-}
-
 EntryDetails detailsOf(const ContentsTree::Node& node) {
     EntryDetails details;
     details.size = node.item.size;
@@ -58,7 +53,7 @@ RowContent& ContentsModel::contentAt(const QModelIndex& index) {
         contents_.clear();
     const ContentsTree::Node& node = tree_->node(number);
     const EntryDetails details = detailsOf(node);
-    return contents_.emplace(number, makeRowContent(entryOf(node), &details, remarkOn(node.item)))
+    return contents_.emplace(number, makeRowContent(node.entry(), &details, remarkOn(node.item)))
         .first->second;
 }
 
@@ -91,7 +86,7 @@ QVariant ContentsModel::data(const QModelIndex& index, int role) const {
 }
 
 QString ContentsModel::spokenText(const ContentsTree::Node& node) const {
-    const DocumentEntry entry = entryOf(node);
+    const DocumentEntry entry = node.entry();
     const EntryDetails details = detailsOf(node);
     const std::vector<QString> forms = rowDetails(entry, &details, remarkOn(node.item));
     return forms.empty() ? shownName(node.name)

@@ -32,10 +32,6 @@ std::string keyOf(std::uint32_t folder, std::string_view name) {
     return std::to_string(folder).append(1, '/').append(name);
 }
 
-DocumentEntry entryOf(const ContentsTree::Node& node) {
-    return {node.name, node.item.folder ? EntryKind::folder : EntryKind::file, false, nullptr};
-}
-
 } // namespace
 
 ContentsTree::ContentsTree() : nodes_(1) {
@@ -110,7 +106,7 @@ void ContentsTree::sortChildren(Node& folder, const NameOrder& order, const Canc
     std::vector<std::uint32_t>& children = folder.children;
     if (children.size() < largeFolder) {
         std::sort(children.begin(), children.end(), [&](std::uint32_t a, std::uint32_t b) {
-            return order.before(entryOf(nodes_[a]), entryOf(nodes_[b]));
+            return order.before(nodes_[a].entry(), nodes_[b].entry());
         });
         return;
     }
@@ -119,7 +115,7 @@ void ContentsTree::sortChildren(Node& folder, const NameOrder& order, const Canc
     entries.reserve(children.size());
     for (const std::uint32_t number : children) {
         numbers.emplace(nodes_[number].name, number);
-        entries.push_back(entryOf(nodes_[number]));
+        entries.push_back(nodes_[number].entry());
     }
     sortEntries(entries, cancel);
     std::transform(entries.begin(), entries.end(), children.begin(),

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "platform/base/Date.h"
+#include "platform/documents/model/DocumentEntry.h"
 #include "platform/files/ContentProvider.h"
 
 #include <cstdint>
@@ -35,6 +36,11 @@ public:
         /// Among its parent's children, once sorted.
         std::uint32_t row = 0;
         std::vector<std::uint32_t> children;
+
+        /// As a row of a list.
+        DocumentEntry entry() const {
+            return {name, item.folder ? EntryKind::folder : EntryKind::file, item.promised, nullptr};
+        }
     };
     static constexpr std::uint32_t root = 0;
 

@@ -16,7 +16,7 @@ namespace platform {
 namespace {
 
 /// A picture with more pixels is read smaller: that many take 128 MB, and no screen has more.
-constexpr double mostPixels = 32e6;
+constexpr double mostPicturePixels = 32e6;
 constexpr int smallestLevel = 512;
 
 /// The picture and its halves, quarters and so on: drawing from the nearest one is fast and smooth.
@@ -106,7 +106,7 @@ private:
 
     static Failure decode(const Url& file, const std::string& path, const PreviewToken& token,
                           Pyramid& into) {
-        Result<Picture> picture = readPicture(file, path, mostPixels, token);
+        Result<Picture> picture = readPicture(file, path, mostPicturePixels, token);
         if (!picture)
             return picture.error();
         into = buildPyramid(std::move(picture->image), picture->fullSize);

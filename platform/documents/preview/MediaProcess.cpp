@@ -11,7 +11,7 @@
 namespace platform {
 namespace {
 
-constexpr std::size_t readSize = 256UL * 1024;
+constexpr std::size_t mediaReadSize = 256UL * 1024;
 /// Of one turn of the event loop; the rest is read in the next one.
 constexpr std::size_t mostAtOnce = 16UL * 1024 * 1024;
 
@@ -76,7 +76,7 @@ void MediaProcess::wish(MediaWish wish, std::int64_t value) {
 }
 
 void MediaProcess::read() {
-    std::array<char, readSize> bytes;
+    std::array<char, mediaReadSize> bytes;
     for (std::size_t all = 0; all < mostAtOnce;) {
         const ssize_t got = ::recv(child_->socket.get(), bytes.data(), bytes.size(), MSG_DONTWAIT);
         if (got < 0 && (errno == EAGAIN || errno == EINTR))

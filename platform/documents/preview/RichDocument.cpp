@@ -2,6 +2,7 @@
 
 #include "platform/documents/preview/CleanHtml.h"
 #include "platform/documents/preview/MarkdownText.h"
+#include "platform/documents/preview/PageMetrics.h"
 #include "platform/documents/preview/PictureFile.h"
 #include "platform/documents/preview/PreviewWorker.h"
 #include "platform/documents/preview/TextFile.h"
@@ -35,17 +36,15 @@ constexpr std::uint64_t longestSource = 1024ULL * 1024;
 /// Of a picture's file beside the text.
 constexpr off_t longestPicture = 16LL * 1024 * 1024;
 /// Of all pictures of a text together; 64 MB. None needs more than twice a wide column.
-constexpr double mostPixels = 16e6;
+constexpr double mostPixelsTogether = 16e6;
 constexpr double mostPixelsEach = 2e6;
 /// Each is decoded, however small it is drawn.
 constexpr qsizetype mostPictures = 200;
 /// About 85 letters: longer lines are hard to follow.
-constexpr double widestColumn = 720;
-constexpr double narrowestColumn = 120;
+constexpr double widestTextColumn = 720;
+constexpr double narrowestTextColumn = 120;
 constexpr double sideMargin = Theme::phoneMargin;
-constexpr double edge = 20;
-/// The end can be drawn above the buttons that float over the page.
-constexpr double edgeBelow = 112;
+constexpr double pageEdge = 20;
 
 /// Loads nothing. An empty answer for a picture would let the toolkit look for a file of its name.
 class SealedDocument final : public QTextDocument {
@@ -82,7 +81,7 @@ private:
                            ? written(address)
                            : beside(address);
         const double pixels = static_cast<double>(image.width()) * image.height();
-        if (image.isNull() || pixels + pixels_ > mostPixels)
+        if (image.isNull() || pixels + pixels_ > mostPixelsTogether)
             return std::nullopt;
         pixels_ += pixels;
         const QString name = QStringLiteral("picture-%1").arg(images_.size());
@@ -260,16 +259,16 @@ Result<bool> RichDocument::read(const Url& file, const std::string& path, RichFo
 }
 
 double RichDocument::columnWidth() const {
-    return std::clamp(std::floor(shape_.viewWidth - 2 * sideMargin), narrowestColumn, widestColumn);
+    return std::clamp(std::floor(shape_.viewWidth - 2 * sideMargin), narrowestTextColumn, widestTextColumn);
 }
 
 QPointF RichDocument::corner() const {
-    return {std::max(sideMargin, std::floor((shape_.viewWidth - columnWidth()) / 2)), edge};
+    return {std::max(sideMargin, std::floor((shape_.viewWidth - columnWidth()) / 2)), pageEdge};
 }
 
 double RichDocument::layOut(const Shape& shape, double top) {
-    const bool scrolled = document_ && top > edge;
-    const Spot spot = scrolled ? spotAt(*document_, top - edge) : Spot();
+    const bool scrolled = document_ && top > pageEdge;
+    const Spot spot = scrolled ? spotAt(*document_, top - pageEdge) : Spot();
     shape_ = shape;
     document_ = std::make_unique<SealedDocument>();
     document_->setUndoRedoEnabled(false);
@@ -284,14 +283,14 @@ double RichDocument::layOut(const Shape& shape, double top) {
     fitPictures(*document_, columnWidth());
     document_->setTextWidth(columnWidth());
     document_->documentLayout()->documentSize(); // lays out to the end
-    return scrolled ? topOf(*document_, spot) + edge : top;
+    return scrolled ? topOf(*document_, spot) + pageEdge : top;
 }
 
 QSizeF RichDocument::pageSize() const {
     // A wide table reaches beyond the column.
     const QSizeF size = document_->documentLayout()->documentSize();
     return {std::max(shape_.viewWidth, std::ceil(corner().x() + size.width())),
-            std::ceil(edge + size.height() + edgeBelow)};
+            std::ceil(pageEdge + size.height() + pageMetrics::edgeBelow)};
 }
 
 QImage RichDocument::draw(double top, double height, int width) const {

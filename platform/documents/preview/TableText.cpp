@@ -10,7 +10,7 @@ namespace {
 constexpr char other = '\x80';
 constexpr std::string_view separators = ",;\t|";
 /// So many rows tell which sign separates cells.
-constexpr int telltaleRows = 50;
+constexpr int rowsToTellSeparator = 50;
 
 /// How many rows have the most common count of cells, more than one; and that count.
 struct Evenness {
@@ -23,7 +23,7 @@ Evenness evennessOf(const TableText& text, std::string_view head, bool whole) {
     constexpr std::size_t mostCells = 1000;
     std::map<std::size_t, int> counts;
     std::size_t from = 0;
-    for (int row = 0; row < telltaleRows && from < head.size(); ++row) {
+    for (int row = 0; row < rowsToTellSeparator && from < head.size(); ++row) {
         const std::size_t end = text.rowEnd(head, from);
         if (end == TableText::npos && row > 0 && !whole)
             break; // cut by the end of the sample

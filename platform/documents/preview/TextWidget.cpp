@@ -1,5 +1,6 @@
 #include "platform/documents/preview/TextWidget.h"
 
+#include "platform/documents/preview/PageMetrics.h"
 #include "platform/ui/Direction.h"
 #include "platform/ui/Theme.h"
 #include "platform/ui/qt/Bridge.h"
@@ -19,14 +20,10 @@
 namespace platform {
 namespace {
 
-constexpr double notch = 120;
-constexpr double stepPerNotch = 80;
-constexpr double keyStep = 48;
-constexpr double edge = 12;
-/// The end of the text can be drawn above the buttons that float over it.
-constexpr double edgeBelow = 112;
-constexpr int scrollBarWidth = 12;
-constexpr int scrollBarSteps = 1'000'000;
+using namespace pageMetrics;
+
+constexpr double lineStep = 48;
+constexpr double textEdge = 12;
 /// More is asked for when fewer are left.
 constexpr std::size_t fewLines = 200;
 constexpr double narrowestLine = 40;
@@ -130,7 +127,7 @@ double TextWidget::lineWidth() const {
 }
 
 void TextWidget::shape() {
-    column_.setShape(textFont(zoom_), lineWidth(), std::max(1.0, height() - edge - edgeBelow));
+    column_.setShape(textFont(zoom_), lineWidth(), std::max(1.0, height() - textEdge - edgeBelow));
     updateScrollBar();
 }
 
@@ -194,7 +191,7 @@ void TextWidget::paintEvent(QPaintEvent* /*event*/) {
             paintNumber(painter, line, y, height);
         };
     painter.setPen(toQt(Theme::text));
-    column_.paint(painter, {textLeft(), edge}, height(), aside);
+    column_.paint(painter, {textLeft(), textEdge}, height(), aside);
 }
 
 void TextWidget::paintGutter(QPainter& painter) const {
@@ -292,13 +289,13 @@ void TextWidget::keyPressEvent(QKeyEvent* event) {
         QWidget::keyPressEvent(event);
         return;
     }
-    const double page = std::max(keyStep, height() - 2 * keyStep);
+    const double page = std::max(lineStep, height() - 2 * lineStep);
     switch (event->key()) {
     case Qt::Key_Down:
-        scrollBy(keyStep);
+        scrollBy(lineStep);
         break;
     case Qt::Key_Up:
-        scrollBy(-keyStep);
+        scrollBy(-lineStep);
         break;
     case Qt::Key_PageDown:
     case Qt::Key_Space:

@@ -19,7 +19,7 @@ namespace {
 /// Drawn once, at most that many times as large as the file says: no view enlarges further.
 constexpr double largestScale = 8;
 /// 32 MB; four times the pixels of a large screen.
-constexpr double mostPixels = 8e6;
+constexpr double mostDrawnPixels = 8e6;
 /// The painter's own limit of coordinates.
 constexpr double longestEdge = 32'000;
 /// Longer texts are maps and plans whose tree alone takes half a gigabyte.
@@ -117,7 +117,7 @@ Result<Picture> drawVectorPicture(const Url& file, QFile& content, const Preview
     const QSizeF size = sizeOf(renderer);
     const double scale =
         std::min({largestScale, longestEdge / std::max(size.width(), size.height()),
-                  std::sqrt(mostPixels / (size.width() * size.height()))});
+                  std::sqrt(mostDrawnPixels / (size.width() * size.height()))});
     const QSize pixels = (size * scale).toSize().expandedTo({1, 1});
     QImage image = draw(renderer, pixels, token);
     if (image.isNull())

@@ -1,6 +1,7 @@
 #include "platform/documents/preview/ZoomWidget.h"
 
 #include "platform/base/Runtime.h"
+#include "platform/documents/preview/PageMetrics.h"
 #include "platform/ui/qt/Bridge.h"
 
 #include <QKeyEvent>
@@ -17,14 +18,12 @@
 namespace platform {
 namespace {
 
-constexpr double notch = 120;
+using namespace pageMetrics;
+
 constexpr double zoomPerNotch = 1.2;
-constexpr double stepPerNotch = 80;
 constexpr double keyStep = 60;
 constexpr double doubleTapZoom = 2.5;
 constexpr double slop = 10;
-constexpr int scrollBarWidth = 12;
-constexpr int scrollBarSteps = 1'000'000;
 constexpr Duration doubleTapTime = std::chrono::milliseconds(350);
 constexpr double doubleTapReach = 40;
 

@@ -10,7 +10,7 @@ namespace {
 /// How far, in points, a requirement may be missed before it counts as missed.
 constexpr double violationTolerance = 1e-6;
 constexpr double violationShare = 1e-9;
-constexpr double forceTolerance = 1e-7;
+constexpr double conflictForce = 1e-7;
 
 } // namespace
 
@@ -69,7 +69,7 @@ void Solver::State::resolve() {
 std::vector<Row> Solver::State::contradiction() const {
     std::vector<Row> involved = suspects;
     for (std::size_t slot = 0; slot < tight.size(); ++slot)
-        if (std::abs(forces[slot * levelCount() + requiredLevel]) > forceTolerance)
+        if (std::abs(forces[slot * levelCount() + requiredLevel]) > conflictForce)
             involved.push_back(tight[slot]);
     return involved;
 }

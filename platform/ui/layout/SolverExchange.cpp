@@ -8,7 +8,7 @@ namespace platform::layout {
 namespace {
 
 constexpr double slopeTolerance = 1e-9;
-constexpr double forceNoise = 1e-13;
+constexpr double exchangeNoise = 1e-13;
 /// A row whose value changes less than this along the way is taken as not changing.
 constexpr double rateNoise = 1e-10;
 /// Nearer than this, in points, is no way at all.
@@ -216,7 +216,7 @@ void Solver::State::handOver(std::size_t slot, int direction, const Meeting& ent
     for (std::size_t level = 0; level < levelCount(); ++level) {
         const double force = forces[slot * levelCount() + level];
         const double taken = (force - direction * weightAt(kept, level)) / share;
-        if (std::abs(taken) > forceNoise)
+        if (std::abs(taken) > exchangeNoise)
             combination.ascending([&](std::size_t other, double part) {
                 if (other != slot && part != 0)
                     changeForce(other, level, -taken * part);
