@@ -4,6 +4,7 @@
 #include "platform/ui/qt/TextFieldImpl.h"
 
 #include <algorithm>
+#include <utility>
 
 namespace platform {
 
@@ -21,8 +22,11 @@ std::string TextField::text() const {
 }
 
 void TextField::setText(std::string_view text) {
-    if (TextFieldWidget* const edit = implOf(*this).edit()) {
+    TextFieldImpl& impl = implOf(*this);
+    if (TextFieldWidget* const edit = impl.edit()) {
+        const bool outer = std::exchange(impl.programSets, true);
         edit->setText(toQt(text));
+        impl.programSets = outer;
         edit->updateClearButton();
     }
 }

@@ -62,11 +62,10 @@ TextFieldWidget::TextFieldWidget() {
         // As the user's own deletion: undo brings the text back.
         selectAll();
         del();
-        if (impl_)
-            impl_->userEdited();
     });
-    QObject::connect(this, &QLineEdit::textEdited, this, [this] {
-        if (impl_)
+    // Not textEdited: what is typed for the user by a screen reader's tools comes without it.
+    QObject::connect(this, &QLineEdit::textChanged, this, [this] {
+        if (impl_ && !impl_->programSets)
             impl_->userEdited();
     });
 }

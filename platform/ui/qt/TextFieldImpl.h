@@ -58,6 +58,8 @@ struct TextFieldImpl : View::Impl {
     bool clearsWhileEditing = false;
     /// Draws its own box; not inside an alert, which draws it around the field.
     bool bordered = true;
+    /// The program itself is changing the text.
+    bool programSets = false;
     std::function<void(TextField&)> edited;
     std::function<void(TextField&)> returned;
 };
