@@ -1,6 +1,7 @@
 #include "platform/documents/DocumentTargetSelectionController.h"
 
 #include "platform/base/NotificationCenter.h"
+#include "platform/base/Text.h"
 #include "platform/cloud/CloudAccountService.h"
 #include "platform/cloud/CloudDocumentService.h"
 #include "platform/documents/DocumentServices.h"
@@ -66,6 +67,7 @@ DocumentTargetSelectionController::DocumentTargetSelectionController(std::unique
     impl_->self = this;
     setModalPresentationStyle(PresentationStyle::overCurrentContext);
     setExtendsUnderBars(true);
+    setTitle(localized("Move"));
 }
 
 DocumentTargetSelectionController::~DocumentTargetSelectionController() = default;

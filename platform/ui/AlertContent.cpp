@@ -87,8 +87,7 @@ void AlertController::Content::build() {
             whole->setNeedsLayout();
     };
     panel = std::make_shared<AlertPanel>(parts, choose, resized);
-    panel->impl().role = QAccessible::Dialog;
-    panel->setAccessibleName(title.empty() ? message : title);
+    owner.impl().dialogName = title.empty() ? message : title;
     card->addSubview(panel);
     view.addSubview(card);
     if (apart) {

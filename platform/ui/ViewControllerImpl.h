@@ -60,6 +60,8 @@ struct ViewController::Impl {
     std::optional<Entrance> entrance;
     /// Lies over the others without taking their place (an alert).
     bool isOverlay = false;
+    /// What screen readers call it while it stands before others; its title when it is empty.
+    std::string dialogName;
     /// Where the keyboard goes when the screen has come in.
     std::function<void()> takeInitialFocus;
 };

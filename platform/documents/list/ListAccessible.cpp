@@ -3,6 +3,7 @@
 #include "platform/base/Text.h"
 #include "platform/documents/list/ListWidget.h"
 #include "platform/ui/qt/Bridge.h"
+#include "platform/ui/qt/FocusOrder.h"
 
 #include <QAccessible>
 #include <QAccessibleWidget>
@@ -62,7 +63,7 @@ public:
             return result;
         }
         const ListState& list = listState();
-        result.disabled = !list.allows(*at);
+        result.disabled = !list.allows(*at) || !isWithinReach(*list_);
         result.focusable = !result.disabled;
         result.focused = list.hasFocus && list.current == row_;
         result.selectable = list.editing;
@@ -92,7 +93,7 @@ public:
 
     void doAction(const QString& name) override {
         const std::optional<std::size_t> at = index();
-        if (!at || !listState().allows(*at))
+        if (!at || !listState().allows(*at) || !isWithinReach(*list_))
             return;
         ListState& list = listState();
         list.reveal(*at, false);

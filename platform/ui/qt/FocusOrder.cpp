@@ -2,6 +2,7 @@
 
 #include "platform/ui/qt/Settings.h"
 #include "platform/ui/qt/ViewImpl.h"
+#include "platform/ui/qt/WindowWidget.h"
 
 #include <QApplication>
 
@@ -53,6 +54,20 @@ std::vector<QWidget*> focusOrder(const QWidget& scope) {
     std::vector<QWidget*> stops;
     collect(scope, stops);
     return stops;
+}
+
+bool isWithinReach(const QWidget& widget) {
+    const auto* const window = dynamic_cast<const WindowWidget*>(widget.window());
+    const QWidget* const scope = window ? window->focusScope() : nullptr;
+    if (!widget.isVisible())
+        return false;
+    bool inScope = scope == nullptr;
+    for (const QWidget* each = &widget; each; each = each->parentWidget()) {
+        if (each->testAttribute(Qt::WA_TransparentForMouseEvents))
+            return false;
+        inScope = inScope || each == scope;
+    }
+    return inScope;
 }
 
 bool moveFocus(const QWidget& scope, bool forward) {

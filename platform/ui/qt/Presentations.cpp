@@ -30,6 +30,17 @@ std::shared_ptr<View> makeHost(bool transparent) {
 
 } // namespace
 
+/// What lies below a screen that leaves it in sight cannot be reached: readers are told so.
+void Presentations::sayWhatItIs(const Presentation& presentation, bool inForce) {
+    if (presentation.covers)
+        return;
+    View& host = *presentation.host;
+    const ViewController& screen = *presentation.screen;
+    const std::string& name = screen.impl().dialogName;
+    host.impl().role = inForce ? QAccessible::Dialog : QAccessible::Client;
+    host.setAccessibleName(name.empty() ? screen.title() : name);
+}
+
 void Presentations::present(const std::shared_ptr<ViewController>& screen, bool animated,
                             Completion completion) {
     if (!screen || screen->parentViewController() || indexOf(*screen) < chain_.size()) {
@@ -51,6 +62,7 @@ void Presentations::present(const std::shared_ptr<ViewController>& screen, bool 
     screen->impl().presentedIn = &window_;
     added->host = makeHost(screen->impl().isOverlay);
     added->host->addSubview(screen->view());
+    sayWhatItIs(*added, true);
     chain_.push_back(added);
     window_.impl().addHost(added->host);
     place(*added);
@@ -134,6 +146,7 @@ void Presentations::remove(std::size_t index, bool animated, Completion completi
         chain_[index]->focusBefore = removed->focusBefore;
     removed->completion = std::move(completion);
     removed->host->setUserInteractionEnabled(false);
+    sayWhatItIs(*removed, false);
 
     const bool moves = animated && window_.isVisible();
     if (uncovered && uncovered->isViewLoaded())

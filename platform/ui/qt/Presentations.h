@@ -64,6 +64,7 @@ private:
     void wentOut(const Pointer& presentation, const std::shared_ptr<ViewController>& uncovered,
                  bool animated);
     void animate(const Pointer& presentation, bool in, bool animated, Completion done);
+    static void sayWhatItIs(const Presentation& presentation, bool inForce);
     void restoreFocus(const Presentation& presentation, std::size_t index) const;
     void place(const Presentation& presentation) const;
 

@@ -2,6 +2,8 @@
 
 #include "platform/ui/Theme.h"
 #include "platform/ui/qt/Bridge.h"
+#include "platform/ui/qt/ButtonImpl.h"
+#include "platform/ui/qt/FocusOrder.h"
 #include "platform/ui/qt/Settings.h"
 #include "platform/ui/qt/ViewImpl.h"
 
@@ -25,7 +27,8 @@ bool isTapKey(const QKeyEvent& event) {
            event.key() == Qt::Key_Space || event.key() == Qt::Key_Select;
 }
 
-/// The role and, for a view that can be tapped, the press action.
+/// The role and, for what can be pressed, the press action. What is out of reach for a finger is so
+/// for everybody, and says so.
 class ViewAccessible : public QAccessibleWidget {
 public:
     explicit ViewAccessible(QWidget* widget) : QAccessibleWidget(widget) {}
@@ -37,31 +40,47 @@ public:
     QAccessible::State state() const override {
         QAccessible::State state = QAccessibleWidget::state();
         state.modal = role() == QAccessible::Dialog;
+        state.disabled = state.disabled || (canBePressed() && !isWithinReach(*widget()));
         return state;
     }
     QStringList actionNames() const override {
-        const View::Impl* const impl = implOf(widget());
         QStringList names = QAccessibleWidget::actionNames();
-        if (impl && !impl->tapHandlers.empty())
+        if (canBePressed())
             names.prepend(pressAction());
         return names;
     }
     void doAction(const QString& name) override {
-        View::Impl* const impl = implOf(widget());
-        if (impl && name == pressAction())
-            impl->activateTap();
-        else
+        if (name != pressAction() || !canBePressed())
             QAccessibleWidget::doAction(name);
+        else if (widget()->isEnabled() && isWithinReach(*widget()))
+            press();
     }
+
+protected:
+    virtual bool canBePressed() const {
+        const View::Impl* const impl = implOf(widget());
+        return impl && !impl->tapHandlers.empty();
+    }
+    virtual void press() { implOf(widget())->activateTap(); }
 };
 
-QAccessibleInterface* makeInterface(const QString& className, QObject* object) {
-    // No class of ours has a meta-object of its own, so all of them arrive as plain widgets.
-    if (className != QLatin1String("QWidget") || !object || !object->isWidgetType())
-        return nullptr;
-    if (auto* const widget = dynamic_cast<ViewWidget*>(object))
-        return new ViewAccessible(widget);
-    return nullptr;
+/// Pressed at once, where the toolkit's own would press a moment later.
+class ButtonAccessible final : public ViewAccessible {
+public:
+    using ViewAccessible::ViewAccessible;
+
+protected:
+    bool canBePressed() const override { return true; }
+    void press() override { static_cast<ButtonWidget*>(widget())->click(); }
+};
+
+QAccessibleInterface* makeViewInterface(const QString& /*className*/, QObject* object) {
+    // No class of ours has a meta-object of its own, so all of them arrive under the toolkit's
+    // names.
+    if (auto* const button = dynamic_cast<ButtonWidget*>(object))
+        return new ButtonAccessible(button);
+    auto* const view = dynamic_cast<ViewWidget*>(object);
+    return view ? new ViewAccessible(view) : nullptr;
 }
 
 } // namespace
@@ -79,7 +98,7 @@ void paintFocusRing(QPainter& painter, const QRectF& bounds, double cornerRadius
 void installAccessibility() {
     static bool installed = false;
     if (!std::exchange(installed, true))
-        QAccessible::installFactory(makeInterface);
+        QAccessible::installFactory(makeViewInterface);
 }
 
 bool ViewWidget::event(QEvent* event) {

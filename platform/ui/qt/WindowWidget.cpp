@@ -49,6 +49,10 @@ void WindowWidget::postLayout() {
         QCoreApplication::postEvent(this, new QEvent(layoutEventType()), Qt::HighEventPriority);
 }
 
+const QWidget* WindowWidget::focusScope() const {
+    return window_ ? &window_->impl().focusScope() : nullptr;
+}
+
 bool WindowWidget::event(QEvent* event) {
     if (event->type() == layoutEventType()) {
         layoutPosted_ = false;

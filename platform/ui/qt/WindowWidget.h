@@ -14,6 +14,8 @@ public:
     void detach() { window_ = nullptr; }
     /// Asks for one layout pass at the end of this turn of the event loop.
     void postLayout();
+    /// What the keyboard can reach at the moment; none when the window has gone.
+    const QWidget* focusScope() const;
 
 protected:
     bool event(QEvent* event) override;
