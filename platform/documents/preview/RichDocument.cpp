@@ -293,6 +293,10 @@ QSizeF RichDocument::pageSize() const {
             std::ceil(pageEdge + size.height() + pageMetrics::edgeBelow)};
 }
 
+QString RichDocument::plainText() const {
+    return document_ ? document_->toPlainText() : QString();
+}
+
 QImage RichDocument::draw(double top, double height, int width) const {
     const double scale = width / pageSize().width();
     QImage image(width, std::max(1, static_cast<int>(std::lround(height * scale))),

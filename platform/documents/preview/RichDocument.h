@@ -45,6 +45,8 @@ public:
     /// Lays out what was read; answers where that which was at `top` is now.
     double layOut(const Shape& shape, double top);
     QSizeF pageSize() const;
+    /// All of its text, once it is laid out.
+    QString plainText() const;
     /// The part of the page from `top` on, that high; so many pixels wide.
     QImage draw(double top, double height, int width) const;
     /// "" for none.

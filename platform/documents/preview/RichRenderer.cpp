@@ -119,7 +119,9 @@ private:
             if (!slot->document->isRead())
                 return [this] { showSource(); };
             const double now = slot->document->layOut(shape, top);
-            return [this, shape, top, now, page = slot->document->pageSize()] {
+            return [this, shape, top, now, page = slot->document->pageSize(),
+                    text = slot->document->plainText()] {
+                widget_->setReadableText(text);
                 show(shape, page, top, now);
                 reports_.shown();
             };

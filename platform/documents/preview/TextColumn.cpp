@@ -39,6 +39,16 @@ bool TextColumn::holds(std::uint64_t offset) const {
     return !isEmpty() && offset >= firstOffset() && offset < endOffset();
 }
 
+QString TextColumn::text() const {
+    QString all;
+    for (const Laid& laid : lines_) {
+        all += laid.line.text;
+        if (!laid.line.goesOn)
+            all += u'\n';
+    }
+    return all;
+}
+
 void TextColumn::set(std::vector<TextLine> lines, std::uint64_t top) {
     lines_.clear();
     top_ = 0;

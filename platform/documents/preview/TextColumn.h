@@ -35,6 +35,9 @@ public:
     /// Where the last line in view ends.
     std::uint64_t bottomOffset();
 
+    /// All that is known, in one.
+    QString text() const;
+
     /// Puts these lines in place of all; the last that does not begin behind `top` is the first in
     /// view.
     void set(std::vector<TextLine> lines, std::uint64_t top);

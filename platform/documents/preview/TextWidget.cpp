@@ -49,6 +49,7 @@ TextWidget::TextWidget(Wishes wishes, Style style)
       column_(style == Style::code ? Qt::LeftToRight : Qt::LayoutDirectionAuto),
       scrollBar_(new QScrollBar(Qt::Vertical, this)),
       flinger_([this](Point stretch) { return scrollBy(-stretch.y); }) {
+    installTextAccessibility();
     setFocusPolicy(Qt::StrongFocus);
     setAttribute(Qt::WA_AcceptTouchEvents);
     scrollBar_->setFocusPolicy(Qt::NoFocus);

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "platform/documents/preview/Flinger.h"
+#include "platform/documents/preview/ReadableText.h"
 #include "platform/documents/preview/TextColumn.h"
 
 #include <QWidget>
@@ -13,7 +14,7 @@ class QTouchEvent;
 namespace platform {
 
 /// Shows the lines of a text around one place and asks for more before they run out.
-class TextWidget : public QWidget {
+class TextWidget : public QWidget, public ReadableText {
 public:
     /// What it wants read; answered by the three functions below, or not at all.
     struct Wishes {
@@ -37,6 +38,8 @@ public:
     /// Where the first line in view begins.
     std::uint64_t topOffset() const;
     void zoomBy(double factor);
+    /// The lines that it has at the moment.
+    QString readableText() const override { return column_.text(); }
 
 protected:
     bool event(QEvent* event) override;

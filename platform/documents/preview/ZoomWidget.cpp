@@ -50,6 +50,7 @@ ZoomWidget::ZoomWidget(std::unique_ptr<ZoomContent> content, const Settings& set
       flinger_([this](Point stretch) {
           return moveBy({stretch.x, stretch.y});
       }) {
+    installTextAccessibility();
     setFocusPolicy(Qt::StrongFocus);
     setAttribute(Qt::WA_AcceptTouchEvents);
     setAttribute(Qt::WA_OpaquePaintEvent, false);

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "platform/documents/preview/Flinger.h"
+#include "platform/documents/preview/ReadableText.h"
 #include "platform/documents/preview/ZoomPlace.h"
 #include "platform/ui/Color.h"
 
@@ -26,7 +27,7 @@ public:
 
 /// A view through which one sees a part of something larger: drags and flings, wheel, keys, pinch,
 /// double tap. Keeps the content fitted until somebody zooms.
-class ZoomWidget : public QWidget {
+class ZoomWidget : public QWidget, public ReadableText {
 public:
     struct Settings {
         ZoomPlace::Limits limits;
@@ -57,6 +58,9 @@ public:
     /// Called for a tap or click at a place of the content; answers whether that was for it. Else
     /// the second one zooms.
     void setTapHandler(std::function<bool(QPointF content)> tapped) { tapped_ = std::move(tapped); }
+    /// Of content that is text.
+    void setReadableText(const QString& text) { text_ = text; }
+    QString readableText() const override { return text_; }
 
 protected:
     bool event(QEvent* event) override;
@@ -99,6 +103,7 @@ private:
     std::function<void()> moved_;
     std::function<bool(QPointF)> tapped_;
     std::function<void(double)> zoomed_;
+    QString text_;
     /// None where the content goes without.
     QScrollBar* across_ = nullptr;
     QScrollBar* down_ = nullptr;
