@@ -186,15 +186,13 @@ std::size_t NavController::numContainersInURLArray(const Urls& urls) {
 }
 
 bool NavController::canShowMoveForSelectedItems(const List& list) {
-    return list.selectedItemCount() > 0 && numContainersInURLArray(list.selectedItems()) == 0;
+    return list.selectedItemCount() > 0 && list.selectedContainerCount() == 0;
 }
 
 bool NavController::canShowDeleteForSelectedItems(const List& list) {
     const std::size_t selected = list.selectedItemCount();
-    if (selected == 0)
-        return false;
-    const std::size_t containers = numContainersInURLArray(list.selectedItems());
-    return containers == 0 || containers == selected;
+    const std::size_t containers = list.selectedContainerCount();
+    return selected > 0 && (containers == 0 || containers == selected);
 }
 
 bool NavController::canEnableNewFolderForSelectedItems(const List& list) {

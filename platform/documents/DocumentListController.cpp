@@ -62,6 +62,18 @@ std::size_t DocumentListController::selectedItemCount() const {
     return impl_->selection().size();
 }
 
+std::size_t DocumentListController::selectedContainerCount() const {
+    const FolderModel& model = *impl_->model;
+    std::size_t found = 0;
+    // They stand before everything else.
+    for (std::size_t i = 0; i < model.count(); ++i) {
+        if (model.entryAt(i).kind != EntryKind::container)
+            break;
+        found += impl_->selection().contains(model.idAt(i)) ? 1 : 0;
+    }
+    return found;
+}
+
 void DocumentListController::setSelectedItems(const std::vector<Url>& items) {
     std::vector<RowId> rows;
     for (const Url& item : items)
@@ -137,7 +149,7 @@ bool DocumentListController::performKeyCommand(KeyCommand command) {
         return true;
     }
     if (command == KeyCommand::selectAll && impl_->editing) {
-        setSelectedItems(containedItems());
+        impl_->list->widget().state().selectAll();
         impl_->list->takeFocus();
         return true;
     }

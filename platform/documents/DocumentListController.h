@@ -56,6 +56,8 @@ public:
     std::size_t containedItemCount() const;
     std::vector<Url> selectedItems() const;
     std::size_t selectedItemCount() const;
+    /// How many of them are containers.
+    std::size_t selectedContainerCount() const;
     void setSelectedItems(const std::vector<Url>& items);
     bool isEditing() const;
     void setEditing(bool editing, bool animated);

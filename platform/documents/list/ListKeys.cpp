@@ -137,11 +137,7 @@ bool ListKeys::leave() {
 bool ListKeys::selectAll() {
     if (!state_.editing)
         return false;
-    std::vector<RowId> all(state_.model.count());
-    for (std::size_t i = 0; i < all.size(); ++i)
-        all[i] = state_.model.idAt(i);
-    if (state_.selection.set(all))
-        state_.client->listSelectionDidChange();
+    state_.selectAll();
     return true;
 }
 

@@ -179,6 +179,16 @@ void ListState::toggleSelected(std::size_t index) {
     client->listSelectionDidChange();
 }
 
+void ListState::selectAll() {
+    std::vector<RowId> all(model.count());
+    for (std::size_t i = 0; i < all.size(); ++i)
+        all[i] = model.idAt(i);
+    if (!selection.set(all))
+        return;
+    repaint_();
+    client->listSelectionDidChange();
+}
+
 void ListState::keepPending(std::size_t index) {
     swipe.close();
     pending = model.idAt(index);

@@ -59,6 +59,7 @@ public:
     /// Opens the row, or selects it in edit mode.
     void activate(std::size_t index);
     void toggleSelected(std::size_t index);
+    void selectAll();
     void chooseAction(int action, std::size_t index, Rect from);
     void askForActions(std::size_t index, Rect from);
     void setEditing(bool editing, bool animated);
