@@ -6,6 +6,7 @@
 #include "platform/cloud/KeyValueSync.h"
 #include "platform/cloud/Remote.h"
 #include "platform/cloud/StoreContext.h"
+#include "platform/cloud/StoreMoves.h"
 #include "platform/cloud/StoreView.h"
 #include "platform/cloud/Synchronizer.h"
 #include "platform/cloud/Transfers.h"
@@ -104,6 +105,7 @@ private:
     Failure withRemote(const std::function<Failure()>& work);
     void watchValues();
     void changedByUser();
+    void recordMoves();
 
     // What is to be done so that both sides agree; see StoreEngineSync.cpp. From any thread.
     enum class Alarm { notice, settle, secondLook, retry, poll, sweep };
@@ -150,7 +152,8 @@ private:
 
     mutable std::mutex mutex_;
     std::condition_variable unused_;
-    int uses_ = 0; // guarded by mutex_, as are the next twelve
+    int uses_ = 0; // guarded by mutex_, as are the next thirteen
+    std::vector<StoreMoves::Moved> moved_; // on the disk, and not yet written down
     std::shared_ptr<Synchronizer> synchronizer_;
     std::optional<DeletionQuestion> question_;
     std::optional<Synchronizer::Request> wanted_;

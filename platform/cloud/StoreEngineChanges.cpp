@@ -50,13 +50,39 @@ Failure StoreEngine::moveItem(const Url& from, const Url& to) {
             ErrorCode::unsupportedOperation,
             localizedFormat("“%1$@” belongs to the store itself and cannot be moved.",
                             from.lastPathComponent()));
-    Failure failure;
-    queue_->sync([&] {
-        failure = context_ ? StoreMoves(*context_).move(from, to) : Failure(notOpen());
-        if (!failure)
-            changedByUser();
-    });
-    return failure;
+    const std::shared_ptr<void> open = use();
+    if (!open)
+        return notOpen();
+    Result<StoreMoves::Moved> moved = StoreMoves(*context_).moveOnDisk(from, to);
+    if (!moved)
+        return moved.error();
+    bool isFirst = false;
+    {
+        const std::lock_guard lock(mutex_);
+        isFirst = moved_.empty();
+        moved_.push_back(std::move(*moved));
+    }
+    // Many moves in a row are written down together: a record each would take its time from the
+    // user, who waits.
+    if (isFirst)
+        queue_->async([this] { recordMoves(); });
+    return std::nullopt;
+}
+
+void StoreEngine::recordMoves() {
+    std::vector<StoreMoves::Moved> moves;
+    {
+        const std::lock_guard lock(mutex_);
+        moves.swap(moved_);
+    }
+    if (!context_)
+        return; // the disk tells the next one who opens the store
+    if (const Failure failure = StoreMoves(*context_).record(moves)) {
+        platformLog(LogLevel::warning, "cloud: moves are not written down, and looked for: %@",
+                    *failure);
+        wantAfter(Alarm::notice, noticeDelay, {false, true, {}, false, false});
+    }
+    changedByUser();
 }
 
 Failure StoreEngine::removeItem(const Url& item) {

@@ -25,6 +25,20 @@ std::optional<std::string> StoreMoves::relative(const Url& url) const {
 }
 
 Failure StoreMoves::move(const Url& from, const Url& to) {
+    const Result<Moved> moved = moveOnDisk(from, to);
+    if (!moved)
+        return moved.error();
+    const Failure failure = record({*moved});
+    if (!failure)
+        return std::nullopt;
+    platformLog(LogLevel::warning, "cloud: the move of “%@” to “%@” is undone: %@", from, to,
+                *failure);
+    if (const Failure stays = putBack(*moved))
+        platformLog(LogLevel::error, "cloud: “%@” stays under its new name: %@", to, *stays);
+    return namedForPeople(*failure, from.lastPathComponent());
+}
+
+Result<StoreMoves::Moved> StoreMoves::moveOnDisk(const Url& from, const Url& to) {
     const Result<FileAttributes> source = context_.disk.attributes(from.path());
     const bool promisedThere = relative(to) && findSidecar(std::string(folderOf(to.path())),
                                                            nameOf(to.path()), context_.mark);
@@ -38,61 +52,48 @@ Failure StoreMoves::move(const Url& from, const Url& to) {
         relative(from)
             ? findSidecar(std::string(folderOf(from.path())), nameOf(from.path()), context_.mark)
             : std::nullopt;
-    return promise ? movePromise(from, to, *promise) : Failure(source.error());
+    return promise ? movePromise(from, to, *promise) : Result<Moved>(source.error());
 }
 
-Failure StoreMoves::movePresent(const Url& from, const Url& to, bool directory) {
+Result<StoreMoves::Moved> StoreMoves::movePresent(const Url& from, const Url& to, bool directory) {
     const std::optional<std::string> source = relative(from);
     const std::optional<std::string> target = relative(to);
     if (source && !target && directory && containsPromise(from.path(), context_.mark))
         return notYetHere(from);
     if (Failure failure = context_.disk.rename(from.path(), to.path()))
-        return failure;
-    if (!source || !target)
-        return std::nullopt; // arrivals and departures are found by looking at the disk
-    const std::optional<ItemId> item = context_.database.itemAtPath(*source);
-    const Result<FileAttributes> attributes = context_.disk.attributes(to.path());
-    if (!item || !attributes)
-        return context_.database.takeFault();
-    if (Failure failure = recordMove(*item, *target, *attributes, false))
-        return undone(*failure, from, to,
-                      [&] { return context_.disk.rename(to.path(), from.path()); });
-    return std::nullopt;
+        return *failure;
+    Moved moved{from, to};
+    // Arrivals and departures are found by looking at the disk.
+    if (source && target)
+        if (const Result<FileAttributes> attributes = context_.disk.attributes(to.path()))
+            moved.attributes = *attributes;
+    return moved;
 }
 
-Failure StoreMoves::movePromise(const Url& from, const Url& to, const FoundSidecar& promise) {
-    const std::optional<std::string> target = relative(to);
-    if (!target)
+Result<StoreMoves::Moved> StoreMoves::movePromise(const Url& from, const Url& to,
+                                                  const FoundSidecar& promise) {
+    if (!relative(to))
         return notYetHere(from);
     // The promise's own file would have room for it; the content could then never come.
     if (nameOf(to.path()).size() > longestName)
         return makeError(ErrorCode::nameTooLong, to.lastPathComponent());
-    const Result<FoundSidecar> moved =
+    const Result<FoundSidecar> renamed =
         renameSidecar(promise, std::string(folderOf(to.path())), std::string(nameOf(to.path())));
-    if (!moved)
-        return namedForPeople(moved.error(), from.lastPathComponent());
-    // A copy of a promise has no row of its own that could follow.
-    if (context_.database.pathOf(promise.mark.item) != relative(from))
-        return context_.database.takeFault();
-    const Result<FileAttributes> attributes = context_.disk.attributes(moved->path);
+    if (!renamed)
+        return namedForPeople(renamed.error(), from.lastPathComponent());
+    const Result<FileAttributes> attributes = context_.disk.attributes(renamed->path);
     if (!attributes)
         return attributes.error();
-    if (Failure failure = recordMove(promise.mark.item, *target, *attributes, true))
-        return undone(*failure, from, to, [&]() -> Failure {
-            const Result<FoundSidecar> back = renameSidecar(
-                *moved, std::string(folderOf(from.path())), std::string(nameOf(from.path())));
-            return back ? Failure() : Failure(back.error());
-        });
-    return std::nullopt;
+    return Moved{from, to, *renamed, *attributes};
 }
 
-Error StoreMoves::undone(const Error& cause, const Url& from, const Url& to,
-                         const std::function<Failure()>& undo) {
-    platformLog(LogLevel::warning, "cloud: the move of “%@” to “%@” is undone: %@", from, to,
-                cause);
-    if (const Failure failure = undo())
-        platformLog(LogLevel::error, "cloud: “%@” stays under its new name: %@", to, *failure);
-    return namedForPeople(cause, from.lastPathComponent());
+Failure StoreMoves::putBack(const Moved& moved) {
+    if (!moved.promise)
+        return context_.disk.rename(moved.to.path(), moved.from.path());
+    const Result<FoundSidecar> back =
+        renameSidecar(*moved.promise, std::string(folderOf(moved.from.path())),
+                      std::string(nameOf(moved.from.path())));
+    return back ? Failure() : Failure(back.error());
 }
 
 Result<FoundSidecar> StoreMoves::renameSidecar(const FoundSidecar& promise,
@@ -119,33 +120,48 @@ Result<FoundSidecar> StoreMoves::renameSidecar(const FoundSidecar& promise,
     return *failure;
 }
 
-Failure StoreMoves::recordMove(ItemId item, const std::string& to, const FileAttributes& attributes,
-                               bool promise) {
-    StateDatabase& database = context_.database;
-    return database.transaction([&]() -> Failure {
-        const std::size_t slash = to.rfind('/');
-        const Result<ItemId> parent =
-            folderItem(slash == std::string::npos ? std::string() : to.substr(0, slash));
-        if (!parent)
-            return parent.error();
-        const Place place{*parent, std::string(nameOf(to))};
-        // Whoever the record still shows under that name is not there any more: the rename proved
-        // it.
-        if (const std::optional<ItemId> other = database.itemAt(place); other && *other != item) {
-            database.setItemPlace(*other, std::nullopt);
-            database.removeLocal(*other);
-        }
-        if (const std::optional<ItemState> state = database.state(item);
-            state && state->base && state->local && state->local->changed == state->base->changed &&
-            state->local->identity == state->base->identity) {
-            BaseRow base = *state->base; // a rename changes this time, and no content
-            base.changed = attributes.changed;
-            database.putBase(item, base);
-        }
-        database.setItemPlace(item, place);
-        database.putLocal(item, localRowOf(place, attributes, promise));
+Failure StoreMoves::record(const std::vector<Moved>& moves) {
+    return context_.database.transaction([&]() -> Failure {
+        for (const Moved& moved : moves)
+            if (Failure failure = recordOne(moved))
+                return failure;
         return std::nullopt;
     });
+}
+
+Failure StoreMoves::recordOne(const Moved& moved) {
+    StateDatabase& database = context_.database;
+    const std::optional<std::string> source = relative(moved.from);
+    const std::optional<std::string> target = relative(moved.to);
+    if (!source || !target || !moved.attributes)
+        return std::nullopt;
+    const FileAttributes& attributes = *moved.attributes;
+    std::optional<ItemId> item = moved.promise ? std::optional(moved.promise->mark.item)
+                                               : database.itemAtPath(*source);
+    // A copy of a promise has no row of its own that could follow.
+    if (!item || (moved.promise && database.pathOf(*item) != source))
+        return std::nullopt;
+    const std::size_t slash = target->rfind('/');
+    const Result<ItemId> parent =
+        folderItem(slash == std::string::npos ? std::string() : target->substr(0, slash));
+    if (!parent)
+        return parent.error();
+    const Place place{*parent, std::string(nameOf(*target))};
+    // Whoever the record still shows under that name is not there any more: the rename proved it.
+    if (const std::optional<ItemId> other = database.itemAt(place); other && *other != *item) {
+        database.setItemPlace(*other, std::nullopt);
+        database.removeLocal(*other);
+    }
+    if (const std::optional<ItemState> state = database.state(*item);
+        state && state->base && state->local && state->local->changed == state->base->changed &&
+        state->local->identity == state->base->identity) {
+        BaseRow base = *state->base; // a rename changes this time, and no content
+        base.changed = attributes.changed;
+        database.putBase(*item, base);
+    }
+    database.setItemPlace(*item, place);
+    database.putLocal(*item, localRowOf(place, attributes, moved.promise.has_value()));
+    return std::nullopt;
 }
 
 Result<ItemId> StoreMoves::folderItem(const std::string& path) {
