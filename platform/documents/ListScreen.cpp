@@ -16,10 +16,12 @@ namespace {
 
 std::shared_ptr<SearchPill> makePill(DocumentListController::Impl& screen,
                                      const std::weak_ptr<bool>& alive) {
-    return std::make_shared<SearchPill>([&screen, alive] {
+    auto pill = std::make_shared<SearchPill>([&screen, alive] {
         if (!alive.expired())
             screen.openSearch();
     });
+    pill->setUsable(!screen.editing);
+    return pill;
 }
 
 } // namespace
@@ -51,7 +53,8 @@ ListState& DocumentListController::Impl::rows() const {
 void DocumentListController::Impl::makeView() {
     list = std::make_shared<ListView>(model, *this);
     list->setBackgroundColor(Theme::page);
-    list->setHeader(makePill(*this, alive_), SearchPill::heightWithMargins());
+    pill_ = makePill(*this, alive_);
+    list->setHeader(pill_, SearchPill::heightWithMargins());
     list->widget().setChangeHandlers([this] { rowsChanged(); }, [this] { page_->update(); });
     rows().setEditing(editing, false);
     rows().selection = early_;
@@ -93,10 +96,13 @@ void DocumentListController::Impl::repaint() {
 
 void DocumentListController::Impl::setEditing(bool value, bool animated) {
     editing = value;
-    if (list)
-        rows().setEditing(value, animated);
-    else if (!value)
-        early_.clear();
+    if (!list) {
+        if (!value)
+            early_.clear();
+        return;
+    }
+    rows().setEditing(value, animated);
+    pill_->setUsable(!value);
 }
 
 void DocumentListController::Impl::rowsChanged() {

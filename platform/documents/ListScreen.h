@@ -14,10 +14,11 @@
 
 namespace platform {
 
+struct ListState;
+class SearchPill;
+
 /// What a list controller is made of: the folder's model, the list on screen and what is decided
 /// between them.
-struct ListState;
-
 struct DocumentListController::Impl final : ListClient {
     Impl(const Url& folder, const DocumentServices& services);
     ~Impl() override;
@@ -66,6 +67,7 @@ private:
     RowArrivals arrivals_;
     /// None before the view is loaded.
     std::unique_ptr<FolderPage> page_;
+    std::shared_ptr<SearchPill> pill_; // as is this
     bool reportPending_ = false;
     std::shared_ptr<bool> alive_ = std::make_shared<bool>(true);
 };

@@ -125,7 +125,7 @@ TEST_F(Reach, tabGoesThroughAScreenFromTheTopToTheBottom) {
     nav().beginEditMode();
     advance(1s);
     tabTo("Cancel");
-    EXPECT_THAT(stops(), ElementsAre("Cancel", "Search", "Documents", "New Folder"));
+    EXPECT_THAT(stops(), ElementsAre("Cancel", "Documents", "New Folder"));
 }
 
 TEST_F(Reach, controlASelectsAllWhateverHasTheFocus) {

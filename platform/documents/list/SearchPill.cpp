@@ -52,6 +52,11 @@ double SearchPill::heightWithMargins() {
     return above + pillHeight() + below;
 }
 
+void SearchPill::setUsable(bool usable) {
+    pill_->setUserInteractionEnabled(usable);
+    pill_->setAlpha(usable ? 1 : Theme::disabledAlpha);
+}
+
 void SearchPill::layoutSubviews() {
     const double margin = RowStyle::current().margin;
     const double width = bounds().width - 2 * margin;

@@ -11,6 +11,8 @@ class SearchPill : public View {
 public:
     explicit SearchPill(std::function<void()> tapped);
     static double heightWithMargins();
+    /// Pale, and no way anywhere, while documents are being selected.
+    void setUsable(bool usable);
 
 protected:
     void layoutSubviews() override;
