@@ -1,8 +1,10 @@
 #include "platform/documents/preview/CleanHtml.h"
 
+#include "platform/documents/preview/HtmlAttributes.h"
 #include "platform/documents/preview/HtmlElements.h"
+#include "platform/documents/preview/HtmlScanner.h"
+#include "platform/documents/preview/HtmlText.h"
 
-#include <QStringList>
 #include <QUrl>
 
 #include <algorithm>
@@ -23,28 +25,21 @@ constexpr int mostCells = 60'000;
 constexpr int cellsForATable = 10;
 /// Two seconds as well.
 constexpr int mostElements = 150'000;
-/// Time for a word grows with the square of its length: longer ones may be broken anywhere.
-constexpr int longestWord = 100;
-constexpr qsizetype longestAddress = 4096;
 
 /// A text that is written as it stands gets a ground of its own.
 const QString boxStart = QStringLiteral("table class=\"code\" border=\"0\" cellspacing=\"0\" "
                                         "cellpadding=\"10\" width=\"100%\"><tr><td><");
 const QString boxEnd = QStringLiteral("></td></tr></table");
 
-struct Attribute {
-    QString name;
-    QString value;
-};
-
 class Cleaner {
 public:
-    Cleaner(QStringView html, const InlinePictures& pictures) : html_(html), pictures_(pictures) {}
+    Cleaner(QStringView html, const InlinePictures& pictures)
+        : length_(html.size()), in_(html), pictures_(pictures) {}
 
     std::optional<QString> run() {
-        out_.reserve(html_.size());
-        while (at_ < html_.size() && elements_ <= mostElements && cells_ <= mostCells)
-            html_[at_] == u'<' ? markup() : text();
+        out_.reserve(length_);
+        while (!in_.isAtEnd() && elements_ <= mostElements && cells_ <= mostCells)
+            in_.isAtMarkup() ? markup() : text_.take();
         if (elements_ > mostElements || cells_ > mostCells)
             return std::nullopt;
         closeTo(0);
@@ -63,159 +58,27 @@ private:
         int columnsOfRow = 0;
     };
 
-    QChar charAt(qsizetype place) const { return place < html_.size() ? html_[place] : QChar(); }
-
-    void text() {
-        const QChar unit = html_[at_++];
-        if (unit == u'&') {
-            entity();
-            return;
-        }
-        const bool breaks = unit.isSpace() || unit == u'-';
-        word_ = breaks ? 0 : word_ + 1;
-        const char16_t code = unit.unicode();
-        const bool shown = code >= 0x20 || unit == u'\n' || unit == u'\t' || unit == u'\r';
-        out_ += isStructural(code) || !shown ? QChar(QChar::ReplacementCharacter) : unit;
-        breakLongWord(unit);
-    }
-
-    void breakLongWord(QChar last) {
-        if (word_ < longestWord || last.isHighSurrogate())
-            return;
-        out_ += QChar(0x200B);
-        word_ = 0;
-    }
-
-    /// What the toolkit's documents take for a frame or an object of their own.
-    static bool isStructural(char32_t code) {
-        return code == 0 || code == 0xFDD0 || code == 0xFDD1 || code == 0xFFFC || code == 0x2028 ||
-               code == 0x2029;
-    }
-
-    void entity() {
-        const QStringView rest = html_.sliced(at_, std::min<qsizetype>(32, html_.size() - at_));
-        const qsizetype end = rest.indexOf(u';');
-        const QStringView name = end > 0 ? rest.first(end) : QStringView();
-        const bool number = name.startsWith(u'#');
-        const bool hexadecimal = number && name.size() > 2 && name[1].toLower() == u'x';
-        bool known = std::all_of(name.begin() + (number ? 1 : 0), name.end(),
-                                 [](QChar unit) { return unit.isLetterOrNumber(); }) &&
-                     !name.isEmpty();
-        if (known && number) {
-            const uint code =
-                name.sliced(hexadecimal ? 2 : 1).toUInt(&known, hexadecimal ? 16 : 10);
-            if (known && (isStructural(code) || code < 0x20 || code > 0x10FFFF)) {
-                out_ += QChar(QChar::ReplacementCharacter);
-                at_ += end + 1;
-                return;
-            }
-        }
-        if (known) {
-            out_ += u'&' + name.toString() + u';';
-            at_ += end + 1;
-        } else {
-            out_ += QStringLiteral("&amp;");
-        }
-        ++word_;
-        breakLongWord(u';');
-    }
-
     void markup() {
-        if (html_.sliced(at_).startsWith(QLatin1StringView("<!--"))) {
-            skipBehind(u"-->", at_ + 4);
-        } else if (charAt(at_ + 1) == u'!' || charAt(at_ + 1) == u'?') {
-            skipBehind(u">", at_);
-        } else if (charAt(at_ + 1) == u'/' && charAt(at_ + 2).isLetter()) {
-            at_ += 2;
-            const QString name = tagName();
-            skipBehind(u">", at_);
-            close(name);
-        } else if (charAt(at_ + 1).isLetter()) {
-            ++at_;
-            const QString name = tagName();
-            const std::vector<Attribute> attributes = readAttributes();
-            if (const HtmlElement* const element = htmlElement(name))
-                open(*element, name, attributes);
-        } else {
+        const HtmlMarkup markup = in_.takeMarkup();
+        if (markup.kind == HtmlMarkup::Kind::sign)
             out_ += QStringLiteral("&lt;");
-            ++at_;
-        }
+        const HtmlElement* const element = htmlElement(markup.name);
+        if (element && markup.kind == HtmlMarkup::Kind::begin)
+            open(*element, markup);
+        else if (element && markup.kind == HtmlMarkup::Kind::end)
+            close(*element);
     }
 
-    void skipBehind(QStringView end, qsizetype from) {
-        const qsizetype found = html_.indexOf(end, from);
-        at_ = found < 0 ? html_.size() : found + end.size();
-    }
-
-    QString tagName() {
-        const qsizetype from = at_;
-        while (at_ < html_.size() && (html_[at_].isLetterOrNumber() || html_[at_] == u'-'))
-            ++at_;
-        return html_.sliced(from, at_ - from).toString().toLower();
-    }
-
-    /// Up to and behind the tag's end.
-    std::vector<Attribute> readAttributes() {
-        std::vector<Attribute> out;
-        while (at_ < html_.size() && html_[at_] != u'>') {
-            if (html_[at_].isSpace() || html_[at_] == u'/') {
-                ++at_;
-                continue;
-            }
-            const qsizetype from = at_;
-            while (at_ < html_.size() && html_[at_] != u'=' && html_[at_] != u'>' &&
-                   html_[at_] != u'/' && !html_[at_].isSpace())
-                ++at_;
-            Attribute attribute{html_.sliced(from, at_ - from).toString().toLower(), {}};
-            while (charAt(at_).isSpace())
-                ++at_;
-            if (charAt(at_) == u'=') {
-                ++at_;
-                attribute.value = attributeValue();
-            }
-            out.push_back(std::move(attribute));
-        }
-        at_ = std::min(at_ + 1, html_.size());
-        return out;
-    }
-
-    QString attributeValue() {
-        while (charAt(at_).isSpace())
-            ++at_;
-        const QChar quote = charAt(at_);
-        const bool quoted = quote == u'"' || quote == u'\'';
-        const qsizetype from = quoted ? ++at_ : at_;
-        if (quoted) {
-            const qsizetype end = html_.indexOf(quote, from);
-            at_ = end < 0 ? html_.size() : end;
-        } else {
-            while (at_ < html_.size() && html_[at_] != u'>' && !html_[at_].isSpace())
-                ++at_;
-        }
-        QString value = html_.sliced(from, at_ - from).toString();
-        if (quoted)
-            at_ = std::min(at_ + 1, html_.size());
-        return value.replace(QStringLiteral("&amp;"), QStringLiteral("&"));
-    }
-
-    static QString valueOf(const std::vector<Attribute>& attributes, QStringView name) {
-        for (const Attribute& each : attributes)
-            if (each.name == name)
-                return each.value;
-        return {};
-    }
-
-    void open(const HtmlElement& element, const QString& name,
-              const std::vector<Attribute>& attributes) {
+    void open(const HtmlElement& element, const HtmlMarkup& markup) {
         ++elements_;
         if (element.role != HtmlRole::text)
-            word_ = 0;
+            text_.endWord();
         switch (element.role) {
         case HtmlRole::dropped:
-            dropContent(name);
+            in_.skipContent(markup.name);
             return;
         case HtmlRole::alone:
-            alone(element, attributes);
+            alone(element, markup);
             return;
         case HtmlRole::table:
             endParagraph();
@@ -225,7 +88,7 @@ private:
             openRow();
             return;
         case HtmlRole::cell:
-            openCell(element, attributes);
+            openCell(element, markup);
             return;
         case HtmlRole::item:
             endItem();
@@ -236,7 +99,7 @@ private:
         case HtmlRole::text:
             break;
         }
-        const QString more = textAttributes(element, attributes);
+        const QString more = keptAttributes(element, markup);
         if (element.name == "pre" && tables_.empty()) {
             cells_ += cellsForATable;
             push(element, boxStart + element.written, element.written + boxEnd);
@@ -244,14 +107,6 @@ private:
             push(element, QStringLiteral("span") + more, QStringLiteral("span"));
         else
             push(element, element.written + more, element.written);
-    }
-
-    /// To its end; without one, everything that follows.
-    void dropContent(const QString& name) {
-        const qsizetype end = html_.indexOf(QStringLiteral("</") + name, at_, Qt::CaseInsensitive);
-        at_ = end < 0 ? html_.size() : end;
-        if (end >= 0)
-            skipBehind(u">", at_);
     }
 
     /// `tag`: its name with attributes; `end`: what is written for its end. Too deep, and only what
@@ -263,59 +118,30 @@ private:
         open_.push_back({&element, end});
     }
 
-    void alone(const HtmlElement& element, const std::vector<Attribute>& attributes) {
+    void alone(const HtmlElement& element, const HtmlMarkup& markup) {
         if (element.name == "img")
-            picture(attributes);
+            picture(markup);
         else
             out_ += u'<' + element.written + u'>';
     }
 
-    void picture(const std::vector<Attribute>& attributes) {
-        const QString address = valueOf(attributes, u"src");
+    void picture(const HtmlMarkup& markup) {
+        const QString address = markup.valueOf(u"src");
         const auto found = pictures_ ? pictures_(address) : std::nullopt;
         if (!found) {
-            const QString words = valueOf(attributes, u"alt").left(longestAddress);
+            const QString words = markup.valueOf(u"alt").left(longestHtmlValue);
             if (!words.isEmpty())
                 out_ += QStringLiteral("<i>[%1]</i>").arg(words.toHtmlEscaped());
             return;
         }
         QSize size = found->size;
-        const int wanted = valueOf(attributes, u"width").toInt();
+        const int wanted = markup.valueOf(u"width").toInt();
         if (wanted > 0 && wanted < size.width())
             size = size.scaled(wanted, size.height(), Qt::KeepAspectRatio);
         out_ += QStringLiteral("<img src=\"%1\" width=\"%2\" height=\"%3\">")
                     .arg(found->name)
                     .arg(std::max(1, size.width()))
                     .arg(std::max(1, size.height()));
-    }
-
-    QString textAttributes(const HtmlElement& element, const std::vector<Attribute>& attributes) {
-        QString out;
-        for (const Attribute& each : attributes) {
-            const QString value = each.value.left(longestAddress).trimmed();
-            const bool anchor = each.name == u"id" || (each.name == u"name" && element.name == "a");
-            if (each.name == u"href" && element.name == "a" &&
-                (isOpenableAddress(value) || value.startsWith(u'#')))
-                out += QStringLiteral(" href=\"%1\"").arg(value.toHtmlEscaped());
-            else if (anchor && !value.isEmpty())
-                out += QStringLiteral(" id=\"%1\"").arg(value.toHtmlEscaped());
-            else if (each.name == u"start" && element.name == "ol")
-                out += QStringLiteral(" start=\"%1\"").arg(std::clamp(value.toInt(), 0, 1'000'000));
-            else if (each.name == u"class" && element.name == "li" &&
-                     (value == u"checked" || value == u"unchecked"))
-                out += QStringLiteral(" class=\"%1\"").arg(value);
-            else if (isOneOf(each.name, value))
-                out += QStringLiteral(" %1=\"%2\"").arg(each.name, value.toLower());
-        }
-        return out;
-    }
-
-    static bool isOneOf(const QString& name, const QString& value) {
-        static const QStringList sides{QStringLiteral("left"), QStringLiteral("right"),
-                                       QStringLiteral("center"), QStringLiteral("justify")};
-        static const QStringList ways{QStringLiteral("rtl"), QStringLiteral("ltr")};
-        return (name == u"align" && sides.contains(value, Qt::CaseInsensitive)) ||
-               (name == u"dir" && ways.contains(value, Qt::CaseInsensitive));
     }
 
     /// The number of elements that are open around the innermost one of these roles (or names);
@@ -338,20 +164,17 @@ private:
             out_ += QStringLiteral("</%1>").arg(last.written);
             open_.pop_back();
         }
-        word_ = 0;
+        text_.endWord();
     }
 
-    void close(const QString& name) {
-        const HtmlElement* const element = htmlElement(name);
-        if (!element)
-            return;
+    void close(const HtmlElement& element) {
         for (std::size_t i = open_.size(); i-- > 0;) {
-            if (open_[i].element == element) {
+            if (open_[i].element == &element) {
                 closeTo(i);
                 return;
             }
             // A stray end of a text's element does not end the table around it.
-            if (open_[i].element->role == HtmlRole::cell && element->role < HtmlRole::table)
+            if (open_[i].element->role == HtmlRole::cell && element.role < HtmlRole::table)
                 return;
         }
     }
@@ -415,13 +238,13 @@ private:
         push(*htmlElement(QStringLiteral("tr")), QStringLiteral("tr"), QStringLiteral("tr"));
     }
 
-    void openCell(const HtmlElement& element, const std::vector<Attribute>& attributes) {
+    void openCell(const HtmlElement& element, const HtmlMarkup& markup) {
         if (!inTable())
             return;
         if (!innermost(HtmlRole::row, HtmlRole::table))
             openRow();
         Table& table = tables_.back();
-        const int span = std::clamp(valueOf(attributes, u"colspan").toInt(), 1, mostColumns);
+        const int span = std::clamp(markup.valueOf(u"colspan").toInt(), 1, mostColumns);
         if (table.columnsOfRow + span > mostColumns) {
             out_ += u' '; // its text goes on in the last cell
             return;
@@ -430,7 +253,7 @@ private:
             closeTo(*row + 1);
         table.columnsOfRow += span;
         table.columns = std::max(table.columns, table.columnsOfRow);
-        QString tag = element.written + textAttributes(element, attributes);
+        QString tag = element.written + keptAttributes(element, markup);
         if (span > 1)
             tag += QStringLiteral(" colspan=\"%1\"").arg(span);
         push(element, tag, element.written);
@@ -438,16 +261,15 @@ private:
             cells_ = mostCells + 1;
     }
 
-    const QStringView html_;
+    const qsizetype length_;
+    HtmlScanner in_;
     const InlinePictures& pictures_;
-    qsizetype at_ = 0;
     QString out_;
+    HtmlText text_{in_, out_};
     std::vector<Open> open_;
     std::vector<Table> tables_;
     int elements_ = 0;
     int cells_ = 0;
-    /// Letters since a line could be broken.
-    int word_ = 0;
 };
 
 } // namespace

@@ -3,17 +3,15 @@
 #include "platform/documents/preview/CleanHtml.h"
 #include "platform/documents/preview/MarkdownText.h"
 #include "platform/documents/preview/PageMetrics.h"
-#include "platform/documents/preview/PictureFile.h"
+#include "platform/documents/preview/PictureShelf.h"
 #include "platform/documents/preview/PreviewWorker.h"
+#include "platform/documents/preview/RichStyle.h"
 #include "platform/documents/preview/TextFile.h"
-#include "platform/files/FileDescriptor.h"
 #include "platform/ui/Theme.h"
 #include "platform/ui/qt/Bridge.h"
 
 #include <QAbstractTextDocumentLayout>
-#include <QBuffer>
 #include <QEventLoop>
-#include <QFile>
 #include <QPainter>
 #include <QStringDecoder>
 #include <QTextBlock>
@@ -24,22 +22,12 @@
 
 #include <algorithm>
 #include <cmath>
-#include <fcntl.h>
-#include <sys/stat.h>
-#include <unistd.h>
 
 namespace platform {
 namespace {
 
 /// A longer text takes seconds to lay out anew in another width; its source is shown instead.
 constexpr std::uint64_t longestSource = 1024ULL * 1024;
-/// Of a picture's file beside the text.
-constexpr off_t longestPicture = 16LL * 1024 * 1024;
-/// Of all pictures of a text together; 64 MB. None needs more than twice a wide column.
-constexpr double mostPixelsTogether = 16e6;
-constexpr double mostPixelsEach = 2e6;
-/// Each is decoded, however small it is drawn.
-constexpr qsizetype mostPictures = 200;
 /// About 85 letters: longer lines are hard to follow.
 constexpr double widestTextColumn = 720;
 constexpr double narrowestTextColumn = 120;
@@ -58,76 +46,6 @@ protected:
     }
 };
 
-/// Reads the pictures of a text, each once.
-class PictureShelf {
-public:
-    PictureShelf(std::string folder, const PreviewToken& token)
-        : folder_(std::move(folder)), token_(token) {}
-
-    std::optional<InlinePicture> find(const QString& address) {
-        if (const auto known = known_.constFind(address); known != known_.constEnd())
-            return *known;
-        std::optional<InlinePicture> found;
-        if (known_.size() < mostPictures && !token_.isCancelled())
-            found = read(address);
-        known_.insert(address, found);
-        return found;
-    }
-    QHash<QString, QImage> take() { return std::move(images_); }
-
-private:
-    std::optional<InlinePicture> read(const QString& address) {
-        QImage image = address.startsWith(QLatin1StringView("data:image/"), Qt::CaseInsensitive)
-                           ? written(address)
-                           : beside(address);
-        const double pixels = static_cast<double>(image.width()) * image.height();
-        if (image.isNull() || pixels + pixels_ > mostPixelsTogether)
-            return std::nullopt;
-        pixels_ += pixels;
-        const QString name = QStringLiteral("picture-%1").arg(images_.size());
-        const QSize size = image.size();
-        images_.insert(name, std::move(image));
-        return InlinePicture{name, size};
-    }
-
-    static QImage written(const QString& address) {
-        const qsizetype comma = address.indexOf(u',');
-        if (comma < 0 || !QStringView(address).first(comma).endsWith(QLatin1StringView("base64")))
-            return {};
-        QByteArray bytes = QByteArray::fromBase64(address.sliced(comma + 1).toLatin1());
-        QBuffer buffer(&bytes);
-        return buffer.open(QIODevice::ReadOnly) ? readPixels(buffer, mostPixelsEach) : QImage();
-    }
-
-    /// A plain file of the folder itself: no link to elsewhere, no pipe, no device.
-    QImage beside(const QString& address) const {
-        const QUrl url(address);
-        QString name = url.path(QUrl::FullyDecoded);
-        if (name.startsWith(QLatin1StringView("./")))
-            name.remove(0, 2);
-        if (!url.isRelative() || !url.host().isEmpty() || name.isEmpty() || name.contains(u'/') ||
-            name.contains(QChar(0)))
-            return {};
-        const std::string path = folder_ + name.toStdString();
-        const FileDescriptor file(
-            ::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK));
-        struct stat status {};
-        if (!file || ::fstat(file.get(), &status) != 0 || !S_ISREG(status.st_mode) ||
-            status.st_size > longestPicture)
-            return {};
-        QFile content;
-        if (!content.open(file.get(), QIODevice::ReadOnly))
-            return {};
-        return readPixels(content, mostPixelsEach);
-    }
-
-    const std::string folder_;
-    const PreviewToken& token_;
-    QHash<QString, std::optional<InlinePicture>> known_;
-    QHash<QString, QImage> images_;
-    double pixels_ = 0;
-};
-
 QString decoded(const TextFile& file, RichFormat format) {
     const std::string bytes =
         file.read(file.start(), static_cast<std::size_t>(file.size() - file.start()));
@@ -144,48 +62,6 @@ QString decoded(const TextFile& file, RichFormat format) {
 
 std::string folderOf(const std::string& path) {
     return path.substr(0, path.rfind('/') + 1);
-}
-
-int sizeOf(TextStyle style, double scale) {
-    return static_cast<int>(std::lround(Font::preferred(style).pointSize() * scale));
-}
-
-/// Quiet and roomy; sizes in pixels of the letters' own scale.
-QString styleSheet(double scale) {
-    const auto size = [scale](TextStyle style, double factor = 1) {
-        return sizeOf(style, scale * factor);
-    };
-    return QStringLiteral(
-               "body{color:%1} p,li,dd,dt{line-height:135%} "
-               "p{margin-top:0;margin-bottom:%2px}"
-               "h1{font-size:%3px;font-weight:600;margin-top:%2px;margin-bottom:%2px}"
-               "h2{font-size:%4px;font-weight:600;margin-top:%5px;margin-bottom:%2px}"
-               "h3{font-size:%6px;font-weight:600;margin-top:%5px;margin-bottom:%7px}"
-               "h4,h5,h6{font-size:%8px;font-weight:600;margin-top:%5px;margin-bottom:%7px}"
-               "ul,ol{margin-top:0;margin-bottom:%2px} li{margin-bottom:%7px}"
-               "a{color:%9;text-decoration:none}")
-               .arg(toQt(Theme::text).name())
-               .arg(size(TextStyle::body, 0.65))
-               .arg(size(TextStyle::title2, 1.1))
-               .arg(size(TextStyle::title2, 0.9))
-               .arg(size(TextStyle::body, 1.2))
-               .arg(size(TextStyle::headline, 1.05))
-               .arg(size(TextStyle::body, 0.3))
-               .arg(size(TextStyle::subheadline))
-               .arg(toQt(Theme::accent).name()) +
-           QStringLiteral("code{font-family:monospace;font-size:%1px;background-color:%2}"
-                          "pre{font-family:monospace;font-size:%1px;white-space:pre-wrap;"
-                          "line-height:130%;margin-top:0;margin-bottom:0}"
-                          "blockquote{color:%3;margin-left:%4px;margin-right:%4px;"
-                          "margin-top:0;margin-bottom:0}"
-                          "th{font-weight:600;background-color:%2}"
-                          "table{margin-top:4px;margin-bottom:12px}"
-                          "table.grid{border-collapse:collapse;border-color:%5;border-style:solid}"
-                          "table.code{background-color:%2;border-style:none}")
-               .arg(size(TextStyle::footnote))
-               .arg(toQt(Theme::bar).name(), toQt(Theme::secondaryText).name())
-               .arg(size(TextStyle::body))
-               .arg(toQt(Theme::hairline).name());
 }
 
 /// No picture is wider than the column.
@@ -274,9 +150,9 @@ double RichDocument::layOut(const Shape& shape, double top) {
     document_->setUndoRedoEnabled(false);
     document_->setDocumentMargin(0);
     QFont font = toQt(Font::preferred(TextStyle::subheadline));
-    font.setPixelSize(std::max(6, sizeOf(TextStyle::subheadline, shape.scale)));
+    font.setPixelSize(std::max(6, richLetterSize(TextStyle::subheadline, shape.scale)));
     document_->setDefaultFont(font);
-    document_->setDefaultStyleSheet(styleSheet(shape.scale));
+    document_->setDefaultStyleSheet(richStyleSheet(shape.scale));
     for (auto picture = pictures_.begin(); picture != pictures_.end(); ++picture)
         document_->addResource(QTextDocument::ImageResource, QUrl(picture.key()), picture.value());
     document_->setHtml(html_);
