@@ -5,6 +5,7 @@
 #include "platform/documents/preview/PreviewView.h"
 #include "platform/documents/targets/TargetScreen.h"
 #include "platform/ui/Controls.h"
+#include "tests/documents/OneDocument.h"
 #include "tests/documents/SampleArchives.h"
 #include "tests/documents/SampleDocuments.h"
 
@@ -21,26 +22,6 @@ using namespace platform;
 using namespace std::chrono_literals;
 
 namespace {
-
-struct OneDocument : PlatformPreviewController, PlatformPreviewDataSource, PlatformPreviewDelegate {
-    explicit OneDocument(Url theDocument) : document(std::move(theDocument)) {
-        setDataSource(this);
-        setDelegate(this);
-    }
-    std::size_t numberOfPreviewItemsInPreviewController(PlatformPreviewController&) override {
-        return 1;
-    }
-    std::optional<Url> previewControllerPreviewItemAtIndex(PlatformPreviewController&,
-                                                           std::size_t) override {
-        return document;
-    }
-    void previewControllerDidShowItem(PlatformPreviewController&, const Url&) override {
-        shown = true;
-    }
-    bool isThere() { return shown || static_cast<const PreviewView&>(*view()).showsPage(); }
-    const Url document;
-    bool shown = false;
-};
 
 /// The details of the rows in view are there.
 bool isComplete(const FolderModel& model) {
@@ -152,7 +133,9 @@ void GalleryScene::preview(const std::string& file) {
                                               BarButtonItem::withSystemItem(SystemItem::organize)});
     screen->reloadData();
     showAlone({DocumentListController::createForURL(url()), screen});
-    until([&] { return screen->isThere(); });
+    until([&] {
+        return screen->shown || static_cast<const PreviewView&>(*screen->view()).showsPage();
+    });
     waitForPictures();
 }
 

@@ -1,9 +1,9 @@
 #include "platform/documents/list/ListAccessible.h"
 #include "platform/documents/list/ListWidget.h"
 #include "platform/ui/qt/Settings.h"
+#include "platform/ui/qt/TouchEvents.h"
 
 #include <QContextMenuEvent>
-#include <QTouchEvent>
 #include <QWheelEvent>
 
 namespace platform {
@@ -20,15 +20,8 @@ Point fromQt(QPointF point) {
 } // namespace
 
 bool ListWidget::event(QEvent* event) {
-    switch (event->type()) {
-    case QEvent::TouchBegin:
-    case QEvent::TouchUpdate:
-    case QEvent::TouchEnd:
-    case QEvent::TouchCancel:
-        return touch(static_cast<QTouchEvent&>(*event));
-    default:
-        return QWidget::event(event);
-    }
+    QTouchEvent* const fingers = touchOf(event);
+    return fingers ? touch(*fingers) : QWidget::event(event);
 }
 
 bool ListWidget::touch(QTouchEvent& event) {

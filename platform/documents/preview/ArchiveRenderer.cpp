@@ -1,12 +1,10 @@
 #include "platform/base/ByteCount.h"
 #include "platform/base/Runtime.h"
 #include "platform/base/Text.h"
-#include "platform/documents/DisplayName.h"
 #include "platform/documents/preview/ArchiveFile.h"
-#include "platform/documents/preview/ContentsPage.h"
+#include "platform/documents/preview/ContentsRenderer.h"
 #include "platform/documents/preview/PreviewKinds.h"
 #include "platform/launch/TypeRegistry.h"
-#include "platform/ui/qt/Bridge.h"
 
 #include <QCoreApplication>
 
@@ -86,26 +84,13 @@ std::vector<ContentsPage::Remark> remarksOn(const ArchiveListing& listing) {
     return remarks;
 }
 
-class ArchiveRenderer final : public PreviewRenderer {
+class ArchiveRenderer final : public ContentsRenderer {
 public:
     ArchiveRenderer(MainQueue& main, PreviewReports reports)
-        : main_(main),
-          reports_(std::move(reports)),
+        : ContentsRenderer(main, std::move(reports)),
+          main_(main),
           lister_(
-              (QCoreApplication::applicationDirPath() + QLatin1String(listerName)).toStdString()),
-          worker_(main) {
-        auto page = std::make_unique<ContentsPage>();
-        page_ = page.get();
-        view_ = std::make_shared<WidgetView>(std::move(page));
-    }
-
-    std::shared_ptr<View> view() override { return view_; }
-
-    void load(const Url& file) override {
-        file_ = file;
-        page_->list().setAccessibleName(shownName(file.lastPathComponent()));
-        reload();
-    }
+              (QCoreApplication::applicationDirPath() + QLatin1String(listerName)).toStdString()) {}
 
     void reload() override {
         told_ = false;
@@ -154,14 +139,9 @@ private:
     }
 
     MainQueue& main_;
-    PreviewReports reports_;
     const std::string lister_;
-    Url file_;
     /// That something can be seen, since the file was last read.
     bool told_ = false;
-    ContentsPage* page_ = nullptr;
-    std::shared_ptr<View> view_;
-    PreviewWorker worker_;
 };
 
 } // namespace

@@ -5,13 +5,13 @@
 #include "platform/ui/Direction.h"
 #include "platform/ui/Theme.h"
 #include "platform/ui/qt/Bridge.h"
+#include "platform/ui/qt/TouchEvents.h"
 #include "platform/ui/qt/ViewWidget.h"
 
 #include <QKeyEvent>
 #include <QPainter>
 #include <QScrollBar>
 #include <QStyledItemDelegate>
-#include <QTouchEvent>
 
 #include <algorithm>
 #include <cmath>
@@ -192,18 +192,10 @@ void ContentsList::paintChevron(QPainter& painter, const QRectF& place, bool ope
 }
 
 bool ContentsList::viewportEvent(QEvent* event) {
-    switch (event->type()) {
-    case QEvent::TouchBegin:
-    case QEvent::TouchUpdate:
-    case QEvent::TouchEnd:
-    case QEvent::TouchCancel:
-        return touch(static_cast<QTouchEvent&>(*event));
-    case QEvent::Leave:
+    if (QTouchEvent* const fingers = touchOf(event))
+        return touch(*fingers);
+    if (event->type() == QEvent::Leave)
         setHovered({});
-        break;
-    default:
-        break;
-    }
     return QTreeView::viewportEvent(event);
 }
 

@@ -1,33 +1,18 @@
 #include "platform/base/ByteCount.h"
 #include "platform/base/Text.h"
-#include "platform/documents/DisplayName.h"
 #include "platform/documents/DocumentServices.h"
-#include "platform/documents/preview/ContentsPage.h"
+#include "platform/documents/preview/ContentsRenderer.h"
 #include "platform/documents/preview/PackageFolder.h"
 #include "platform/documents/preview/PreviewKinds.h"
-#include "platform/documents/preview/PreviewWorker.h"
 #include "platform/launch/TypeRegistry.h"
-#include "platform/ui/qt/Bridge.h"
 
 namespace platform {
 namespace {
 
-class PackageRenderer final : public PreviewRenderer {
+class PackageRenderer final : public ContentsRenderer {
 public:
     PackageRenderer(MainQueue& main, PreviewReports reports)
-        : reports_(std::move(reports)), worker_(main) {
-        auto page = std::make_unique<ContentsPage>();
-        page_ = page.get();
-        view_ = std::make_shared<WidgetView>(std::move(page));
-    }
-
-    std::shared_ptr<View> view() override { return view_; }
-
-    void load(const Url& file) override {
-        file_ = file;
-        page_->list().setAccessibleName(shownName(file.lastPathComponent()));
-        reload();
-    }
+        : ContentsRenderer(main, std::move(reports)) {}
 
     void reload() override {
         worker_.cancel();
@@ -72,12 +57,6 @@ private:
                    remarks);
         reports_.shown();
     }
-
-    PreviewReports reports_;
-    Url file_;
-    ContentsPage* page_ = nullptr;
-    std::shared_ptr<View> view_;
-    PreviewWorker worker_;
 };
 
 } // namespace

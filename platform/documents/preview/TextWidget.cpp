@@ -4,12 +4,12 @@
 #include "platform/ui/Direction.h"
 #include "platform/ui/Theme.h"
 #include "platform/ui/qt/Bridge.h"
+#include "platform/ui/qt/TouchEvents.h"
 
 #include <QFontDatabase>
 #include <QKeyEvent>
 #include <QPainter>
 #include <QScrollBar>
-#include <QTouchEvent>
 #include <QWheelEvent>
 
 #include <algorithm>
@@ -226,15 +226,8 @@ void TextWidget::resizeEvent(QResizeEvent* event) {
 }
 
 bool TextWidget::event(QEvent* event) {
-    switch (event->type()) {
-    case QEvent::TouchBegin:
-    case QEvent::TouchUpdate:
-    case QEvent::TouchEnd:
-    case QEvent::TouchCancel:
-        return touch(static_cast<QTouchEvent&>(*event));
-    default:
-        return QWidget::event(event);
-    }
+    QTouchEvent* const fingers = touchOf(event);
+    return fingers ? touch(*fingers) : QWidget::event(event);
 }
 
 bool TextWidget::touch(QTouchEvent& event) {

@@ -3,13 +3,13 @@
 #include "platform/base/Runtime.h"
 #include "platform/documents/preview/PageMetrics.h"
 #include "platform/ui/qt/Bridge.h"
+#include "platform/ui/qt/TouchEvents.h"
 
 #include <QKeyEvent>
 #include <QMouseEvent>
 #include <QNativeGestureEvent>
 #include <QPainter>
 #include <QScrollBar>
-#include <QTouchEvent>
 #include <QWheelEvent>
 
 #include <algorithm>
@@ -151,22 +151,15 @@ void ZoomWidget::resizeEvent(QResizeEvent* event) {
 }
 
 bool ZoomWidget::event(QEvent* event) {
-    switch (event->type()) {
-    case QEvent::TouchBegin:
-    case QEvent::TouchUpdate:
-    case QEvent::TouchEnd:
-    case QEvent::TouchCancel:
-        return touch(static_cast<QTouchEvent&>(*event));
-    case QEvent::NativeGesture: {
-        const auto& gesture = static_cast<QNativeGestureEvent&>(*event);
-        if (gesture.gestureType() != Qt::ZoomNativeGesture)
-            return QWidget::event(event);
-        zoomAround(zoom() * (1 + gesture.value()), gesture.position());
-        return true;
-    }
-    default:
+    if (QTouchEvent* const fingers = touchOf(event))
+        return touch(*fingers);
+    if (event->type() != QEvent::NativeGesture)
         return QWidget::event(event);
-    }
+    const auto& gesture = static_cast<QNativeGestureEvent&>(*event);
+    if (gesture.gestureType() != Qt::ZoomNativeGesture)
+        return QWidget::event(event);
+    zoomAround(zoom() * (1 + gesture.value()), gesture.position());
+    return true;
 }
 
 bool ZoomWidget::touch(QTouchEvent& event) {
