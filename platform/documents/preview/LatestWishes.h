@@ -16,6 +16,10 @@ public:
         const std::lock_guard lock(mutex_);
         wanted_ = std::move(wishes);
     }
+    bool isEmpty() const {
+        const std::lock_guard lock(mutex_);
+        return wanted_.empty();
+    }
     std::optional<Wish> take() {
         const std::lock_guard lock(mutex_);
         if (wanted_.empty())
@@ -26,7 +30,7 @@ public:
     }
 
 private:
-    std::mutex mutex_;
+    mutable std::mutex mutex_;
     std::vector<Wish> wanted_;
 };
 

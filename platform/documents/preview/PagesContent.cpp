@@ -22,6 +22,26 @@ double pixelsOf(const QImage& image) {
     return static_cast<double>(image.width()) * image.height();
 }
 
+/// A picture that has as many pixels as its place is copied pixel by pixel: a fraction of the time
+/// that any scaling takes, and as sharp as it is.
+void drawSharp(QPainter& painter, const QRectF& target, const QImage& image) {
+    const double density = painter.device()->devicePixelRatioF();
+    const QRectF place = painter.worldTransform().mapRect(target);
+    if (std::abs(place.width() * density - image.width()) > 1 ||
+        std::abs(place.height() * density - image.height()) > 1) {
+        painter.drawImage(target, image);
+        return;
+    }
+    const QPointF corner(std::round(place.x() * density) / density,
+                         std::round(place.y() * density) / density);
+    QImage pixels = image;
+    pixels.setDevicePixelRatio(density);
+    painter.save();
+    painter.resetTransform();
+    painter.drawImage(corner, pixels);
+    painter.restore();
+}
+
 } // namespace
 
 void PagesContent::set(std::vector<QSizeF> sizes, std::size_t pageCount) {
@@ -59,6 +79,13 @@ void PagesContent::setRendered(int page, QImage image) {
     dropOldPages();
 }
 
+void PagesContent::setTop(int page, QImage image) {
+    setRendered(page, std::move(image));
+    RenderedPage& top = rendered_[page];
+    const QSizeF& size = sizes_[static_cast<std::size_t>(page)];
+    top.topAlone = top.image.height() + 1 < top.image.width() * size.height() / size.width();
+}
+
 std::size_t PagesContent::pageIn(const QRectF& visible) const {
     return pageAt(visible.top() + visible.height() * 0.4);
 }
@@ -71,15 +98,16 @@ std::size_t PagesContent::pageAt(double y) const {
 void PagesContent::paintContent(QPainter& painter, const QRectF& visible, double zoom) {
     if (sizes_.empty())
         return;
-    const double pixels = zoom * painter.device()->devicePixelRatioF();
+    const double density = painter.device()->devicePixelRatioF();
     std::vector<std::pair<int, int>> wanted;
     for (std::size_t i = pageAt(visible.top()); i < sizes_.size(); ++i) {
         if (tops_[i] > visible.bottom())
             break;
         const int page = static_cast<int>(i);
-        const int width = renderWidth(sizes_[i], pixels);
+        const int width = renderWidth(sizes_[i], zoom, density);
         const auto found = rendered_.find(page);
-        if (found == rendered_.end() || found->second.image.width() != width)
+        if (found == rendered_.end() || found->second.image.width() != width ||
+            found->second.topAlone)
             wanted.emplace_back(page, width);
         paintPage(painter, i, found == rendered_.end() ? nullptr : &found->second, zoom);
     }
@@ -89,34 +117,41 @@ void PagesContent::paintContent(QPainter& painter, const QRectF& visible, double
     }
 }
 
-int PagesContent::renderWidth(const QSizeF& size, double pixels) {
-    // Letters stay sharp where a point is a whole number of pixels.
+int PagesContent::renderWidth(const QSizeF& size, double zoom, double density) const {
+    const double pixels = zoom * density;
+    // Letters stay sharp where a page is drawn as it was rendered, or a point is whole pixels.
+    const bool resting = std::abs(zoom - restingZoom_) < 1e-9;
     const bool even = std::abs(pixels - std::round(pixels)) < 1e-3 && pixels > 0.5;
     const double step = std::ceil(std::log(std::max(0.05, pixels)) / std::log(sizeStep));
-    const double scale = even ? std::round(pixels) : std::pow(sizeStep, step);
+    const double scale = resting ? pixels : even ? std::round(pixels) : std::pow(sizeStep, step);
     const double most = std::sqrt(mostPagePixels * size.width() / size.height());
-    return std::max(1, static_cast<int>(std::min(size.width() * scale, most)));
+    return std::max(1, static_cast<int>(std::lround(std::min(size.width() * scale, most))));
+}
+
+/// Where the picture of a page belongs that has its place there.
+QRectF PagesContent::placeOf(const RenderedPage& rendered, const QRectF& page) {
+    const QSizeF pixels = rendered.image.size();
+    if (rendered.topAlone)
+        return {page.topLeft(), pixels * (page.width() / pixels.width())};
+    // One that was never measured may have another shape than its place.
+    const QSizeF shape = pixels.scaled(page.size(), Qt::KeepAspectRatio);
+    if (std::abs(shape.width() - page.width()) < 1 && std::abs(shape.height() - page.height()) < 1)
+        return page;
+    QRectF place(QPointF(), shape);
+    place.moveCenter(page.center());
+    return place;
 }
 
 void PagesContent::paintPage(QPainter& painter, std::size_t index, RenderedPage* rendered,
                              double zoom) {
     const QSizeF size = sizes_[index];
     const QRectF page(QPointF((width_ - size.width()) / 2, tops_[index]), size);
+    const QRectF covered = rendered ? placeOf(*rendered, page) : QRectF();
+    if (covered != page)
+        painter.fillRect(page, Qt::white);
     if (rendered) {
         rendered->lastUse = ++uses_;
-        // One that was never measured may have another shape than its place.
-        const QSizeF shape =
-            QSizeF(rendered->image.size()).scaled(page.size(), Qt::KeepAspectRatio);
-        QRectF target(QPointF(), shape);
-        target.moveCenter(page.center());
-        if (std::abs(shape.width() - size.width()) < 1 &&
-            std::abs(shape.height() - size.height()) < 1)
-            target = page;
-        else
-            painter.fillRect(page, Qt::white);
-        painter.drawImage(target, rendered->image);
-    } else {
-        painter.fillRect(page, Qt::white);
+        drawSharp(painter, covered, rendered->image);
     }
     if (gap_ <= 0)
         return;

@@ -28,6 +28,14 @@ public:
     /// changes anything.
     bool correct(std::size_t from, const std::vector<QSizeF>& sizes);
     void setRendered(int page, QImage image);
+    /// Its top alone, until the whole page is there.
+    void setTop(int page, QImage image);
+    /// At this zoom, where one stays, pages are asked for as wide as they are shown; at others in
+    /// steps. 0 for none.
+    void setRestingZoom(double zoom) { restingZoom_ = zoom; }
+    /// How wide a page that is `size` points large is asked for at that zoom, with so many pixels a
+    /// point of the view.
+    int renderWidth(const QSizeF& size, double zoom, double density) const;
 
     std::size_t pageCount() const { return sizes_.size(); }
     /// The page that one looks at.
@@ -40,16 +48,18 @@ private:
     struct RenderedPage {
         QImage image;
         std::uint64_t lastUse = 0;
+        bool topAlone = false;
     };
 
     void arrange();
     std::size_t pageAt(double y) const;
-    static int renderWidth(const QSizeF& size, double pixels);
+    static QRectF placeOf(const RenderedPage& rendered, const QRectF& page);
     void paintPage(QPainter& painter, std::size_t index, RenderedPage* rendered, double zoom);
     void dropOldPages();
 
     Wish wish_;
     const double gap_;
+    double restingZoom_ = 0;
     std::vector<QSizeF> sizes_;
     std::vector<double> tops_;
     double width_ = 1;

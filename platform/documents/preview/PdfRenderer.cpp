@@ -10,6 +10,7 @@
 #include "platform/ui/qt/Bridge.h"
 
 #include <algorithm>
+#include <cmath>
 #include <optional>
 
 namespace platform {
@@ -17,15 +18,26 @@ namespace {
 
 constexpr double pageGap = 12;
 constexpr double pageMargin = 12;
-/// Measured before the first of a document is shown, and then at a time between pages that are
-/// drawn; 30 milliseconds.
-constexpr std::size_t measuredAtOnce = 200;
+/// Measured before the first of a document is shown; a millisecond.
+constexpr std::size_t measuredFirst = 8;
+/// Measured at a time later, when no page waits to be drawn; 5 milliseconds.
+constexpr std::size_t measuredAtOnce = 50;
 /// The pages behind these are taken to be like the last: to measure them all would take 60 MB and
 /// seconds.
 constexpr std::size_t mostMeasured = 20'000;
 
 /// A page, and how many pixels wide.
 using RenderWishes = LatestWishes<std::pair<int, int>>;
+
+constexpr ZoomPlace::Limits pdfLimits{ZoomPlace::Fit::width, pageMargin, 6};
+
+/// What has been read of a document, to be shown.
+struct PdfStart {
+    std::vector<QSizeF> sizes;
+    std::size_t count = 0;
+    /// Of the first page, as it will be wanted; null where that is not known.
+    QImage top;
+};
 
 /// The open document; of the worker's queue alone.
 struct PdfSlot {
@@ -39,11 +51,10 @@ public:
         auto content = std::make_unique<PagesContent>(
             [this](auto pages) { render(std::move(pages)); }, pageGap);
         content_ = content.get();
-        auto widget = std::make_unique<ZoomWidget>(
-            std::move(content),
-            ZoomWidget::Settings{{ZoomPlace::Fit::width, pageMargin, 6}, false, true});
+        auto widget = std::make_unique<ZoomWidget>(std::move(content),
+                                                   ZoomWidget::Settings{pdfLimits, false, true});
         widget_ = widget.get();
-        widget_->setMovedHandler([this] { tellPlace(); });
+        widget_->setMovedHandler([this] { moved(); });
         view_ = std::make_shared<WidgetView>(std::move(widget));
         worker_.setLastJob([slot = slot_] { slot->file.reset(); });
     }
@@ -53,28 +64,15 @@ public:
     void load(const Url& file) override {
         file_ = file;
         view_->setAccessibleName(displayName(file.lastPathComponent()));
-        reload();
+        read(measuredFirst, widget_->size());
     }
 
     void reload() override {
         worker_.cancel();
         // As far as one has looked, so that the place is found again.
-        const std::size_t first =
-            measuredAtOnce + (content_->pageCount() ? content_->pageIn(widget_->visibleRect()) : 0);
-        worker_.run([this, file = file_, slot = slot_, first](PreviewToken& token) -> Job {
-            slot->file = std::make_unique<PdfFile>();
-            const auto sizes = std::make_shared<std::vector<QSizeF>>();
-            std::size_t count = 0;
-            const Failure failure = readDocument(file, token, [&](const std::string& path) {
-                Failure fault = slot->file->open(file, path);
-                if (fault)
-                    return fault;
-                count = slot->file->pageCount();
-                *sizes = slot->file->pageSizes(0, std::min(first, mostMeasured));
-                return Failure();
-            });
-            return [this, sizes, count, failure] { take(std::move(*sizes), count, failure); };
-        });
+        read(measuredAtOnce +
+                 (content_->pageCount() ? content_->pageIn(widget_->visibleRect()) : 0),
+             {});
     }
 
     std::optional<std::function<void(double)>> zoom() override {
@@ -82,13 +80,48 @@ public:
     }
 
 private:
-    void take(std::vector<QSizeF> sizes, std::size_t count, const Failure& failure) {
+    /// Measures so many pages, and draws what a view of that size, unless it is empty, shows of the
+    /// first one: whoever opens a document waits for no more than that, and for no way to the main
+    /// thread and back.
+    void read(std::size_t measured, QSize view) {
+        worker_.run([this, file = file_, slot = slot_, measured, view,
+                     density = widget_->devicePixelRatioF()](PreviewToken& token) -> Job {
+            slot->file = std::make_unique<PdfFile>();
+            const auto start = std::make_shared<PdfStart>();
+            const Failure failure = readDocument(file, token, [&](const std::string& path) {
+                Failure fault = slot->file->open(file, path);
+                if (fault)
+                    return fault;
+                start->count = slot->file->pageCount();
+                start->sizes = slot->file->pageSizes(0, std::min(measured, mostMeasured));
+                if (!view.isEmpty())
+                    start->top = topOfFirst(*slot->file, *start, view, density);
+                return Failure();
+            });
+            return [this, start, failure] { take(std::move(*start), failure); };
+        });
+    }
+
+    static QImage topOfFirst(const PdfFile& file, const PdfStart& start, QSize view,
+                             double density) {
+        PagesContent pages([](const auto&) {}, pageGap);
+        pages.set(start.sizes, start.count);
+        ZoomPlace place(pdfLimits);
+        place.setSizes(view, pages.contentSize());
+        pages.setRestingZoom(place.zoom());
+        return file.renderTop(0, pages.renderWidth(start.sizes.front(), place.zoom(), density),
+                              static_cast<int>(std::lround(view.height() * density)));
+    }
+
+    void take(PdfStart start, const Failure& failure) {
         if (failure) {
             reports_.failed(*failure);
             return;
         }
-        const std::size_t measured = sizes.size();
-        content_->set(std::move(sizes), count);
+        const std::size_t measured = start.sizes.size();
+        content_->set(std::move(start.sizes), start.count);
+        if (!start.top.isNull())
+            content_->setTop(0, std::move(start.top));
         widget_->contentChanged();
         reports_.shown();
         measureFrom(measured);
@@ -97,7 +130,10 @@ private:
     void measureFrom(std::size_t page) {
         if (page >= std::min(content_->pageCount(), mostMeasured))
             return;
-        worker_.run([this, slot = slot_, page](PreviewToken&) -> Job {
+        worker_.run([this, slot = slot_, wishes = wishes_, page](PreviewToken&) -> Job {
+            // What one looks at goes first; it is already on its way to this queue.
+            if (!wishes->isEmpty())
+                return [this, page] { measureFrom(page); };
             auto sizes = slot->file->pageSizes(page, measuredAtOnce);
             return [this, page, sizes = std::move(sizes)] {
                 if (content_->correct(page, sizes))
@@ -128,6 +164,11 @@ private:
                 renderNext();
             };
         });
+    }
+
+    void moved() {
+        content_->setRestingZoom(widget_->fittingZoom());
+        tellPlace();
     }
 
     void tellPlace() {

@@ -90,6 +90,7 @@ void PreviewView::setDocument(std::shared_ptr<View> document) {
         return;
     insertSubview(document_, 0);
     document_->setHidden(true);
+    document_->setFrame(bounds()); // it may ask before the next layout how large it is
     setNeedsLayout();
 }
 

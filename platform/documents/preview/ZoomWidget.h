@@ -43,6 +43,8 @@ public:
 
     ZoomContent& content() const { return *content_; }
     double zoom() const { return place_.zoom(); }
+    /// That of all of it, or all of its width, in view.
+    double fittingZoom() const { return place_.fittingZoom(); }
     /// The part of the content that is in view.
     QRectF visibleRect() const { return place_.visibleRect(); }
     void zoomBy(double factor);
