@@ -10,6 +10,7 @@
 #include <QImageReader>
 #include <QPainter>
 
+#include <optional>
 #include <vector>
 
 namespace platform {
@@ -28,7 +29,9 @@ struct Pyramid {
 
 Pyramid buildPyramid(QImage image, QSize fullSize) {
     Pyramid pyramid{fullSize, {}};
-    pyramid.levels.push_back(std::move(image).convertToFormat(QImage::Format_ARGB32_Premultiplied));
+    const bool opaque = !image.hasAlphaChannel();
+    pyramid.levels.push_back(std::move(image).convertToFormat(
+        opaque ? QImage::Format_RGB32 : QImage::Format_ARGB32_Premultiplied));
     while (std::max(pyramid.levels.back().width(), pyramid.levels.back().height()) >
            2 * smallestLevel) {
         const QImage& last = pyramid.levels.back();
@@ -68,7 +71,7 @@ private:
 class ImageRenderer final : public PreviewRenderer {
 public:
     ImageRenderer(MainQueue& main, PreviewReports reports)
-        : reports_(std::move(reports)), worker_(main) {
+        : main_(main), reports_(std::move(reports)), worker_(main) {
         auto content = std::make_unique<PictureContent>();
         content_ = content.get();
         auto widget = std::make_unique<ZoomWidget>(
@@ -95,12 +98,21 @@ public:
 private:
     void read() {
         worker_.cancel();
-        worker_.run([this, file = file_](PreviewToken& token) -> Job {
+        const QSize view = widget_->size() * widget_->devicePixelRatioF();
+        worker_.run([this, &main = main_, file = file_, view](PreviewToken& token) -> Job {
             const auto pyramid = std::make_shared<Pyramid>();
+            bool isShown = false;
             const Failure failure = readDocument(file, token, [&](const std::string& path) {
+                // All that fits into the view can be seen before all that there is has been read.
+                if (const auto coarse = readCoarsePicture(path, view)) {
+                    const Pyramid first{coarse->fullSize, {coarse->image}};
+                    token.deliver(main, [this, first] { take(first, false, {}); });
+                    isShown = true;
+                }
                 return decode(file, path, token, *pyramid);
             });
-            return [this, pyramid, failure] { take(std::move(*pyramid), failure); };
+            return
+                [this, pyramid, isShown, failure] { take(std::move(*pyramid), isShown, failure); };
         });
     }
 
@@ -113,16 +125,18 @@ private:
         return std::nullopt;
     }
 
-    void take(Pyramid pyramid, const Failure& failure) {
+    void take(Pyramid pyramid, bool isShown, const Failure& failure) {
         if (failure) {
             reports_.failed(*failure);
             return;
         }
         content_->set(std::move(pyramid));
         widget_->contentChanged();
-        reports_.shown();
+        if (!isShown)
+            reports_.shown();
     }
 
+    MainQueue& main_;
     PreviewReports reports_;
     Url file_;
     PictureContent* content_ = nullptr;

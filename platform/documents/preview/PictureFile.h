@@ -6,6 +6,7 @@
 #include <QImage>
 #include <QSize>
 
+#include <optional>
 #include <string>
 
 class QIODevice;
@@ -26,6 +27,9 @@ struct Picture {
 /// memory to read is an error that says so.
 Result<Picture> readPicture(const Url& file, const std::string& path, double mostPixels,
                             const PreviewToken& token);
+/// The same with fewer pixels, but no fewer than fill `view`, where a picture can be read so in a
+/// fraction of the time; none where it cannot, for whatever reason.
+std::optional<Picture> readCoarsePicture(const std::string& path, QSize view);
 /// The same of pixels alone, from an open device; never reads another file. None when it is no
 /// such picture.
 QImage readPixels(QIODevice& device, double mostPixels);
