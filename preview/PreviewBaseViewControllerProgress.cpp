@@ -13,6 +13,7 @@ using platform::Progress;
 
 /// A progress is logged in steps of a twentieth.
 constexpr double chunkCount = 20;
+constexpr platform::Duration screenHoldTime{16'666'667};
 
 FileProgressSubscription& service() {
     return platform::Platform::current().fileProgress();
@@ -69,8 +70,8 @@ FileProgressSubscription::Unpublished PreviewBaseViewController::ProgressState::
             if (!self || !current)
                 return;
             self->logStep(*current);
-            if (const auto shown = platform::lockForMain(screen))
-                shown->updateProgress(current);
+            if (const auto shown = self->hold(screen))
+                (*shown)->updateProgress(current);
         });
     if (progress->kind() != platform::fileProgressKind)
         VXLOG(vxDebug, "ignoring progress with different kind %@, kind = %@", *progress,
@@ -85,6 +86,20 @@ FileProgressSubscription::Unpublished PreviewBaseViewController::ProgressState::
         if (const auto self = weak.lock())
             self->end();
     };
+}
+
+std::shared_ptr<PreviewBaseViewController::ProgressState::Screen>
+PreviewBaseViewController::ProgressState::hold(
+    const std::weak_ptr<PreviewBaseViewController>& screen) {
+    const std::lock_guard lock(mutex);
+    if (auto held = held_.lock())
+        return held;
+    auto held = std::make_shared<Screen>(screen.lock());
+    if (!*held)
+        return nullptr;
+    held_ = held;
+    platform::Platform::current().mainQueue().after(screenHoldTime, [held] {});
+    return held;
 }
 
 void PreviewBaseViewController::ProgressState::logStep(const Progress& progress) {

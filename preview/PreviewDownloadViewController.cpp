@@ -8,6 +8,8 @@
 #include "preview/PreviewItemManager.h"
 #include "services/NetworkWatcher.h"
 
+#include <utility>
+
 namespace tavrin {
 namespace {
 
@@ -36,6 +38,10 @@ void PreviewDownloadViewController::setupViewsAndConstraints() {
     downloadView_ = std::make_shared<DownloadView>();
     downloadView_->setDelegate(
         std::static_pointer_cast<PreviewDownloadViewController>(shared_from_this()));
+    downloadView_->roundProgressView()->setStepHandler([weak = weak_from_this()] {
+        if (const auto self = std::static_pointer_cast<PreviewDownloadViewController>(weak.lock()))
+            self->showWaitingReport();
+    });
     for (const Axis axis : {Axis::horizontal, Axis::vertical}) {
         thumbnailView_->setContentHuggingPriority(takesSpareRoom, axis);
         thumbnailView_->setCompressionResistancePriority(platform::layoutRequired, axis);
@@ -66,6 +72,7 @@ void PreviewDownloadViewController::viewWillAppear(bool animated) {
 
 void PreviewDownloadViewController::setDownloading(bool downloading) {
     downloading_ = downloading;
+    waitingReport_ = nullptr;
     if (isViewLoaded())
         downloadView_->setDownloading(downloading);
 }
@@ -89,7 +96,7 @@ void PreviewDownloadViewController::updateProgress(
         waiting->store(false);
         const auto self = std::static_pointer_cast<PreviewDownloadViewController>(weak.lock());
         if (self && self->isViewLoaded())
-            self->downloadView_->updateProgress(*progress);
+            self->takeReport(progress);
     };
     const bool atAnEnd = progress->completedUnitCount() == 0 ||
                          progress->completedUnitCount() >= progress->totalUnitCount();
@@ -97,6 +104,18 @@ void PreviewDownloadViewController::updateProgress(
         mainQueue().async(show);
     else
         mainQueue().after(frameTime, show);
+}
+
+void PreviewDownloadViewController::takeReport(
+    const std::shared_ptr<platform::Progress>& progress) {
+    waitingReport_ = progress;
+    if (!downloadView_->roundProgressView()->isAnimating())
+        showWaitingReport();
+}
+
+void PreviewDownloadViewController::showWaitingReport() {
+    if (const auto report = std::exchange(waitingReport_, nullptr))
+        downloadView_->updateProgress(*report);
 }
 
 void PreviewDownloadViewController::adjustViewsForOrientation(Orientation orientation) {
@@ -142,6 +161,7 @@ void PreviewDownloadViewController::downloadViewDidPressStartDownload(
 
 void PreviewDownloadViewController::downloadViewDidPressCancelDownload(
     DownloadView& view, const std::optional<platform::Url>& /*url*/) {
+    waitingReport_ = nullptr;
     view.setDownloading(false);
     if (const auto manager = itemManager())
         manager->cancelDownload();

@@ -37,10 +37,15 @@ public:
     const std::shared_ptr<ThumbnailImageView>& thumbnailView() const { return thumbnailView_; }
 
 private:
+    void takeReport(const std::shared_ptr<platform::Progress>& progress);
+    void showWaitingReport();
+
     bool downloading_ = false;
     std::shared_ptr<platform::StackView> mainStackView_;
     std::shared_ptr<DownloadView> downloadView_;
     std::shared_ptr<ThumbnailImageView> thumbnailView_;
+    /// Waits for the next step of the pie, so that both are painted at once.
+    std::shared_ptr<platform::Progress> waitingReport_;
     /// Whether a report already waits on the main queue: reports come faster than frames.
     std::shared_ptr<std::atomic<bool>> reportWaiting_ = std::make_shared<std::atomic<bool>>(false);
 };

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "platform/base/MainOwned.h"
 #include "platform/files/Progress.h"
 #include "preview/PreviewBaseViewController.h"
 
@@ -25,9 +26,17 @@ struct PreviewBaseViewController::ProgressState
     std::atomic<int> lastChunk{-1};
 
 private:
+    using Screen = platform::MainOwned<PreviewBaseViewController>;
+
+    /// The screen, held for a frame and for all reports that come meanwhile: the main thread is
+    /// asked to let go of it sixty times a second at most, however many reports there are.
+    std::shared_ptr<Screen> hold(const std::weak_ptr<PreviewBaseViewController>& screen);
+
     platform::FileProgressSubscription::Unpublished
     observe(const std::shared_ptr<platform::Progress>& progress,
             const std::weak_ptr<PreviewBaseViewController>& screen);
+
+    std::weak_ptr<Screen> held_; // guarded by mutex
 };
 
 } // namespace tavrin

@@ -111,8 +111,12 @@ void RoundProgressView::startProgressTimer() {
     progressTimer_ = std::make_unique<platform::TimerSource>(runtime.clock, runtime.mainQueue);
     progressTimer_->schedule(animationStep, animationStep);
     progressTimer_->setHandler([weak = weak_from_this()] {
-        if (const auto self = std::static_pointer_cast<RoundProgressView>(weak.lock()))
-            self->increaseUIProgress();
+        const auto self = std::static_pointer_cast<RoundProgressView>(weak.lock());
+        if (!self)
+            return;
+        if (self->step_)
+            self->step_();
+        self->increaseUIProgress();
     });
     progressTimer_->resume();
 }

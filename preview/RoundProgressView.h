@@ -5,7 +5,9 @@
 #include "platform/ui/ShapeLayer.h"
 #include "platform/ui/View.h"
 
+#include <functional>
 #include <memory>
+#include <utility>
 
 namespace tavrin {
 
@@ -24,6 +26,8 @@ public:
     void setProgress(float progress);
     /// An empty wedge; the timer stops.
     void resetProgress();
+    /// Called before each step of the animation: what changes then is painted together with it.
+    void setStepHandler(std::function<void()> step) { step_ = std::move(step); }
     void startProgressTimer();
     void stopProgressTimer();
     /// The growth a step, while no timer runs.
@@ -60,6 +64,7 @@ private:
     float realProgress_ = 0;
     float increaseRate_ = 0;
     platform::Date prevUpdateTime_;
+    std::function<void()> step_;
 };
 
 } // namespace tavrin

@@ -290,6 +290,11 @@ TEST_F(Download, takesAFloodOfReportsOnceAFrame) {
     EXPECT_EQ(shown.text(), "0 bytes of 1 KB");
     advance(17ms);
     EXPECT_EQ(shown.text(), "9 KB of 10 KB");
+    progress->update(9'500, 10'000);
+    advance(16ms);
+    EXPECT_EQ(shown.text(), "9 KB of 10 KB") << "it waits for the next step of the pie";
+    advance(34ms);
+    EXPECT_EQ(shown.text(), "9.5 KB of 10 KB");
 }
 
 /// The widgets alone, on the screen of nobody's store.
