@@ -11,7 +11,7 @@ set -euo pipefail
 here=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
 id=com.pelmora.Tavrin
 programs=$here/build/${TAVRIN_PRESET:-release}/bin
-names=(tavrin tavrin-open tavrin-list-archive tavrin-play-media pelmora)
+names=(tavrin tavrin-open tavrin-draw-picture tavrin-list-archive tavrin-play-media pelmora)
 prefix=
 uninstall=false
 

@@ -637,6 +637,10 @@
         <translation>جزء من هذا البرنامج مفقود: لا يمكن سرد محتويات الأرشيفات. أعد تثبيته.</translation>
     </message>
     <message>
+        <source>A part of this program is missing: drawings cannot be shown. Install it again.</source>
+        <translation>جزء من هذا البرنامج مفقود: لا يمكن عرض الرسوم. أعد تثبيته.</translation>
+    </message>
+    <message>
         <source>Encrypted</source>
         <translation>مشفّر</translation>
     </message>

@@ -609,6 +609,10 @@
         <translation>Ein Teil dieses Programms fehlt: Archive lassen sich nicht auflisten. Bitte installieren Sie es neu.</translation>
     </message>
     <message>
+        <source>A part of this program is missing: drawings cannot be shown. Install it again.</source>
+        <translation>Ein Teil dieses Programms fehlt: Zeichnungen lassen sich nicht zeigen. Bitte installieren Sie es neu.</translation>
+    </message>
+    <message>
         <source>Encrypted</source>
         <translation>Verschlüsselt</translation>
     </message>

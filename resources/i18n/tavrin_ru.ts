@@ -616,6 +616,10 @@
         <translation>Не хватает части этой программы: содержимое архивов показать нельзя. Установите её заново.</translation>
     </message>
     <message>
+        <source>A part of this program is missing: drawings cannot be shown. Install it again.</source>
+        <translation>Не хватает части этой программы: рисунки показать нельзя. Установите её заново.</translation>
+    </message>
+    <message>
         <source>Encrypted</source>
         <translation>Зашифровано</translation>
     </message>

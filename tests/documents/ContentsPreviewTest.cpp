@@ -237,7 +237,7 @@ TEST(ArchiveRecords, comeOutOfAnyPiecesAsTheyWentIn) {
 /// A child of the shell's, watched on a thread of its own.
 struct Children : ::testing::Test {
     ManualClock clock;
-    std::shared_ptr<PreviewToken> token = std::make_shared<PreviewToken>();
+    std::shared_ptr<PreviewToken> token = std::make_shared<PreviewToken>(clock);
     std::string output;
     std::promise<void> spoke;
 

@@ -157,7 +157,7 @@ TEST(OfficeConversion, hasItsTime) {
     const Office office;
     const test::TemporaryFolder folder;
     ManualClock clock;
-    const auto token = std::make_shared<PreviewToken>();
+    const auto token = std::make_shared<PreviewToken>(clock);
     OfficeConverter converter(*officeProgram(), OfficeCache(folder / "cache"), clock);
     const std::string work = converter.cache().makeWorkFolder().value();
     const Url document = Url::file(folder.write("Long.odt", "hang"));

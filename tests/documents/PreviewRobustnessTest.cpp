@@ -71,6 +71,22 @@ TEST_F(HostileDocument, drawingsThatGrowWithoutEndAreBounded) {
     EXPECT_TRUE(isShown("Self.svg", test::drawing(R"(<g id="a"><use xlink:href="#a"/></g>)")));
 }
 
+TEST_F(HostileDocument, aDrawingWithoutEndHoldsNobodyForLong) {
+    std::string path = "M0 0";
+    for (unsigned i = 1, at = 1; i <= 360'000; ++i) {
+        at = at * 1664525U + 1013904223U;
+        path += (i % 6 == 1 ? " C " : " ") + std::to_string(static_cast<int>(at >> 18) - 8192);
+    }
+    const std::string look = R"(<path stroke="black" stroke-width="3000" stroke-dasharray="1 2" )";
+    house.givenFile("Dashes.svg", test::drawing(look + "d=\"" + path + "\"/>"));
+    show("Dashes.svg");
+    for (int i = 0; i < 1000 && !view().showsPage(); ++i) {
+        house.advance(std::chrono::seconds(1));
+        house.waitBriefly();
+    }
+    EXPECT_NE(view().pageText().find("too large"), std::string::npos);
+}
+
 TEST_F(HostileDocument, aDrawingOfAnySizeIsShownSharp) {
     const std::string square = R"(<rect width="50" height="100" fill="#00f"/>)";
     std::string huge = test::drawing(square);

@@ -110,7 +110,7 @@ struct RichFolder : ::testing::Test {
     bool showsPicture(const std::string& address) {
         const std::string path = house.givenFile("Text.html", "<p>Text</p><img width=200 src=\"" +
                                                                   address + "\"><p>More</p>");
-        PreviewToken token;
+        PreviewToken token(*house.clock);
         RichDocument document;
         EXPECT_TRUE(document.read(Url::file(path), path, RichFormat::html, token).value());
         document.layOut({360, 1}, 0);

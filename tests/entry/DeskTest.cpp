@@ -125,7 +125,8 @@ TEST_F(Desk, InstalledItOpensTheAddressesOfItsScheme) {
         GTEST_SKIP() << "the packages xdg-utils and desktop-file-utils are not installed";
     givenRuntimeFolder();
     environment.emplace_back("DISPLAY=:99"); // asked for, though nothing is drawn there
-    for (const char* const name : {"pelmora", "tavrin-list-archive", "tavrin-play-media"})
+    for (const char* const name :
+         {"pelmora", "tavrin-draw-picture", "tavrin-list-archive", "tavrin-play-media"})
         fs::copy("/bin/true", bin + "/" + name);
     const auto install = [&](const std::string& more) {
         return test::run({{INSTALLER, "--programs", bin, more}, environment});

@@ -4,6 +4,7 @@
 // the following entries take.
 
 #include "platform/documents/preview/ArchiveRecords.h"
+#include "platform/documents/preview/ChildLimits.h"
 
 #include <archive.h>
 #include <archive_entry.h>
@@ -11,10 +12,7 @@
 #include <cerrno>
 #include <chrono>
 #include <clocale>
-#include <csignal>
 #include <iconv.h>
-#include <sys/prctl.h>
-#include <sys/resource.h>
 #include <unistd.h>
 
 namespace {
@@ -27,34 +25,12 @@ constexpr std::size_t mostEntries = 100'000;
 /// Of all names together, for archives whose every path is thousands of bytes long.
 constexpr std::size_t mostNameBytes = 24UL << 20;
 /// The largest dictionaries in use take 64 to 128 MiB; a directory of 100,000 names about 30.
-constexpr rlim_t mostMemory = 512UL << 20;
+constexpr std::size_t mostMemory = 512UL << 20;
 /// Seconds of work; the preview, which counts other seconds, ends a silent lister as well.
-constexpr rlim_t mostWork = 120;
+constexpr unsigned mostWork = 120;
 constexpr std::size_t archiveReadSize = 64UL << 10;
 constexpr std::size_t flushSize = 64UL << 10;
 constexpr std::chrono::milliseconds flushTime(200);
-
-#if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__)
-constexpr bool memoryCanBeLimited = false; // sanitizers reserve the whole address space
-#else
-constexpr bool memoryCanBeLimited = true;
-#endif
-
-void limit(__rlimit_resource_t what, rlim_t most) {
-    const rlimit both{most, most};
-    ::setrlimit(what, &both);
-}
-
-void limitThisProcess() {
-    ::prctl(PR_SET_PDEATHSIG, SIGKILL);
-    ::prctl(PR_SET_NO_NEW_PRIVS, 1, 0, 0, 0);
-    ::prctl(PR_SET_DUMPABLE, 0);
-    if (memoryCanBeLimited)
-        limit(RLIMIT_AS, mostMemory);
-    limit(RLIMIT_CPU, mostWork);
-    limit(RLIMIT_FSIZE, 0);
-    limit(RLIMIT_CORE, 0);
-}
 
 class Output {
 public:
@@ -210,7 +186,7 @@ ArchiveRecord list(archive* reader, Output& output) {
 } // namespace
 
 int main() {
-    limitThisProcess();
+    platform::limitThisProcess(mostMemory, mostWork);
     // Names in an archive are converted to the locale's encoding.
     std::setlocale(LC_ALL, "C.UTF-8");
     Output output;

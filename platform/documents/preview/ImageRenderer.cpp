@@ -116,7 +116,7 @@ private:
         });
     }
 
-    static Failure decode(const Url& file, const std::string& path, const PreviewToken& token,
+    static Failure decode(const Url& file, const std::string& path, PreviewToken& token,
                           Pyramid& into) {
         Result<Picture> picture = readPicture(file, path, mostPicturePixels, token);
         if (!picture)

@@ -63,14 +63,14 @@ Error tooLargeDocument(const Url& file) {
 }
 
 Result<Picture> readPicture(const Url& file, const std::string& path, double mostPixels,
-                            const PreviewToken& token) {
+                            PreviewToken& token) {
     QFile content(QString::fromStdString(path));
     if (!content.open(QIODevice::ReadOnly))
         return damagedDocument(file, content.errorString().toStdString());
     QImageReader reader(&content);
     setUp(reader);
     if (isVectorFormat(reader.format()))
-        return drawVectorPicture(file, content, token);
+        return drawVectorPicture(file, content, mostPixels, token);
     QSize size = reader.size();
     if (pixelsOf(size) > mostDecodedPixels)
         return tooLargeDocument(file);

@@ -26,7 +26,7 @@ struct Picture {
 /// are never held: a larger picture is read smaller. One that would take unreasonable time or
 /// memory to read is an error that says so.
 Result<Picture> readPicture(const Url& file, const std::string& path, double mostPixels,
-                            const PreviewToken& token);
+                            PreviewToken& token);
 /// The same with fewer pixels, but no fewer than fill `view`, where a picture can be read so in a
 /// fraction of the time; none where it cannot, for whatever reason.
 std::optional<Picture> readCoarsePicture(const std::string& path, QSize view);

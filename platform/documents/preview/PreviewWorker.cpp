@@ -95,6 +95,7 @@ void PreviewToken::deliver(MainQueue& main, Job job) {
 
 PreviewWorker::PreviewWorker(MainQueue& main)
     : main_(main),
+      token_(std::make_shared<PreviewToken>(main.clock())),
       queue_(std::make_unique<WorkQueue>("platform.preview", WorkPriority::userInitiated)) {
 }
 
@@ -115,7 +116,7 @@ void PreviewWorker::run(Work work) {
 
 void PreviewWorker::cancel() {
     token_->cancel();
-    token_ = std::make_shared<PreviewToken>();
+    token_ = std::make_shared<PreviewToken>(main_.clock());
 }
 
 Failure readDocument(const Url& file, PreviewToken& token,

@@ -17,6 +17,10 @@ class WorkQueue;
 /// Tells work that goes on elsewhere whether anybody still wants it.
 class PreviewToken : public std::enable_shared_from_this<PreviewToken> {
 public:
+    explicit PreviewToken(Clock& clock) : clock_(clock) {}
+
+    /// For limits of time; not asked any more once cancelled.
+    Clock& clock() const { return clock_; }
     bool isCancelled() const { return cancel_.isCancelled(); }
     void cancel();
     CancelFlag& flag() { return cancel_; }
@@ -27,6 +31,7 @@ public:
     void deliver(MainQueue& main, Job job);
 
 private:
+    Clock& clock_;
     CancelFlag cancel_;
     std::mutex mutex_;
 };
@@ -53,7 +58,7 @@ public:
 
 private:
     MainQueue& main_;
-    std::shared_ptr<PreviewToken> token_ = std::make_shared<PreviewToken>();
+    std::shared_ptr<PreviewToken> token_;
     std::unique_ptr<WorkQueue> queue_;
     Job lastJob_;
 };

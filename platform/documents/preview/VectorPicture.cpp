@@ -1,128 +1,91 @@
 #include "platform/documents/preview/VectorPicture.h"
 
-#include "platform/documents/preview/PreviewWorker.h"
+#include "platform/base/Text.h"
+#include "platform/documents/preview/ChildWork.h"
+#include "platform/documents/preview/DrawnPicture.h"
 
+#include <QCoreApplication>
 #include <QFile>
-#include <QPainter>
-#include <QSvgRenderer>
 
 #include <algorithm>
-#include <array>
-#include <chrono>
-#include <cmath>
-#define ZLIB_CONST // it does not write to what it reads
-#include <zlib.h>
+#include <cstring>
+#include <string_view>
+#include <unistd.h>
 
 namespace platform {
 namespace {
 
-/// Drawn once, at most that many times as large as the file says: no view enlarges further.
-constexpr double largestScale = 8;
-/// 32 MB; four times the pixels of a large screen.
-constexpr double mostDrawnPixels = 8e6;
-/// The painter's own limit of coordinates.
-constexpr double longestEdge = 32'000;
-/// Longer texts are maps and plans whose tree alone takes half a gigabyte.
-constexpr qint64 longestText = 64LL * 1024 * 1024;
-/// The drawing is looked at between bands: nobody waits longer for a picture.
-constexpr int bands = 4;
-constexpr std::chrono::seconds longestDrawing{15};
+constexpr const char* drawerName = "/tavrin-draw-picture";
+/// Longer than the drawer may work: on a busy machine it gets a part of the time.
+constexpr Duration longestDrawing = std::chrono::seconds(20);
 
-/// Empty when it is not whole, or unpacks to more than a text may have.
-QByteArray unpacked(const QByteArray& packed) {
-    constexpr int gzipWindow = 15 + 16;
-    z_stream stream{};
-    if (::inflateInit2(&stream, gzipWindow) != Z_OK)
-        return {};
-    stream.next_in = reinterpret_cast<const Bytef*>(packed.constData());
-    stream.avail_in = static_cast<uInt>(packed.size());
-    QByteArray text;
-    std::array<char, 64UL * 1024> piece;
-    int state = Z_OK;
-    while (state == Z_OK && text.size() <= longestText) {
-        stream.next_out = reinterpret_cast<Bytef*>(piece.data());
-        stream.avail_out = static_cast<uInt>(piece.size());
-        state = ::inflate(&stream, Z_NO_FLUSH);
-        text.append(piece.data(), static_cast<qsizetype>(piece.size() - stream.avail_out));
+bool isDrawn(const DrawnHead& head) {
+    return head.state == DrawnHead::State::drawn && head.width > 0 && head.height > 0 &&
+           head.fullWidth > 0 && head.fullHeight > 0 && head.width <= longestDrawnEdge &&
+           head.height <= longestDrawnEdge &&
+           static_cast<double>(head.width) * head.height <= 2 * mostDrawnPixels;
+}
+
+/// Puts the picture together from the pieces in which it comes.
+class Arriving {
+public:
+    /// False for what is no picture.
+    bool add(std::string_view bytes) {
+        const std::size_t ofHead = std::min(bytes.size(), sizeof head_ - headBytes_);
+        std::memcpy(reinterpret_cast<char*>(&head_) + headBytes_, bytes.data(), ofHead);
+        headBytes_ += ofHead;
+        bytes.remove_prefix(ofHead);
+        if (headBytes_ < sizeof head_)
+            return true;
+        if (image_.isNull() && isDrawn(head_))
+            image_ = QImage(head_.width, head_.height, QImage::Format_ARGB32_Premultiplied);
+        if (bytes.size() > size() - filled_)
+            return false;
+        if (!bytes.empty())
+            std::memcpy(image_.bits() + filled_, bytes.data(), bytes.size());
+        filled_ += bytes.size();
+        return true;
     }
-    ::inflateEnd(&stream);
-    return state == Z_STREAM_END && text.size() <= longestText ? text : QByteArray();
-}
-
-QByteArray textOf(QFile& content) {
-    content.seek(0);
-    QByteArray bytes = content.read(longestText + 1);
-    if (bytes.startsWith("\x1F\x8B"))
-        return unpacked(bytes);
-    return bytes.size() > longestText ? QByteArray() : bytes;
-}
-
-/// A picture within the picture would be read from wherever its address says: what is not in the
-/// text itself stays out.
-QByteArray withoutOtherFiles(const QByteArray& text) {
-    QByteArray own;
-    own.reserve(text.size());
-    qsizetype copied = 0;
-    for (qsizetype tag = text.indexOf("image"); tag >= 0; tag = text.indexOf("image", tag + 1)) {
-        // No value of an attribute may hold this sign.
-        const qsizetype end = text.indexOf('<', tag);
-        for (qsizetype at = text.indexOf("href", tag); at >= 0 && (end < 0 || at < end);
-             at = text.indexOf("href", at + 1)) {
-            qsizetype value = at + 4;
-            while (value < text.size() && QByteArrayView("= \t\r\n\"'").contains(text[value]))
-                ++value;
-            if (value <= copied || QByteArrayView(text).sliced(value).startsWith("data:"))
-                continue;
-            own.append(QByteArrayView(text).sliced(copied, value - copied)).append("data:,");
-            copied = value;
-        }
+    bool isComplete() const { return !image_.isNull() && filled_ == size(); }
+    bool isDamaged() const {
+        return headBytes_ == sizeof head_ && head_.state == DrawnHead::State::damaged;
     }
-    return own.append(QByteArrayView(text).sliced(copied));
-}
+    Picture take() { return {std::move(image_), {head_.fullWidth, head_.fullHeight}}; }
 
-/// By its own measures; 1 in either direction at least.
-QSizeF sizeOf(const QSvgRenderer& renderer) {
-    const QSizeF size = renderer.defaultSize();
-    return {std::max(1.0, size.width()), std::max(1.0, size.height())};
-}
+private:
+    std::size_t size() const { return static_cast<std::size_t>(image_.sizeInBytes()); }
 
-/// Empty when it took too long or nobody wants it any more.
-QImage draw(QSvgRenderer& renderer, QSize pixels, const PreviewToken& token) {
-    const auto end = std::chrono::steady_clock::now() + longestDrawing;
-    QImage image(pixels, QImage::Format_ARGB32_Premultiplied);
-    image.fill(Qt::transparent);
-    const int step = std::max(1, pixels.height() / bands);
-    for (int top = 0; top < pixels.height(); top += step) {
-        if (token.isCancelled() || std::chrono::steady_clock::now() > end)
-            return {};
-        const int height = std::min(step, pixels.height() - top);
-        QImage band(image.scanLine(top), pixels.width(), height, image.bytesPerLine(),
-                    image.format());
-        QPainter painter(&band);
-        painter.setRenderHint(QPainter::Antialiasing);
-        renderer.render(&painter, QRectF(0, -top, pixels.width(), pixels.height()));
-    }
-    return image;
-}
+    DrawnHead head_;
+    std::size_t headBytes_ = 0;
+    QImage image_;
+    std::size_t filled_ = 0;
+};
 
 } // namespace
 
-Result<Picture> drawVectorPicture(const Url& file, QFile& content, const PreviewToken& token) {
-    const QByteArray text = textOf(content);
-    if (text.isEmpty())
-        return tooLargeDocument(file);
-    QSvgRenderer renderer;
-    if (token.isCancelled() || !renderer.load(withoutOtherFiles(text)))
-        return damagedDocument(file);
-    const QSizeF size = sizeOf(renderer);
-    const double scale =
-        std::min({largestScale, longestEdge / std::max(size.width(), size.height()),
-                  std::sqrt(mostDrawnPixels / (size.width() * size.height()))});
-    const QSize pixels = (size * scale).toSize().expandedTo({1, 1});
-    QImage image = draw(renderer, pixels, token);
-    if (image.isNull())
-        return tooLargeDocument(file);
-    return Picture{std::move(image), size.toSize()};
+Result<Picture> drawVectorPicture(const Url& file, QFile& content, double mostPixels,
+                                  PreviewToken& token) {
+    const std::string drawer =
+        (QCoreApplication::applicationDirPath() + QLatin1String(drawerName)).toStdString();
+    ProgramStart program{{drawer, std::to_string(std::min(mostPixels, mostDrawnPixels))}, "/"};
+    // It has letters to draw and no window to show.
+    program.environment = {{"QT_QPA_PLATFORM", "offscreen"}};
+    program.input = content.handle();
+    ::lseek(program.input, 0, SEEK_SET); // its head has been looked at
+    Arriving picture;
+    const ChildEnd end =
+        runChild(std::move(program), token, token.clock(), longestDrawing,
+                 [&picture](std::string_view bytes) { return picture.add(bytes); });
+    if (end == ChildEnd::cancelled)
+        return makeError(ErrorCode::userCancelled);
+    if (end == ChildEnd::absent)
+        return makeErrorWithText(ErrorCode::unsupportedOperation,
+                                 localized("A part of this program is missing: drawings cannot be "
+                                           "shown. Install it again."));
+    if (picture.isComplete())
+        return picture.take();
+    // It wanted more time or memory than a picture is worth, or broke down on it.
+    return picture.isDamaged() ? damagedDocument(file) : tooLargeDocument(file);
 }
 
 } // namespace platform

@@ -10,9 +10,10 @@ namespace platform {
 
 class PreviewToken;
 
-/// Draws a picture of lines and areas (SVG, packed or not) sharp enough to be enlarged. Ends
-/// when nobody wants it any more; one that takes too long or unpacks to too much is an error that
-/// says so. Within Work.
-Result<Picture> drawVectorPicture(const Url& file, QFile& content, const PreviewToken& token);
+/// Draws a picture of lines and areas (SVG, packed or not) sharp enough to be enlarged, with so
+/// many pixels at most, in a process of its own. Ends when nobody wants it any more; one that takes
+/// too long or unpacks to too much is an error that says so. Within Work.
+Result<Picture> drawVectorPicture(const Url& file, QFile& content, double mostPixels,
+                                  PreviewToken& token);
 
 } // namespace platform

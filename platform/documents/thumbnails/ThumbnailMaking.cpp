@@ -28,10 +28,10 @@ constexpr double settledAfter = 2;
 constexpr int quickPacking = 70;
 
 using Draw = Result<QImage> (*)(const Url& file, const std::string& path, int edge,
-                                const PreviewToken& token);
+                                PreviewToken& token);
 
 Result<QImage> drawPicture(const Url& file, const std::string& path, int edge,
-                           const PreviewToken& token) {
+                           PreviewToken& token) {
     Result<Picture> picture = readPicture(file, path, static_cast<double>(edge) * edge, token);
     if (!picture)
         return picture.error();
@@ -39,7 +39,7 @@ Result<QImage> drawPicture(const Url& file, const std::string& path, int edge,
 }
 
 Result<QImage> drawFirstPage(const Url& file, const std::string& path, int edge,
-                             const PreviewToken& /*token*/) {
+                             PreviewToken& /*token*/) {
     PdfFile document;
     if (const Failure failure = document.open(file, path))
         return *failure;
