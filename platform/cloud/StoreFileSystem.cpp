@@ -2,7 +2,9 @@
 
 #include "platform/cloud/Sidecar.h"
 #include "platform/files/FileDescriptor.h"
+#include "platform/files/PathText.h"
 
+#include <algorithm>
 #include <cerrno>
 #include <fcntl.h>
 #include <sys/stat.h>
@@ -16,12 +18,31 @@ Error failed(const std::string& path, bool writing = true) {
     return posixError(errno, Url::file(path), writing);
 }
 
+/// Room is kept ahead of the writing in steps: to give back a gigabyte of it takes the disk a tenth
+/// of a second, and whoever cancels a download waits for that.
+constexpr std::uint64_t roomStep = 64ULL * 1024 * 1024;
+
 class RealStagedFile final : public StagedFile {
 public:
-    RealStagedFile(FileDescriptor file, std::string path)
-        : file_(std::move(file)), path_(std::move(path)) {}
+    RealStagedFile(FileDescriptor file, std::string path, std::uint64_t size)
+        : file_(std::move(file)), path_(std::move(path)), size_(size) {}
+
+    /// File systems that cannot keep room (EOPNOTSUPP) tell that there is none when it comes to
+    /// that.
+    Failure keepRoom() {
+        const std::uint64_t length = std::min(roomStep, size_ - kept_);
+        if (length > 0 &&
+            fallocate(file_.get(), 0, static_cast<off_t>(kept_), static_cast<off_t>(length)) != 0 &&
+            (errno == ENOSPC || errno == EDQUOT || errno == EFBIG))
+            return failed(path_);
+        kept_ += length;
+        return std::nullopt;
+    }
 
     Failure write(std::span<const std::byte> piece) override {
+        while (kept_<size_&& static_cast<std::uint64_t>(written_) + piece.size()> kept_)
+            if (Failure failure = keepRoom())
+                return failure;
         while (!piece.empty()) {
             const ssize_t done = ::write(file_.get(), piece.data(), piece.size());
             if (done < 0 && errno == EINTR)
@@ -55,6 +76,8 @@ public:
 private:
     FileDescriptor file_;
     std::string path_;
+    const std::uint64_t size_;
+    std::uint64_t kept_ = 0;
     off_t written_ = 0;
 };
 
@@ -167,15 +190,14 @@ public:
             open(path.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC, 0644));
         if (!file)
             return failed(path);
-        // A full disk is known before the first byte is fetched. File systems that cannot keep
-        // room (EOPNOTSUPP) tell it when it comes to that.
-        if (size > 0 && fallocate(file.get(), 0, 0, static_cast<off_t>(size)) != 0 &&
-            (errno == ENOSPC || errno == EDQUOT || errno == EFBIG)) {
-            const Error error = failed(path);
+        auto staged = std::make_unique<RealStagedFile>(std::move(file), path, size);
+        // A full disk is known before the first byte is fetched.
+        Failure failure = hasRoom(path, size) ? staged->keepRoom() : noRoom(path);
+        if (failure) {
             unlink(path.c_str());
-            return error;
+            return *failure;
         }
-        return std::unique_ptr<StagedFile>(std::make_unique<RealStagedFile>(std::move(file), path));
+        return std::unique_ptr<StagedFile>(std::move(staged));
     }
 
     Failure writeSmallFile(const std::string& path, std::string_view content) override {
@@ -191,6 +213,17 @@ public:
     }
 
 private:
+    /// Of what is kept at once the disk itself says so. Where it cannot be known there is.
+    static bool hasRoom(const std::string& path, std::uint64_t size) {
+        const Result<std::uint64_t> free =
+            size > roomStep ? FileManager::freeBytes(folderOf(path)) : Result(size);
+        return !free || *free >= size;
+    }
+
+    static Error noRoom(const std::string& path) {
+        return posixError(ENOSPC, Url::file(path), true);
+    }
+
     static Failure syncWith(const std::string& path, int (*sync)(int)) {
         const FileDescriptor folder(open(path.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
         if (!folder || sync(folder.get()) != 0)

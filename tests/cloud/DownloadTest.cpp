@@ -148,6 +148,26 @@ TEST_F(Download, AFullDiskSaysSo) {
     expectPromiseAlone("A/one.txt");
 }
 
+TEST_F(Download, RoomIsKeptForWhatComesNextAndNothingBegunThatCannotFit) {
+    const auto real = makeRealStoreFileSystem();
+    const std::string path = home / "staged";
+    const auto refused = real->stage(path, 1ULL << 50);
+    ASSERT_TRUE(!refused && refused.error().is(ErrorCode::outOfSpace));
+    EXPECT_FALSE(FileManager::exists(path));
+    constexpr std::uint64_t MiB = 1 << 20;
+    const auto staged = real->stage(path, 256 * MiB);
+    ASSERT_TRUE(staged);
+    const Bytes piece(35 * MiB, std::byte{7});
+    for (const std::uint64_t most : {64 * MiB, 128 * MiB}) {
+        struct stat status {};
+        ASSERT_EQ(::stat(path.c_str(), &status), 0);
+        EXPECT_LE(static_cast<std::uint64_t>(status.st_blocks) * 512, most + MiB);
+        ASSERT_EQ((*staged)->write(piece), std::nullopt);
+    }
+    ASSERT_EQ((*staged)->finish(Date(), ""), std::nullopt);
+    EXPECT_EQ(FileManager::attributes(path, FollowLinks::no)->size, 70 * MiB);
+}
+
 TEST_F(Download, SomebodysFileInThePlaceOfThePromiseStays) {
     inTheMiddle([&] { givenLocal("A/one.txt", "written meanwhile"); });
     givenListed("A/one.txt");
