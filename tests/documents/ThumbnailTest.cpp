@@ -85,6 +85,44 @@ TEST_F(Thumbnails, AreOfTheWholeDocumentUpright) {
     EXPECT_EQ(answer(request("Mark.svg", 128)).size(), (Size{128, 64}));
 }
 
+TEST_F(Thumbnails, OfATextAreItsFirstLinesOnWhite) {
+    given("Long.txt", "First line\n\n\n\n" + std::string(2'000'000, 'x'));
+    given("Guide.md", "# A heading\n\nand a text");
+    given("Page.html", "<h1>A heading</h1><p>and a text");
+    given("Program.cpp", "int main() {}\n");
+    for (const char* const name : {"Long.txt", "Guide.md", "Page.html", "Program.cpp"}) {
+        ASSERT_EQ(answer(request(name, 128)).size(), (Size{91, 128})) << name;
+        const Bytes png = *kept(name, ThumbnailSize::normal);
+        const QImage page = QImage::fromData(reinterpret_cast<const uchar*>(png.data()),
+                                             static_cast<int>(png.size()));
+        EXPECT_EQ(page.pixelColor(1, 1), QColor(Qt::white)) << name;
+        int letters = 0;
+        for (int y = 0; y < 20; ++y)
+            for (int x = 0; x < page.width(); ++x)
+                letters += page.pixelColor(x, y).lightness() < 200 ? 1 : 0;
+        EXPECT_GT(letters, 5) << name;
+    }
+}
+
+TEST_F(Thumbnails, OfAPackageAreThePictureThatItBringsAlong) {
+    given("Sketch.rtfd/Data/Thumbnail.png", pngPicture(300, 100));
+    given("Bare.rtfd/Text.rtf", "text");
+    given("Sly.rtfd/Text.rtf", "text");
+    fs::create_symlink(house.path("Sketch.rtfd/Data/Thumbnail.png"),
+                       house.path("Sly.rtfd/preview.png"));
+    for (const char* const name : {"Sketch.rtfd", "Bare.rtfd", "Sly.rtfd"})
+        dateBack(name);
+    const auto package = [&](const std::string& name) {
+        ThumbnailRequest wanted = request(name, 128);
+        wanted.typeIdentifier = TypeRegistry::identifierForFile(house.path(name));
+        EXPECT_TRUE(TypeRegistry::conformsTo(wanted.typeIdentifier, types::package));
+        return answer(wanted);
+    };
+    EXPECT_EQ(package("Sketch.rtfd").size(), (Size{128, 42}));
+    EXPECT_TRUE(package("Bare.rtfd").empty());
+    EXPECT_TRUE(package("Sly.rtfd").empty()) << "a link leads out of it";
+}
+
 TEST_F(Thumbnails, AreMadeAnewInPlaceOfWhatIsNoneOfThem) {
     given("A.png", pngPicture(400, 200));
     given("B.png", pngPicture(100, 200));
@@ -171,16 +209,16 @@ TEST_F(Thumbnails, ThatNobodyWantsAnyMoreAreNotMade) {
 TEST_F(Thumbnails, StandInTheRowsOfTheirOwnDocumentsOnly) {
     given("A.png", pngPicture(400, 200));
     given("B.png", pngPicture(200, 400));
-    given("C.txt", "text");
+    given("C.zip", "no picture");
     showList();
     const auto isWide = [&](std::string_view name) {
         const Size size = inRow(name).size();
         return size.width > size.height;
     };
     ASSERT_TRUE(house.until([&] { return !inRow("A.png").empty() && !inRow("B.png").empty(); }));
-    EXPECT_TRUE(isWide("A.png") && !isWide("B.png") && inRow("C.txt").empty());
+    EXPECT_TRUE(isWide("A.png") && !isWide("B.png") && inRow("C.zip").empty());
     house.rename("A.png", "D.png");
-    ASSERT_TRUE(untilShown({"B.png", "C.txt", "D.png"}));
+    ASSERT_TRUE(untilShown({"B.png", "C.zip", "D.png"}));
     EXPECT_TRUE(isWide("D.png")) << "it does not blink when it gets another name";
     given("B.png", pngPicture(400, 100), 90);
     ASSERT_TRUE(house.until([&] { return inRow("B.png").size() == Size{40, 10}; }));

@@ -12,7 +12,7 @@ namespace {
 std::optional<ThumbnailRequest> requestFor(const RowModel& model, std::size_t index,
                                            const EntryDetails& details, double scale) {
     const DocumentEntry& entry = model.entryAt(index);
-    if (entry.kind != EntryKind::file || !details.modified ||
+    if (!isDocument(entry.kind) || !details.modified ||
         !ThumbnailLoader::makes(details.typeIdentifier))
         return std::nullopt;
     const int pixels = static_cast<int>(std::lround(Theme::rowIcon * scale));

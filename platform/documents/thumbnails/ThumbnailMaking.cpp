@@ -1,22 +1,17 @@
 #include "platform/documents/thumbnails/ThumbnailMaking.h"
 
-#include "platform/documents/preview/PdfFile.h"
-#include "platform/documents/preview/PictureFile.h"
-#include "platform/documents/preview/PreviewWorker.h"
+#include "platform/documents/thumbnails/ThumbnailDrawing.h"
 #include "platform/files/FileManager.h"
 #include "platform/launch/ThumbnailCache.h"
-#include "platform/launch/TypeRegistry.h"
 #include "platform/ui/qt/Bridge.h"
 
 #include <QBuffer>
-#include <QImageReader>
 #include <QImageWriter>
 #include <QPainter>
 
 #include <algorithm>
 #include <array>
 #include <chrono>
-#include <cmath>
 
 namespace platform {
 namespace {
@@ -26,44 +21,6 @@ namespace {
 constexpr double settledAfter = 2;
 /// Of 100: packing harder takes longer than the disk saves.
 constexpr int quickPacking = 70;
-
-using Draw = Result<QImage> (*)(const Url& file, const std::string& path, int edge,
-                                PreviewToken& token);
-
-Result<QImage> drawPicture(const Url& file, const std::string& path, int edge,
-                           PreviewToken& token) {
-    Result<Picture> picture = readPicture(file, path, static_cast<double>(edge) * edge, token);
-    if (!picture)
-        return picture.error();
-    return std::move(picture->image);
-}
-
-Result<QImage> drawFirstPage(const Url& file, const std::string& path, int edge,
-                             PreviewToken& /*token*/) {
-    PdfFile document;
-    if (const Failure failure = document.open(file, path))
-        return *failure;
-    const QSizeF fitting = document.pageSizes(0, 1).front().scaled(edge, edge, Qt::KeepAspectRatio);
-    QImage page = document.render(0, std::max(1, static_cast<int>(std::lround(fitting.width()))));
-    if (page.isNull())
-        return damagedDocument(file);
-    return page;
-}
-
-bool isReadablePicture(std::string_view typeIdentifier) {
-    if (!TypeRegistry::conformsTo(typeIdentifier, types::image))
-        return false;
-    static const QList<QByteArray> readable = QImageReader::supportedMimeTypes();
-    const std::string mime = TypeRegistry::mimeTypeForIdentifier(typeIdentifier);
-    return readable.contains(QByteArray::fromStdString(mime));
-}
-
-/// None for types without pictures.
-Draw drawingOf(std::string_view typeIdentifier) {
-    if (TypeRegistry::conformsTo(typeIdentifier, types::pdf))
-        return &drawFirstPage;
-    return isReadablePicture(typeIdentifier) ? &drawPicture : nullptr;
-}
 
 QImage fitted(const QImage& image, int edge) {
     if (image.isNull() || std::max(image.width(), image.height()) <= edge)
@@ -143,22 +100,23 @@ void keepFailure(const ThumbnailCache& cache, const ThumbnailRequest& request) {
     (void)cache.storeFailure(request.url, encoded(nothing, request));
 }
 
-MadeThumbnail drawAnew(const ThumbnailCache& cache, const ThumbnailRequest& request, Draw draw,
-                       PreviewToken& token) {
+MadeThumbnail drawAnew(const ThumbnailCache& cache, const ThumbnailRequest& request,
+                       const ThumbnailDrawing& drawing, PreviewToken& token) {
     const ThumbnailSize size = thumbnailSizeFor(request.pixels);
     const int edge = static_cast<int>(size);
     QImage image;
     Failure undrawable;
     bool unchanged = false;
-    const Failure failure = readDocument(request.url, token, [&](const std::string& path) {
-        Result<QImage> drawn = draw(request.url, path, edge, token);
+    const auto draw = [&](const std::string& path) {
+        Result<QImage> drawn = drawing.draw(request.url, path, edge, token);
         if (drawn)
             image = fitted(*drawn, edge);
         else
             undrawable = drawn.error();
         unchanged = isUnchanged(request);
         return Failure();
-    });
+    };
+    const Failure failure = readDocument(request.url, token, draw, drawing.form);
     // What could not even be read, or is another document by now, is looked at again another time;
     // and a drawing that nobody waited for has not failed.
     if (failure || !unchanged || (undrawable && token.isCancelled()))
@@ -175,13 +133,13 @@ MadeThumbnail drawAnew(const ThumbnailCache& cache, const ThumbnailRequest& requ
 } // namespace
 
 bool makesThumbnails(std::string_view typeIdentifier) {
-    return drawingOf(typeIdentifier) != nullptr;
+    return thumbnailDrawingFor(typeIdentifier) != nullptr;
 }
 
 MadeThumbnail makeThumbnail(const ThumbnailCache& cache, const ThumbnailRequest& request,
                             PreviewToken& token) {
-    const Draw draw = drawingOf(request.typeIdentifier);
-    if (!draw || cache.contains(request.url))
+    const ThumbnailDrawing* const drawing = thumbnailDrawingFor(request.typeIdentifier);
+    if (!drawing || cache.contains(request.url))
         return {{}, true};
     if (request.promised)
         return {fitted(fromBefore(cache, request), request.pixels), true};
@@ -189,7 +147,7 @@ MadeThumbnail makeThumbnail(const ThumbnailCache& cache, const ThumbnailRequest&
         return {fitted(image, request.pixels), true};
     if (cache.knowsFailure(request.url, request.modified))
         return {{}, true};
-    return drawAnew(cache, request, draw, token);
+    return drawAnew(cache, request, *drawing, token);
 }
 
 } // namespace platform
