@@ -6,6 +6,7 @@
 #include "platform/cloud/SyncTimes.h"
 #include "platform/cloud/Tokens.h"
 #include "platform/files/FileDescriptor.h"
+#include "platform/files/OpenFile.h"
 
 #include <cerrno>
 #include <fcntl.h>
@@ -28,10 +29,6 @@ SharedRole roleOf(const std::optional<std::string>& text) {
     if (text == "owner")
         return SharedRole::owner;
     return text == "participant" ? SharedRole::participant : SharedRole::none;
-}
-
-Result<FileAttributes> attributesOfOpen(int file) {
-    return FileManager::attributes("/proc/self/fd/" + std::to_string(file), FollowLinks::yes);
 }
 
 bool meansAway(const Error& error) {
@@ -220,7 +217,7 @@ Result<RemoteEntry> FolderRemote::read(const std::string& path, const Sink& sink
     if (!file)
         return translated(posixError(errno, Url::file(full), false));
     const Error changed = makeError(ErrorCode::changedWhileRead, before->name);
-    const Result<FileAttributes> opened = attributesOfOpen(file.get());
+    const Result<FileAttributes> opened = attributesOfOpen(file.get(), full);
     // A version may have grown up since: then the next try sees it so from the start.
     if (!opened || versionOf(*opened) != before->etag || before->kind != ItemKind::file)
         return changed;
@@ -243,7 +240,7 @@ Result<RemoteEntry> FolderRemote::read(const std::string& path, const Sink& sink
         if (Failure failure = sink({piece.data(), static_cast<std::size_t>(got)}))
             return *failure;
     }
-    const Result<FileAttributes> after = attributesOfOpen(file.get());
+    const Result<FileAttributes> after = attributesOfOpen(file.get(), full);
     const Result<FileAttributes> standing = FileManager::attributes(full, FollowLinks::no);
     if (!standing && !standing.error().is(ErrorCode::noSuchItem))
         return translated(standing.error());

@@ -2,6 +2,7 @@
 
 #include "platform/cloud/Sidecar.h"
 #include "platform/files/FileDescriptor.h"
+#include "platform/files/OpenFile.h"
 #include "platform/files/PathText.h"
 
 #include <algorithm>
@@ -87,8 +88,7 @@ public:
         : file_(std::move(file)), path_(std::move(path)) {}
 
     Result<FileAttributes> attributes() override {
-        return FileManager::attributes("/proc/self/fd/" + std::to_string(file_.get()),
-                                       FollowLinks::yes);
+        return attributesOfOpen(file_.get(), path_);
     }
 
     Result<std::size_t> read(std::uint64_t offset, std::span<std::byte> buffer) override {
@@ -146,8 +146,7 @@ public:
             return *failure;
         }
         // By the open file: somebody may have moved it already.
-        return FileManager::attributes("/proc/self/fd/" + std::to_string(file.get()),
-                                       FollowLinks::yes);
+        return attributesOfOpen(file.get(), path);
     }
 
     Failure setMark(const std::string& path, const std::string& mark) override {

@@ -1,6 +1,7 @@
 #include "platform/files/FileManager.h"
 
 #include "platform/files/FileDescriptor.h"
+#include "platform/files/OpenFile.h"
 #include "platform/files/PathText.h"
 
 #include <algorithm>
@@ -83,6 +84,13 @@ Result<FileAttributes> FileManager::attributes(std::string_view path, FollowLink
     const int flags = follow == FollowLinks::yes ? 0 : AT_SYMLINK_NOFOLLOW;
     if (::statx(AT_FDCWD, PathText(path).c_str(), flags, STATX_BASIC_STATS | STATX_BTIME, &info) !=
         0)
+        return readError(errno, path);
+    return attributesOf(info);
+}
+
+Result<FileAttributes> attributesOfOpen(int file, std::string_view path) {
+    struct statx info {};
+    if (::statx(file, "", AT_EMPTY_PATH, STATX_BASIC_STATS | STATX_BTIME, &info) != 0)
         return readError(errno, path);
     return attributesOf(info);
 }
