@@ -13,16 +13,14 @@ namespace {
 /// Entries that one transaction and one sync carry: enough that both cost little an entry, few
 /// enough that an interrupted listing repeats little and that the queue is free again soon.
 constexpr std::size_t batchSize = 4096;
+/// How often what was taken for another item is looked for anew in one run.
+constexpr int passesAtMost = 3;
 /// Folders that are read from the remote ahead of the one that is worked on.
 constexpr unsigned foldersAhead = 2;
 
 bool sameObservation(const RemoteRow& row, const RemoteEntry& entry) {
     return row.etag == entry.etag && row.size == entry.size && row.remoteId == entry.remoteId &&
            row.role == entry.role && row.tags == entry.tags;
-}
-
-std::string joined(const std::string& folder, const std::string& name) {
-    return folder.empty() ? name : folder + '/' + name;
 }
 
 } // namespace
@@ -51,16 +49,20 @@ RemoteLister::~RemoteLister() {
 
 Failure RemoteLister::run(const std::vector<ItemId>& folders, Depth depth) {
     depth_ = depth;
-    context_.queue.sync([&] {
-        for (const ItemId item : folders) {
-            const std::optional<std::string> remotePath = context_.database.remotePathOf(item);
-            const std::optional<std::string> localPath = context_.database.localPathOf(item);
-            if (remotePath)
-                waiting_.push_back(
-                    {item, *remotePath, localPath.value_or(""), false, false, !localPath});
-        }
-        first_ = !context_.database.scan(rootItem, Side::remote).complete;
-    });
+    waitFor(folders);
+    context_.queue.sync(
+        [&] { first_ = !context_.database.scan(rootItem, Side::remote).complete; });
+    Failure writing;
+    for (int pass = 1; pass <= passesAtMost && !waiting_.empty(); ++pass) {
+        writing = listWaiting();
+        if (writing || firstFailure_)
+            break;
+        listAgain();
+    }
+    return firstFailure_ ? firstFailure_ : writing;
+}
+
+Failure RemoteLister::listWaiting() {
     for (readAhead(); !reading_.empty(); readAhead()) {
         Reading next = std::move(reading_.front());
         reading_.pop_front();
@@ -73,10 +75,19 @@ Failure RemoteLister::run(const std::vector<ItemId>& folders, Depth depth) {
         if (stopsEverything(*failure))
             break;
     }
-    Failure writing = writeDown();
-    if (!writing)
-        writing = writtenSoFar();
-    return firstFailure_ ? firstFailure_ : writing;
+    return writeAll();
+}
+
+void RemoteLister::waitFor(const std::vector<ItemId>& folders) {
+    context_.queue.sync([&] {
+        for (const ItemId item : folders) {
+            const std::optional<std::string> remotePath = context_.database.remotePathOf(item);
+            const std::optional<std::string> localPath = context_.database.localPathOf(item);
+            if (remotePath)
+                waiting_.push_back(
+                    {item, *remotePath, localPath.value_or(""), false, false, !localPath});
+        }
+    });
 }
 
 void RemoteLister::noteFailure(const Folder& folder, const Error& error) {
@@ -141,6 +152,10 @@ Failure RemoteLister::bringIn(const Folder& folder, const Result<RemoteListing>&
     }
     if (!spot)
         return spot.error();
+    // One that moved while it was listed was another one before: that must be in the records.
+    if (!visited_.insert(folder.item).second)
+        if (Failure failure = writeAll())
+            return failure;
     Visit visit{folder, knownOf(folder), std::move(*spot), 1, listing->refused};
     std::unordered_map<std::string_view, const ItemState*> missing = visit.known.remote;
     for (const RemoteEntry& entry : listing->entries)
@@ -159,7 +174,8 @@ Failure RemoteLister::bringIn(const Folder& folder, const Result<RemoteListing>&
 }
 
 Failure RemoteLister::take(Visit& visit, const RemoteEntry& entry) {
-    if (const auto known = visit.known.remote.find(entry.name); known != visit.known.remote.end())
+    const auto known = visit.known.remote.find(entry.name);
+    if (known != visit.known.remote.end() && !moved_.contains(known->second->item.id))
         return takeKnown(visit, entry, *known->second);
     if (const std::optional<ItemState> moved = movedHere(visit, entry)) {
         takeMoved(visit, entry, *moved);
@@ -177,42 +193,6 @@ Failure RemoteLister::take(Visit& visit, const RemoteEntry& entry) {
     return takeNew(visit, entry, &state);
 }
 
-std::optional<ItemState> RemoteLister::movedHere(const Visit& visit, const RemoteEntry& entry) {
-    if (first_ || entry.remoteId.empty())
-        return std::nullopt;
-    std::optional<ItemState> state;
-    std::optional<std::string> before;
-    context_.queue.sync([&] {
-        if (const auto item = context_.database.itemOfRemoteId(entry.remoteId)) {
-            state = context_.database.state(*item);
-            before = context_.database.remotePathOf(*item);
-        }
-    });
-    if (!state || !state->remote || state->item.kind != entry.kind)
-        return std::nullopt;
-    const std::string now = joined(visit.folder.remotePath, entry.name);
-    if (!before || *before == now)
-        return state;
-    const Result<RemoteEntry> there = context_.remote.entry(*before, cancel_);
-    const bool left =
-        there ? there->remoteId != entry.remoteId : there.error().is(ErrorCode::noSuchItem);
-    return left ? state : std::nullopt; // a second name of one file is a file of its own
-}
-
-void RemoteLister::takeMoved(Visit& visit, const RemoteEntry& entry, const ItemState& state) {
-    RemoteRow row = rowOf(visit, entry);
-    ListingBatch::Change change{state.item, false, row, {}, {}};
-    // A move changes the version and no content, where size and time are the same.
-    if (state.base && state.remote->etag == state.base->etag && state.remote->size == entry.size &&
-        state.remote->modified == entry.modified && entry.kind == ItemKind::file) {
-        change.base = state.base;
-        change.base->etag = entry.etag;
-    }
-    batch_.changes.push_back(std::move(change));
-    if (entry.kind == ItemKind::folder)
-        descendKnown(visit, entry, state);
-}
-
 Failure RemoteLister::takeKnown(Visit& visit, const RemoteEntry& entry, const ItemState& state) {
     if (state.item.kind != entry.kind) {
         batch_.displaced.push_back(state.item.id); // another one has its place: it is not there
@@ -224,6 +204,8 @@ Failure RemoteLister::takeKnown(Visit& visit, const RemoteEntry& entry, const It
     }
     if (!state.local && !state.base && state.item.place && !visit.folder.recordOnly)
         return takeNew(visit, entry, &state);
+    if (entry.remoteId != state.remote->remoteId)
+        replaced_.insert(state.item.id);
     if (entry.kind == ItemKind::folder && depth_ == Depth::everything)
         descendKnown(visit, entry, state);
     if (sameObservation(*state.remote, entry)) {
@@ -297,8 +279,8 @@ Failure RemoteLister::takeNew(Visit& visit, const RemoteEntry& entry, const Item
                               std::move(outcome->base)});
     if (entry.kind == ItemKind::folder) {
         batch_.scans.push_back({item, {0, false}, std::nullopt});
-        waiting_.push_back({item, joined(visit.folder.remotePath, entry.name),
-                            joined(visit.folder.localPath, entry.name), state == nullptr,
+        waiting_.push_back({item, joinedPath(visit.folder.remotePath, entry.name),
+                            joinedPath(visit.folder.localPath, entry.name), state == nullptr,
                             outcome->madeFolder, false});
     }
     return std::nullopt;
@@ -311,7 +293,7 @@ void RemoteLister::addRemoteOnly(Visit& visit, const RemoteEntry& entry) {
     if (entry.kind == ItemKind::folder) {
         batch_.scans.push_back({item, {0, false}, std::nullopt});
         waiting_.push_back(
-            {item, joined(visit.folder.remotePath, entry.name), "", true, false, true});
+            {item, joinedPath(visit.folder.remotePath, entry.name), "", true, false, true});
     }
 }
 
@@ -320,10 +302,10 @@ void RemoteLister::descendKnown(const Visit& visit, const RemoteEntry& entry,
     std::optional<std::string> localPath;
     if (state.local && state.local->place == Place{visit.folder.item, entry.name} &&
         !visit.folder.recordOnly)
-        localPath = joined(visit.folder.localPath, entry.name);
+        localPath = joinedPath(visit.folder.localPath, entry.name);
     else if (state.local) // moved on this device
         context_.queue.sync([&] { localPath = context_.database.localPathOf(state.item.id); });
-    waiting_.push_back({state.item.id, joined(visit.folder.remotePath, entry.name),
+    waiting_.push_back({state.item.id, joinedPath(visit.folder.remotePath, entry.name),
                         localPath.value_or(""), false, false, !localPath});
 }
 
@@ -341,6 +323,11 @@ RemoteRow RemoteLister::rowOf(const Visit& visit, const RemoteEntry& entry) cons
 
 Failure RemoteLister::writtenSoFar() {
     return writing_.valid() ? writing_.get() : std::nullopt;
+}
+
+Failure RemoteLister::writeAll() {
+    Failure failure = writeDown();
+    return failure ? failure : writtenSoFar();
 }
 
 Failure RemoteLister::writeDown() {

@@ -7,6 +7,7 @@
 #include <deque>
 #include <functional>
 #include <future>
+#include <set>
 #include <unordered_map>
 
 namespace platform {
@@ -76,6 +77,8 @@ private:
         std::future<Result<RemoteListing>> listing;
     };
 
+    void waitFor(const std::vector<ItemId>& folders);
+    [[nodiscard]] Failure listWaiting();
     void readAhead();
     Failure bringIn(const Folder& folder, const Result<RemoteListing>& listing);
     Known knownOf(const Folder& folder);
@@ -85,15 +88,18 @@ private:
     bool promiseStands(const ItemState& state);
     Failure takeNew(Visit& visit, const RemoteEntry& entry, const ItemState* state);
     void addRemoteOnly(Visit& visit, const RemoteEntry& entry);
+    // See RemoteListerMoves.cpp.
     /// The known item that was elsewhere on the remote and is this one now.
     std::optional<ItemState> movedHere(const Visit& visit, const RemoteEntry& entry);
     void takeMoved(Visit& visit, const RemoteEntry& entry, const ItemState& state);
+    void listAgain();
     void descendKnown(const Visit& visit, const RemoteEntry& entry, const ItemState& state);
     RemoteRow rowOf(const Visit& visit, const RemoteEntry& entry) const;
     void noteFailure(const Folder& folder, const Error& error);
     /// Hands the batch to the queue once the one before has been written.
     Failure writeDown();
     Failure writtenSoFar();
+    [[nodiscard]] Failure writeAll();
 
     StoreContext& context_;
     CancelFlag& cancel_;
@@ -103,6 +109,12 @@ private:
     /// Nothing was known before this run, so that nothing can have moved.
     bool first_ = false;
     std::deque<Folder> waiting_;
+    std::set<ItemId> visited_;
+    // Of this run: items that were found by their identity at another place, and those in whose
+    // place something of another identity was found and taken for them.
+    std::set<ItemId> moved_;
+    std::set<ItemId> replaced_;
+    std::set<ItemId> again_;
     std::deque<Reading> reading_;
     OperationQueue readers_;
     ListingBatch batch_;

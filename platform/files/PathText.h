@@ -37,6 +37,13 @@ inline std::string_view folderOf(std::string_view path) {
         return ".";
     return slash == 0 ? path.substr(0, 1) : path.substr(0, slash);
 }
+/// The path of a name in a folder; "" is the folder that relative paths begin at.
+inline std::string joinedPath(std::string_view folder, std::string_view name) {
+    std::string path(folder);
+    if (!path.empty())
+        path += '/';
+    return path.append(name);
+}
 inline std::string_view nameOf(std::string_view path) {
     const std::size_t slash = path.rfind('/');
     return slash == std::string_view::npos ? path : path.substr(slash + 1);
