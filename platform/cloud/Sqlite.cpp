@@ -94,11 +94,15 @@ Connection::~Connection() {
     sqlite3_close_v2(handle_);
 }
 
-bool Connection::open(const std::string& path, bool readOnly) {
+bool Connection::open(const std::string& path, Access access) {
     path_ = path;
-    const int flags = readOnly ? SQLITE_OPEN_READONLY : SQLITE_OPEN_READWRITE | SQLITE_OPEN_CREATE;
+    const int flags = access == Access::write ? SQLITE_OPEN_READWRITE | SQLITE_OPEN_CREATE
+                                              : SQLITE_OPEN_READONLY | SQLITE_OPEN_URI;
+    const std::string name = access == Access::readOfFixed
+                                 ? Url::file(path).absoluteString() + "?immutable=1"
+                                 : path;
     const int result = sqlite3_open_v2(
-        path.c_str(), &handle_, flags | SQLITE_OPEN_NOMUTEX | SQLITE_OPEN_EXRESCODE, nullptr);
+        name.c_str(), &handle_, flags | SQLITE_OPEN_NOMUTEX | SQLITE_OPEN_EXRESCODE, nullptr);
     if (result != SQLITE_OK) {
         noteFault();
         return false;

@@ -91,7 +91,13 @@ public:
     Connection(const Connection&) = delete;
     Connection& operator=(const Connection&) = delete;
 
-    bool open(const std::string& path, bool readOnly);
+    enum class Access {
+        write,
+        read,
+        /// Where nobody can write, and nothing waits beside it to be taken in.
+        readOfFixed
+    };
+    bool open(const std::string& path, Access access);
     /// Runs statements without rows.
     bool execute(const char* text);
     sqlite3* handle() const { return handle_; }

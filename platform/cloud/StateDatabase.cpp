@@ -54,7 +54,7 @@ StateDatabase::StateDatabase(std::unique_ptr<Handles> handles) : StateQueries(st
 
 Result<std::unique_ptr<StateDatabase>> StateDatabase::open(const std::string& path, bool thorough) {
     auto handles = std::make_unique<Handles>();
-    if (!handles->connection.open(path, false))
+    if (!handles->connection.open(path, sqlite::Connection::Access::write))
         return *handles->connection.takeFault();
     std::unique_ptr<StateDatabase> database(new StateDatabase(std::move(handles)));
     if (Failure failure = database->prepareSchema(thorough))

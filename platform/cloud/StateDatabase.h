@@ -39,8 +39,11 @@ public:
     std::optional<ItemId> localItemAt(const Place& place);
     std::optional<ItemId> remoteItemAt(const Place& place);
     std::optional<ItemId> itemOfRemoteId(std::string_view remoteId);
-    /// Everything that was seen on the disk.
+    /// Everything that was seen on the disk; in one folder of it; with that identity (promises
+    /// have none of their own).
     std::vector<ItemState> localItems();
+    std::vector<ItemState> localItemsIn(ItemId folder);
+    std::vector<ItemState> localItemsOf(const FileIdentity& identity);
     /// What as many whole listings of its folder in a row have not seen.
     std::vector<ItemId> missingFromRemote(int listings);
     /// The item and what is in it on that side.

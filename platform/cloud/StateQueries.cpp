@@ -2,6 +2,8 @@
 #include "platform/cloud/StateHandles.h"
 
 #include <algorithm>
+#include <charconv>
+#include <unistd.h>
 
 namespace platform {
 namespace {
@@ -270,6 +272,21 @@ std::vector<ItemState> StateQueries::localItems() {
     return readStates(handles_->prepared(STATE_COLUMNS "WHERE l.item IS NOT NULL").with());
 }
 
+std::vector<ItemState> StateQueries::localItemsIn(ItemId folder) {
+    return readStates(handles_
+                          ->prepared(STATE_COLUMNS
+                                     "WHERE i.id IN (SELECT item FROM local WHERE parent = ?1)")
+                          .with(folder));
+}
+
+std::vector<ItemState> StateQueries::localItemsOf(const FileIdentity& identity) {
+    return readStates(
+        handles_
+            ->prepared(STATE_COLUMNS "WHERE i.id IN (SELECT item FROM local WHERE ino = ?1"
+                                     " AND dev = ?2 AND btime = ?3 AND promise = 0)")
+            .with(identity.inode, identity.device, identity.birthNanoseconds));
+}
+
 std::optional<std::string> StateQueries::localPathOf(ItemId item) {
     return pathUpwards(handles_->prepared("SELECT parent, name FROM local WHERE item = ?1"), item);
 }
@@ -364,11 +381,22 @@ std::string StateQueries::meta(std::string_view name) {
 class StateReader::Queries final : public StateQueries {
 public:
     explicit Queries(std::unique_ptr<Handles> handles) : StateQueries(std::move(handles)) {}
-    static Result<std::unique_ptr<StateQueries>> open(const std::string& path) {
+
+    /// An error also when it is none of this version's.
+    static Result<std::unique_ptr<StateQueries>> open(const std::string& path,
+                                                      sqlite::Connection::Access access) {
         auto handles = std::make_unique<Handles>();
-        if (!handles->connection.open(path, true))
+        if (!handles->connection.open(path, access))
             return *handles->connection.takeFault();
-        return std::unique_ptr<StateQueries>(std::make_unique<Queries>(std::move(handles)));
+        auto queries = std::make_unique<Queries>(std::move(handles));
+        const std::string schema = queries->meta("schema");
+        if (schema.empty())
+            return queries->takeFault().value_or(makeError(ErrorCode::databaseUnusable));
+        int version = 0;
+        std::from_chars(schema.data(), schema.data() + schema.size(), version);
+        if (version > stateSchemaVersion)
+            return makeError(ErrorCode::databaseFromLaterVersion);
+        return std::unique_ptr<StateQueries>(std::move(queries));
     }
 };
 
@@ -376,13 +404,17 @@ StateReader::StateReader() = default;
 StateReader::~StateReader() = default;
 
 Result<std::shared_ptr<StateReader>> StateReader::open(const std::string& path) {
-    Result<std::unique_ptr<StateQueries>> queries = Queries::open(path);
+    using Access = sqlite::Connection::Access;
+    Result<std::unique_ptr<StateQueries>> queries = Queries::open(path, Access::read);
+    // On a disk that takes no changes there can be no lock and no index beside the database.
+    if (!queries && !queries.error().is(ErrorCode::databaseFromLaterVersion) &&
+        ::access(path.c_str(), R_OK) == 0 && ::access(path.c_str(), W_OK) != 0 &&
+        ::access((path + "-wal").c_str(), F_OK) != 0)
+        queries = Queries::open(path, Access::readOfFixed);
     if (!queries)
         return queries.error();
     std::shared_ptr<StateReader> reader(new StateReader());
     reader->queries_ = std::move(*queries);
-    if ((*reader->queries_).meta("schema").empty())
-        return reader->queries_->takeFault().value_or(makeError(ErrorCode::databaseUnusable));
     return reader;
 }
 

@@ -253,7 +253,7 @@ bool StoreEngine::isListed() const {
 std::optional<std::string> StoreEngine::problem() const {
     const std::lock_guard lock(mutex_);
     if (problem_)
-        return problem_;
+        return problem_->localizedDescription;
     if (question_)
         return textOf(*question_);
     return notice_;
@@ -271,7 +271,7 @@ void StoreEngine::setProblem(const Failure& failure) {
         store_->lock.keepCrashMark();
     {
         const std::lock_guard lock(mutex_);
-        problem_ = failure ? failure->localizedDescription : std::nullopt;
+        problem_ = failure;
     }
     services_.conditionChanged();
 }
@@ -282,8 +282,9 @@ std::shared_ptr<Transfers> StoreEngine::transfers() const {
 }
 
 Error StoreEngine::notOpen() const {
-    return makeErrorWithText(ErrorCode::itemBusy,
-                             problem().value_or(localized("The store cannot be changed now.")));
+    const std::lock_guard lock(mutex_);
+    return problem_.value_or(makeErrorWithText(
+        ErrorCode::itemBusy, localized("The store cannot be changed now.")));
 }
 
 void StoreEngine::retryLater(std::function<void(StoreEngine&)> job) {

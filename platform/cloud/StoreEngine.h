@@ -123,7 +123,11 @@ private:
     /// What is being written to is waited for, so many times.
     void syncNow(Done done, int times);
     void plan(const Synchronizer::Report& report);
-    void watchFolders(const std::vector<std::string>& folders);
+    void watchFolders(const std::vector<std::string>& folders, bool all);
+    /// Something happened in the folder of the disk. From any thread.
+    void noticed(const std::string& folder);
+    /// What is watched there, or below it, may have another path now.
+    void rewatch(const std::string& folder);
     void watchRemote();
 
     // On the listing queue.
@@ -158,8 +162,8 @@ private:
     std::optional<DeletionQuestion> question_;
     std::optional<Synchronizer::Request> wanted_;
     std::map<Alarm, Pending> alarms_;
-    Date nextLook_; // because of a notice
-    std::optional<std::string> problem_;
+    Duration nextLook_{0}; // because of a notice
+    Failure problem_;
     std::optional<std::string> notice_; // what had to be done at the start
     std::shared_ptr<Transfers> transfers_;
     Clock::AlarmId retry_ = 0;

@@ -9,7 +9,9 @@
 namespace platform {
 namespace {
 
-/// After a look the engine rests for so many times as long as it took, at most so long.
+/// After a look because of a notice the engine rests for so many times as long as it took, at most
+/// so long: in a folder of a hundred thousand files one that is written to all the time would
+/// otherwise keep the processor busy.
 constexpr std::int64_t restFactor = 2;
 constexpr Duration longestRest = std::chrono::seconds(10);
 
@@ -25,6 +27,20 @@ void merge(Synchronizer::Request& into, const Synchronizer::Request& other) {
     for (const ItemId folder : other.folders)
         if (std::find(into.folders.begin(), into.folders.end(), folder) == into.folders.end())
             into.folders.push_back(folder);
+}
+
+/// What a command says that has waited long enough.
+Error stillChanging(const std::string& file) {
+    if (file.empty())
+        return makeErrorWithText(
+            ErrorCode::changedWhileRead,
+            localized("Documents are being changed without a pause. What is new will be on your "
+                      "account some moments after that has ended."));
+    return makeErrorWithText(
+        ErrorCode::changedWhileRead,
+        localizedFormat("“%1$@” is being written to without a pause. It will be on your account "
+                        "some moments after that has ended.",
+                        file));
 }
 
 } // namespace
@@ -57,10 +73,8 @@ void StoreEngine::wantAfter(Alarm alarm, Duration delay, const Synchronizer::Req
         merge(pending.request, wanted);
         return;
     }
-    if (alarm == Alarm::notice) // of a file that is written to all the time there is no end
-        delay = std::clamp<Duration>(
-            Duration(nextLook_.nanoseconds - services_.clock.now().nanoseconds), delay,
-            longestRest);
+    if (alarm == Alarm::notice)
+        delay = std::clamp<Duration>(nextLook_ - services_.clock.monotonic(), delay, longestRest);
     services_.clock.cancelAlarm(pending.id);
     pending.request = wanted;
     pending.id = services_.clock.setAlarm(delay, [weak = weak_from_this(), alarm] {
@@ -98,12 +112,10 @@ Synchronizer::Report StoreEngine::synchronize(const Synchronizer::Request& reque
         closed.failure = notOpen();
         return closed;
     }
-    const Date begun = services_.clock.now();
     const Synchronizer::Report report = synchronizer->run(request);
-    if (request.lookAtDisk) {
-        const Date ended = services_.clock.now();
+    if (!report.allFolders) {
         const std::lock_guard lock(mutex_);
-        nextLook_ = Date{ended.nanoseconds + (ended.nanoseconds - begun.nanoseconds) * restFactor};
+        nextLook_ = services_.clock.monotonic() + report.looked * restFactor;
     }
     if (report.failure && report.failure->is(ErrorCode::serverNotAvailable)) {
         connected_ = false;
@@ -135,9 +147,9 @@ void StoreEngine::plan(const Synchronizer::Report& report) {
     if (news)
         services_.conditionChanged();
     if (!report.folders.empty())
-        watchFolders(report.folders);
+        watchFolders(report.folders, report.allFolders);
     watchRemote();
-    const Synchronizer::Request disk{false, true, {}, false, false};
+    const Synchronizer::Request disk{false, false, {}, false, false};
     if (report.settlesIn)
         wantAfter(Alarm::settle, *report.settlesIn, disk);
     if (report.secondLook)
@@ -155,28 +167,40 @@ void StoreEngine::plan(const Synchronizer::Report& report) {
         retryLater([](StoreEngine& engine) { engine.want({false, true, {}, true, false}); });
 }
 
-void StoreEngine::watchFolders(const std::vector<std::string>& folders) {
-    std::map<std::string, DirectoryWatcher::Token> watches;
-    bool fresh = false;
+void StoreEngine::noticed(const std::string& folder) {
+    if (const std::shared_ptr<Synchronizer> synchronizer = this->synchronizer())
+        synchronizer->changedOnDisk(folder);
+    wantAfter(Alarm::notice, noticeDelay, {false, false, {}, false, false});
+}
+
+void StoreEngine::rewatch(const std::string& folder) {
+    std::erase_if(localWatches_, [&](const auto& watch) {
+        return folder.empty() || watch.first == folder || watch.first.starts_with(folder + '/');
+    });
+    noticed(folder);
+}
+
+void StoreEngine::watchFolders(const std::vector<std::string>& folders, bool all) {
+    std::map<std::string, DirectoryWatcher::Token> before = std::exchange(localWatches_, {});
+    if (!all)
+        localWatches_.swap(before);
     for (const std::string& folder : folders) {
-        DirectoryWatcher::Token& token = watches[folder];
-        if (const auto found = localWatches_.find(folder); found != localWatches_.end())
+        DirectoryWatcher::Token& token = localWatches_[folder];
+        if (const auto found = before.find(folder); found != before.end())
             token = std::move(found->second);
         if (token)
             continue;
-        fresh = true;
         token = services_.watcher.watch(
             Url::file(layout_.root() + (folder.empty() ? "" : "/" + folder), true), *queue_,
             [this, folder](const std::vector<DirectoryChange>& changes) {
                 for (const DirectoryChange& change : changes)
                     if (change.kind == DirectoryChange::Kind::folderGone)
-                        listing_->async([this, folder] { localWatches_.erase(folder); });
-                wantAfter(Alarm::notice, noticeDelay, {false, true, {}, false, false});
+                        listing_->async([this, folder] { rewatch(folder); });
+                noticed(folder);
             });
+        if (token) // what came between the look and the watch
+            noticed(folder);
     }
-    localWatches_ = std::move(watches);
-    if (fresh) // what came between the look and the watch
-        wantAfter(Alarm::notice, noticeDelay, {false, true, {}, false, false});
 }
 
 void StoreEngine::watchRemote() {
@@ -216,10 +240,12 @@ void StoreEngine::syncNow(Done done, int times) {
         queue_->sync([] {}); // an opening that is under way comes first
         Failure failure = transfers() ? followRemote() : Failure(notOpen());
         std::optional<Duration> settlesIn;
+        std::string youngFile;
         if (transfers() && (!failure || !concernsWholeStore(*failure))) {
             const Synchronizer::Report report = synchronize({true, true, {}, true, false});
-            failure = report.failure;
+            failure = report.failure ? report.failure : report.unreadable;
             settlesIn = report.question ? std::nullopt : report.settlesIn;
+            youngFile = report.youngFile;
         }
         if (transfers() && (!failure || concernsWholeStore(*failure)))
             setProblem(failure);
@@ -231,7 +257,7 @@ void StoreEngine::syncNow(Done done, int times) {
                     done(makeError(ErrorCode::userCancelled));
             });
         } else if (done) {
-            done(failure);
+            done(failure || !settlesIn ? failure : stillChanging(youngFile));
         }
     });
 }

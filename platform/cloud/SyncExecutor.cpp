@@ -176,7 +176,27 @@ Failure SyncExecutor::make(Work& work, CancelFlag& cancel) {
     return std::nullopt;
 }
 
+/// Where on the disk the step finds something else than the records told.
+std::set<std::string> SyncExecutor::foldersOf(const Work& work) {
+    std::set<std::string> folders;
+    if (!work.localPath.empty()) {
+        const std::size_t slash = work.localPath.rfind('/');
+        folders.insert(slash == std::string::npos ? "" : work.localPath.substr(0, slash));
+        if (work.state.item.kind == ItemKind::folder)
+            folders.insert(work.localPath);
+    }
+    if (work.step.to.parent != 0)
+        context_.queue.sync([&] {
+            if (const auto to = context_.database.localPathOf(work.step.to.parent))
+                folders.insert(*to);
+        });
+    return folders;
+}
+
 void SyncExecutor::note(const Work& work, const Failure& failure) {
+    std::set<std::string> disturbed;
+    if (failure && (failure->is(ErrorCode::changedWhileRead) || meansOutdated(*failure)))
+        disturbed = foldersOf(work);
     const std::lock_guard lock(mutex_);
     if (!failure) {
         outcome_.done += work.leftOut ? 0 : 1;
@@ -187,10 +207,8 @@ void SyncExecutor::note(const Work& work, const Failure& failure) {
             outcome_.stopped = failure;
         return;
     }
-    if (failure->is(ErrorCode::changedWhileRead))
-        outcome_.diskChanged = true;
+    outcome_.disturbed.merge(disturbed);
     if (meansOutdated(*failure)) {
-        outcome_.diskChanged = true;
         if (work.state.remote)
             outcome_.outdated.insert(work.state.remote->place.parent);
         if (work.state.item.kind == ItemKind::folder && work.state.remote)

@@ -27,10 +27,11 @@ public:
         std::size_t done = 0;
         /// The remote has something else in these folders than was known.
         std::set<ItemId> outdated;
-        /// The disk has.
-        bool diskChanged = false;
+        /// The disk has, in these (relative to the store's root).
+        std::set<std::string> disturbed;
         /// A file is still being written to; when that may be over.
         std::optional<Duration> settlesIn;
+        std::string youngFile;
         /// Why nothing more can be done at all: the remote is away, or somebody cancelled.
         Failure stopped;
         std::map<ItemId, Error> failed;
@@ -62,6 +63,7 @@ private:
     std::optional<Work> prepare(const SyncStep& step);
     Failure make(Work& work, CancelFlag& cancel);
     void note(const Work& work, const Failure& failure);
+    std::set<std::string> foldersOf(const Work& work);
     static Failure leaveOut(Work& work) {
         work.leftOut = true;
         return std::nullopt;
@@ -103,6 +105,7 @@ private:
     // Contents that come; see SyncExecutorContents.cpp.
     Failure download(const Work& work, CancelFlag& cancel);
     Failure reconcile(const Work& work, CancelFlag& cancel);
+    Failure takeVersion(const Work& work, const Staged& staged);
     Result<Staged> stage(const Work& work, CancelFlag& cancel);
     Failure replace(const Work& work, const Staged& staged);
     Failure replaceNow(const Work& work, const Staged& staged);

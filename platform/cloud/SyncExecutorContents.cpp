@@ -100,24 +100,28 @@ Failure SyncExecutor::download(const Work& work, CancelFlag& cancel) {
     const Result<Staged> staged = stage(work, cancel);
     if (!staged)
         return staged.error();
-    if (!isChangedHere(work.state) && staged->hash == work.state.base->hash) {
-        // Another version of the same content.
-        discard(*staged);
-        BaseRow base = *work.state.base;
-        base.etag = staged->version.etag;
-        base.place = work.state.remote->place;
-        Failure failure;
-        context_.queue.sync([&] {
-            failure = context_.database.transaction([&]() -> Failure {
-                context_.database.putRemote(
-                    work.step.item, rowOf(work.state.remote->place, staged->version, work.state));
-                return std::nullopt;
-            });
-        });
-        agreeLater(work.step.item, std::move(base));
-        return failure;
-    }
+    if (!isChangedHere(work.state) && staged->hash == work.state.base->hash)
+        return takeVersion(work, *staged);
     return replace(work, *staged);
+}
+
+/// Another version of the content that was agreed on: other rights, or another date.
+Failure SyncExecutor::takeVersion(const Work& work, const Staged& staged) {
+    discard(staged);
+    BaseRow base = *work.state.base;
+    base.etag = staged.version.etag;
+    base.place = work.state.remote->place;
+    Failure failure;
+    context_.queue.sync([&] {
+        failure = context_.database.transaction([&]() -> Failure {
+            context_.database.putRemote(
+                work.step.item, rowOf(work.state.remote->place, staged.version, work.state));
+            return std::nullopt;
+        });
+    });
+    if (!failure)
+        agreeLater(work.step.item, std::move(base));
+    return failure;
 }
 
 Failure SyncExecutor::reconcile(const Work& work, CancelFlag& cancel) {
@@ -130,6 +134,8 @@ Failure SyncExecutor::reconcile(const Work& work, CancelFlag& cancel) {
     const Result<Staged> theirs = stage(work, cancel);
     if (!theirs)
         return theirs.error();
+    if (work.state.base && theirs->hash == work.state.base->hash)
+        return takeVersion(work, *theirs); // only ours is new
     if (theirs->hash != ours->hash)
         return keepBoth(work, *theirs);
     discard(*theirs);

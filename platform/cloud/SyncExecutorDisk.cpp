@@ -13,10 +13,6 @@
 namespace platform {
 namespace {
 
-std::string joined(const std::string& folder, const std::string& name) {
-    return folder.empty() ? name : folder + '/' + name;
-}
-
 /// Whoever wrote the row saw this content, wherever it lies now.
 bool isContentOf(const LocalRow& row, const FileAttributes& attributes) {
     return attributes.kind == FileKind::file && attributes.identity == row.identity &&
@@ -89,7 +85,7 @@ Failure SyncExecutor::moveHere(Work& work) {
     });
     if (!folder)
         return leaveOut(work);
-    return moveOnDisk(work.localPath, joined(*folder, work.step.to.name));
+    return moveOnDisk(work.localPath, joinedPath(*folder, work.step.to.name));
 }
 
 Failure SyncExecutor::moveAside(const Work& work, std::string& place,
@@ -101,7 +97,7 @@ Failure SyncExecutor::moveAside(const Work& work, std::string& place,
     for (int number = 1; number <= namesAside; ++number) {
         const std::string name = conflictName(nameOf(work.localPath), work.state.item.kind,
                                               context_.clock.now(), deviceName(), number);
-        place = joined(folder, name);
+        place = joinedPath(folder, name);
         if (context_.disk.attributes(context_.pathOf(place)))
             continue;
         if (Failure noting = before(name))

@@ -120,6 +120,12 @@ Failure SyncExecutor::send(Work& work, const std::string& path, const Place& pla
     const Result<FileAttributes> before = (*file)->attributes();
     if (!before)
         return before.error();
+    if (isYoung(before->modified, context_.clock.now())) {
+        const std::lock_guard lock(mutex_);
+        outcome_.settlesIn = settleTimeOf(before->modified);
+        outcome_.youngFile = work.localPath;
+        return leaveOut(work);
+    }
     if (!sameContentAs(*before, FileAttributes{FileKind::file,
                                                work.state.local->size,
                                                {},
@@ -129,11 +135,6 @@ Failure SyncExecutor::send(Work& work, const std::string& path, const Place& pla
                                                1,
                                                0}))
         return changed;
-    if (isYoung(before->modified, context_.clock.now())) {
-        const std::lock_guard lock(mutex_);
-        outcome_.settlesIn = settleTimeOf(before->modified);
-        return leaveOut(work);
-    }
     ContentHash hash;
     std::uint64_t hashed = 0;
     const auto same = [&] {

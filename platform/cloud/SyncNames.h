@@ -21,7 +21,7 @@ inline constexpr std::size_t longestItemName = 255;
 /// takes.
 std::string conflictName(std::string_view name, ItemKind kind, Date date, std::string_view host,
                          int number = 1);
-/// How many of them are tried.
+/// How many names are tried for what has to leave its own to another.
 inline constexpr int namesAside = 100;
 /// This machine, as conflict names tell it.
 std::string deviceName();

@@ -14,6 +14,9 @@ struct DeletionQuestion {
     /// Where it vanished.
     Side side = Side::local;
     std::int64_t items = 0;
+    /// Of them, those that nobody can bring back: they vanished from the account, and of their
+    /// contents nothing is on the device.
+    std::int64_t lost = 0;
     bool operator==(const DeletionQuestion&) const = default;
 };
 /// For people: what has vanished where, and that nothing follows from it before they say so.

@@ -53,8 +53,8 @@ Synchronizer::Report Synchronizer::run(const Request& request) {
             trouble.nextAt = {};
         }
     }
-    if (request.lookAtDisk || afterCrash_)
-        report.failure = look(report);
+    if (DirtyFolders::Marks marks = marksOf(request); !marks.empty())
+        report.failure = look(std::move(marks), report);
     if (!report.failure && !report.question)
         report.failure = list(request.folders, request.everything, report);
     if (!report.failure && !report.question)
@@ -74,24 +74,64 @@ Synchronizer::Report Synchronizer::run(const Request& request) {
     return report;
 }
 
-Failure Synchronizer::look(Report& report) {
-    for (int attempt = 1;; ++attempt) {
+DirtyFolders::Marks Synchronizer::marksOf(const Request& request) {
+    DirtyFolders::Marks marks = dirty_.take();
+    bool asked = false;
+    context_.queue.sync([&] {
+        const std::optional<DeletionQuestion> open = question(context_.database);
+        asked = open && open->side == Side::local; // what is back again is asked about no longer
+    });
+    marks.everything = marks.everything || request.lookAtDisk || !lookedAtAll_ || afterCrash_ ||
+                       (asked && !marks.folders.empty()) || isVanishingDue();
+    return marks;
+}
+
+Failure Synchronizer::look(DirtyFolders::Marks marks, Report& report) {
+    const Duration begun = context_.clock.monotonic();
+    Failure failure;
+    bool settled = false;
+    for (int attempt = 1; !failure && !settled; ++attempt) {
         LocalScanner scanner(context_, cancel_);
-        if (Failure failure = scanner.run())
-            return failure;
-        if (scanner.again() && attempt < looksAtOnce)
+        failure = marks.everything ? scanner.lookAtAll() : scanner.lookAt(marks.folders);
+        if (failure || (scanner.again() && attempt < looksAtOnce)) {
+            marks.everything = marks.everything || scanner.wantsAll();
             continue;
-        report.folders = scanner.folders();
-        report.settle(scanner.settlesIn());
-        if (scanner.again()) {
-            report.settle(settleTime);
-            return std::nullopt;
         }
-        if (afterCrash_)
-            if (Failure failure = noteDamage())
-                return failure;
-        return settleLocal(scanner.vanished(), report);
+        settled = true;
+        if (scanner.again()) { // it changes all the time
+            dirty_.add(marks);
+            report.settle(settleTime);
+        }
+        failure = settleLook(scanner, marks.everything, report);
     }
+    if (failure)
+        dirty_.add(marks);
+    report.looked += context_.clock.monotonic() - begun;
+    return failure;
+}
+
+Failure Synchronizer::settleLook(const LocalScanner& scanner, bool whole, Report& report) {
+    report.folders.insert(report.folders.end(), scanner.folders().begin(),
+                          scanner.folders().end());
+    report.allFolders = report.allFolders || whole;
+    report.settle(scanner.settlesIn(), scanner.youngFile());
+    if (scanner.unreadable())
+        report.unreadable = scanner.unreadable();
+    for (const std::string& folder : scanner.unsettled())
+        dirty_.add(folder);
+    if (scanner.again())
+        return std::nullopt;
+    if (!whole) {
+        std::erase_if(vanishing_[Side::local].items,
+                      [&](ItemId item) { return scanner.saw(item); });
+        noteVanished(scanner.vanished(), report);
+        return std::nullopt;
+    }
+    lookedAtAll_ = true;
+    if (afterCrash_)
+        if (Failure failure = noteDamage())
+            return failure;
+    return settleLocal(scanner.vanished(), report);
 }
 
 Failure Synchronizer::list(const std::vector<ItemId>& folders, bool everything, Report& report) {
@@ -219,7 +259,7 @@ void Synchronizer::forgetRepaired() {
 
 Failure Synchronizer::digest(SyncExecutor::Outcome& outcome, const std::vector<SyncStep>& steps,
                              Report& report) {
-    report.settle(outcome.settlesIn);
+    report.settle(outcome.settlesIn, outcome.youngFile);
     for (const SyncStep& step : steps)
         if (const auto failed = outcome.failed.find(step.item); failed != outcome.failed.end())
             noteTrouble(step, failed->second);
@@ -227,8 +267,8 @@ Failure Synchronizer::digest(SyncExecutor::Outcome& outcome, const std::vector<S
             forgetTrouble(step.item);
     if (outcome.stopped)
         return outcome.stopped;
-    if (outcome.diskChanged)
-        if (Failure failure = look(report))
+    if (!outcome.disturbed.empty())
+        if (Failure failure = look({false, outcome.disturbed}, report))
             return failure;
     if (report.question)
         return std::nullopt;

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "platform/cloud/Backoff.h"
+#include "platform/cloud/DirtyFolders.h"
 #include "platform/cloud/RemoteLister.h"
 #include "platform/cloud/SyncExecutor.h"
 #include "platform/cloud/SyncState.h"
@@ -13,6 +14,8 @@
 
 namespace platform {
 
+class LocalScanner;
+
 /// Makes both sides of a store agree, as far as that goes now: looks at the disk, asks the remote,
 /// and plans and carries out until nothing is left to do. One run at a time, not on the store's
 /// queue.
@@ -22,6 +25,7 @@ public:
         /// By the user's command, or because the way to the remote has changed: everything is
         /// tried now, and looked for a second time without a delay.
         bool commanded = false;
+        /// At all of it; else at the folders that were marked since.
         bool lookAtDisk = true;
         /// Folders of the remote to be read; all of them when `everything`.
         std::vector<ItemId> folders;
@@ -33,20 +37,31 @@ public:
         Failure failure;
         /// Files are being written to: look again after that time.
         std::optional<Duration> settlesIn;
+        /// One of them, relative to the store's root; "" when it is others that change.
+        std::string youngFile;
         /// Something is missing on the remote since one listing.
         bool secondLook = false;
         /// When something that failed is to be tried again.
         std::optional<Date> retryAt;
         std::optional<DeletionQuestion> question;
-        /// Of the disk, relative to the store's root; empty when it was not looked at.
+        /// Of the disk, relative to the store's root, as far as it was looked at: to be watched.
         std::vector<std::string> folders;
+        /// These are all that there are.
+        bool allFolders = false;
+        /// How long the looks at the disk took.
+        Duration looked{0};
         std::size_t changes = 0;
         /// Folders of the remote could not be read: of those nothing is known, all else goes on.
         Failure incomplete;
+        /// The same of a folder of the disk. Nothing is tried again because of it: a notice tells
+        /// when it can be read.
+        Failure unreadable;
 
-        void settle(std::optional<Duration> delay) {
+        void settle(std::optional<Duration> delay, const std::string& file = {}) {
             if (delay && (!settlesIn || *settlesIn < *delay))
                 settlesIn = delay;
+            if (!file.empty())
+                youngFile = file;
         }
     };
 
@@ -54,6 +69,9 @@ public:
                  CancelFlag& cancel, bool afterCrash, RemoteLister::Written written);
 
     Report run(const Request& request);
+    /// Something happened in the folder of the disk (relative to the store's root): the next run
+    /// looks at it. From any thread.
+    void changedOnDisk(const std::string& folder) { dirty_.add(folder); }
     /// Ends a run soon, and those that come. From any thread.
     void cancel() { executor_.cancel(); }
     /// On the store's queue.
@@ -70,7 +88,12 @@ private:
         Date nextAt;
     };
 
-    Failure look(Report& report);
+    /// What has to be looked at now.
+    DirtyFolders::Marks marksOf(const Request& request);
+    Failure look(DirtyFolders::Marks marks, Report& report);
+    Failure settleLook(const LocalScanner& scanner, bool whole, Report& report);
+    void noteVanished(const std::vector<ItemId>& vanished, Report& report);
+    bool isVanishingDue();
     Failure list(const std::vector<ItemId>& folders, bool everything, Report& report);
     /// What vanished counts as deleted, unless it is too much.
     Failure settleLocal(const std::vector<ItemId>& vanished, Report& report);
@@ -106,6 +129,8 @@ private:
         Duration since{0};
     };
     std::map<Side, Vanishing> vanishing_;
+    DirtyFolders dirty_;
+    bool lookedAtAll_ = false; // since the start
     bool afterCrash_ = false;                // and not looked for damage yet
     std::map<ItemId, std::int64_t> damaged_; // with the operation that tells of it
 };

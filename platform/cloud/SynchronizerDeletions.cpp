@@ -28,12 +28,18 @@ std::string_view nameOf(Side side) {
 }
 
 std::string recordOf(const DeletionQuestion& question) {
-    return std::string(nameOf(question.side)) + ' ' + std::to_string(question.items);
+    return std::string(nameOf(question.side)) + ' ' + std::to_string(question.items) + ' ' +
+           std::to_string(question.lost);
 }
 
 } // namespace
 
 std::string textOf(const DeletionQuestion& question) {
+    if (question.lost > 0)
+        return localizedFormat(
+            "%1$@ items have vanished from your account. Nothing is deleted on this device until "
+            "you say so. %2$@ of them have no copy on this device and cannot be brought back.",
+            std::to_string(question.items), std::to_string(question.lost));
     return localizedFormat(question.side == Side::local
                                ? "%1$@ items have vanished from this device. Nothing is deleted on "
                                  "your account until you say so."
@@ -47,8 +53,11 @@ std::optional<DeletionQuestion> Synchronizer::question(StateQueries& queries) {
     const std::size_t blank = text.find(' ');
     if (blank == std::string::npos)
         return std::nullopt;
-    DeletionQuestion question{text.starts_with("local") ? Side::local : Side::remote, 0};
-    std::from_chars(text.data() + blank + 1, text.data() + text.size(), question.items);
+    DeletionQuestion question{text.starts_with("local") ? Side::local : Side::remote, 0, 0};
+    const char* const end = text.data() + text.size();
+    const auto items = std::from_chars(text.data() + blank + 1, end, question.items);
+    if (items.ptr != end)
+        std::from_chars(items.ptr + 1, end, question.lost);
     return question;
 }
 
@@ -106,6 +115,24 @@ bool Synchronizer::isSteady(Side side, const std::vector<ItemId>& vanished, Repo
     }
     report.settle(left);
     return false;
+}
+
+/// A look at some folders misses them. Whether they are anywhere, a look at all tells once nothing
+/// more vanishes.
+void Synchronizer::noteVanished(const std::vector<ItemId>& vanished, Report& report) {
+    if (vanished.empty())
+        return;
+    Vanishing& before = vanishing_[Side::local];
+    for (const ItemId item : vanished)
+        if (before.items.insert(item).second)
+            before.since = context_.clock.monotonic();
+    report.settle(secondLookDelay);
+}
+
+bool Synchronizer::isVanishingDue() {
+    const Vanishing& vanishing = vanishing_[Side::local];
+    return !vanishing.items.empty() &&
+           context_.clock.monotonic() - vanishing.since >= secondLookDelay;
 }
 
 bool Synchronizer::isAlarming(const std::vector<ItemId>& items, Side side) {
@@ -171,7 +198,8 @@ Failure Synchronizer::settleLocal(const std::vector<ItemId>& vanished, Report& r
             return;
         }
         if (isAlarming(vanished, Side::local)) {
-            failure = ask({Side::local, static_cast<std::int64_t>(vanished.size())}, report);
+            vanishing_.erase(Side::local); // the question waits; the looks need not
+            failure = ask({Side::local, static_cast<std::int64_t>(vanished.size()), 0}, report);
             return;
         }
         const bool answered = isAnswered(Side::local);
@@ -229,7 +257,12 @@ Failure Synchronizer::settleRemote(bool commanded, Report& report) {
             return;
         const std::vector<ItemId> items(gone.begin(), gone.end());
         if (isAlarming(items, Side::remote)) {
-            failure = ask({Side::remote, static_cast<std::int64_t>(items.size())}, report);
+            const auto lost = std::count_if(items.begin(), items.end(), [&](ItemId item) {
+                const std::optional<ItemState> state = database.state(item);
+                return state && state->item.kind == ItemKind::file &&
+                       (!state->local || state->local->promise);
+            });
+            failure = ask({Side::remote, static_cast<std::int64_t>(items.size()), lost}, report);
             return;
         }
         const bool answered = isAnswered(Side::remote);

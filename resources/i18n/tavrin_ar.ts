@@ -880,6 +880,18 @@
         <translation>عدد العناصر التي اختفت من حسابك: %1$@. لن يُحذف شيء من هذا الجهاز حتى تقرّر ذلك.</translation>
     </message>
     <message>
+        <source>“%1$@” is being written to without a pause. It will be on your account some moments after that has ended.</source>
+        <translation>تجري الكتابة في «&#x2068;%1$@&#x2069;» دون توقّف. سيصل المستند إلى حسابك بعد لحظات من انتهاء ذلك.</translation>
+    </message>
+    <message>
+        <source>Documents are being changed without a pause. What is new will be on your account some moments after that has ended.</source>
+        <translation>تتغيّر المستندات دون توقّف. سيصل الجديد إلى حسابك بعد لحظات من انتهاء ذلك.</translation>
+    </message>
+    <message>
+        <source>%1$@ items have vanished from your account. Nothing is deleted on this device until you say so. %2$@ of them have no copy on this device and cannot be brought back.</source>
+        <translation>عدد العناصر التي اختفت من حسابك: %1$@. لن يُحذف شيء من هذا الجهاز حتى تقرّر ذلك. عدد ما ليست له منها نسخة على هذا الجهاز ولا يمكن استرجاعه: %2$@.</translation>
+    </message>
+    <message>
         <source>The folder “%1$@” is not there. Connect its disk; nothing was changed.</source>
         <translation>المجلد «%1$@» غير موجود. صِل قرصه؛ لم يتغيّر شيء.</translation>
     </message>

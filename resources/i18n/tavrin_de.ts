@@ -852,6 +852,18 @@
         <translation>%1$@ Objekte sind aus Ihrem Konto verschwunden. Auf diesem Gerät wird nichts gelöscht, bis Sie es sagen.</translation>
     </message>
     <message>
+        <source>“%1$@” is being written to without a pause. It will be on your account some moments after that has ended.</source>
+        <translation>„%1$@“ wird ununterbrochen beschrieben. Das Dokument ist im Konto, kurz nachdem das geendet hat.</translation>
+    </message>
+    <message>
+        <source>Documents are being changed without a pause. What is new will be on your account some moments after that has ended.</source>
+        <translation>Dokumente werden ununterbrochen geändert. Was neu ist, ist im Konto, kurz nachdem das geendet hat.</translation>
+    </message>
+    <message>
+        <source>%1$@ items have vanished from your account. Nothing is deleted on this device until you say so. %2$@ of them have no copy on this device and cannot be brought back.</source>
+        <translation>%1$@ Objekte sind aus Ihrem Konto verschwunden. Auf diesem Gerät wird nichts gelöscht, bis Sie es sagen. %2$@ davon haben keine Kopie auf diesem Gerät und können nicht zurückgebracht werden.</translation>
+    </message>
+    <message>
         <source>The folder “%1$@” is not there. Connect its disk; nothing was changed.</source>
         <translation>Der Ordner „%1$@“ ist nicht da. Schließen Sie seinen Datenträger an; es wurde nichts geändert.</translation>
     </message>

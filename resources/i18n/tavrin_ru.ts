@@ -859,6 +859,18 @@
         <translation>Объектов, пропавших из вашей учётной записи: %1$@. На этом устройстве ничего не будет удалено без вашего указания.</translation>
     </message>
     <message>
+        <source>“%1$@” is being written to without a pause. It will be on your account some moments after that has ended.</source>
+        <translation>В «%1$@» непрерывно ведётся запись. Документ появится в учётной записи вскоре после её окончания.</translation>
+    </message>
+    <message>
+        <source>Documents are being changed without a pause. What is new will be on your account some moments after that has ended.</source>
+        <translation>Документы непрерывно меняются. Новое появится в учётной записи вскоре после окончания изменений.</translation>
+    </message>
+    <message>
+        <source>%1$@ items have vanished from your account. Nothing is deleted on this device until you say so. %2$@ of them have no copy on this device and cannot be brought back.</source>
+        <translation>Объектов, пропавших из вашей учётной записи: %1$@. На этом устройстве ничего не будет удалено без вашего указания. Из них не имеют копии на этом устройстве и не могут быть возвращены: %2$@.</translation>
+    </message>
+    <message>
         <source>The folder “%1$@” is not there. Connect its disk; nothing was changed.</source>
         <translation>Папки «%1$@» нет на месте. Подключите её диск; ничего не было изменено.</translation>
     </message>

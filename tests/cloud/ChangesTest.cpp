@@ -150,6 +150,22 @@ TEST_F(Following, WhatChangesOnEitherSideArrivesOnTheOtherUnasked) {
     until([&] { return !isPromised("A/ours.txt"); });
 }
 
+TEST_F(Following, FoldersAreFollowedUnderTheirNewNamesAndInTheirOldOnes) {
+    givenRemote("A/in/one.txt", "1");
+    givenRemote("B/two.txt", "2");
+    givenStore();
+    ASSERT_EQ(FileManager::moveItem(url("A/in"), url("B/moved")), std::nullopt);
+    until([&] { return home.has("remote/B/moved/one.txt"); });
+    givenLocal("B/moved/new.txt", "new");
+    until([&] { return home.has("remote/B/moved/new.txt"); });
+    givenLocal("A/in/again/deep.txt", "deep");
+    until([&] { return home.has("remote/A/in/again/deep.txt"); });
+    givenLocal("A/in/again/deep.txt", "edited");
+    until([&] { return home.read("remote/A/in/again/deep.txt") == "edited"; });
+    ASSERT_EQ(FileManager::removeItem(url("B/moved/new.txt")), std::nullopt);
+    until([&] { return !home.has("remote/B/moved/new.txt"); });
+}
+
 TEST_F(Following, AQuestionStandsUntilItIsAnswered) {
     for (const char* name : {"A/1", "A/2", "A/3", "B/4"})
         givenRemote(name, name);

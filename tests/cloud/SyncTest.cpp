@@ -52,6 +52,19 @@ struct Sync : test::StoreFixture {
         disk = test::meddlingFileSystem(kind, std::move(act));
         ASSERT_EQ(open(), std::nullopt);
     }
+    /// Notices of these folders, and the runs that follow from them.
+    void noticed(const std::vector<std::string>& folders) {
+        for (const std::string& folder : folders)
+            synchronizer->changedOnDisk(folder);
+        for (int run = 0; run < 6; ++run) {
+            const Synchronizer::Report report = synchronizer->run({false, false, {}, false});
+            EXPECT_EQ(report.failure, std::nullopt);
+            if (!report.settlesIn)
+                return;
+            clock.advance(*report.settlesIn);
+        }
+        ADD_FAILURE() << "it never settles";
+    }
     std::size_t keptContents() const { return names(layout.kept()).size(); }
 };
 
@@ -67,6 +80,47 @@ TEST_F(Sync, WhatIsMadeHereArrivesThereAndTheOtherWayRound) {
     EXPECT_EQ(sync().changes, 0U) << "nothing is done twice";
 }
 
+TEST_F(Sync, ANoticeIsAReasonToLookAtItsFolderAndAtWhatIsNewInIt) {
+    givenSynced({"A/one", "B/two"});
+    givenLocal("A/one", "edited");
+    givenLocal("A/made/inner/deep", "deep");
+    givenLocal("B/new", "new");
+    noticed({"A"});
+    EXPECT_EQ(remoteContent("A/one"), "edited");
+    EXPECT_EQ(remoteContent("A/made/inner/deep"), "deep");
+    EXPECT_FALSE(remoteHas("B/new")) << "nobody looked there";
+    ASSERT_EQ(::symlink(layout.folder.c_str(), url("B/link").path().c_str()), 0);
+    noticed({"B/link/kept", "B/went"}); // at the next folder above that is known
+    EXPECT_EQ(remoteContent("B/new"), "new");
+    EXPECT_FALSE(remoteHas("B/link"));
+}
+
+TEST_F(Sync, OnlyALookAtAllTellsWhatIsDeletedFromWhatIsElsewhere) {
+    givenSynced({"A/file", "A/in/deep", "A/deleted", "A/replaced"});
+    givenRemote("A/promise", "p");
+    synced();
+    const ItemId file = state("A/file")->item.id;
+    moveLocal("A/file", "Rest/file");
+    moveLocal("A/in", "Rest/in");
+    moveLocal("A/.promise.promise", "Rest/.promise.promise");
+    moveLocal("A/replaced", "Rest/replaced");
+    ASSERT_EQ(FileManager::createDirectory(url("A/replaced"), false), std::nullopt);
+    removeLocal("A/deleted");
+    noticed({"A"}); // the other half of each move is late
+    EXPECT_EQ(state("Rest/file")->item.id, file);
+    EXPECT_EQ(remoteContent("Rest/file"), "A/file");
+    EXPECT_EQ(remoteContent("Rest/in/deep"), "A/in/deep");
+    EXPECT_EQ(remoteContent("Rest/promise"), "p");
+    EXPECT_TRUE(isPromised("Rest/promise"));
+    EXPECT_EQ(remoteContent("Rest/replaced"), "A/replaced");
+    EXPECT_TRUE(remoteHas("A/replaced"));
+    EXPECT_FALSE(remoteHas("A/deleted"));
+    const auto days = names(home / "remote/.pelmora/trash");
+    ASSERT_EQ(days.size(), 1U);
+    EXPECT_EQ(names(home / ("remote/.pelmora/trash/" + days[0] + "/A")),
+              std::vector<std::string>{"deleted"}) << "nothing was copied and deleted";
+}
+
 TEST_F(Sync, EditsTravelBothWaysAndTheReplacedContentIsKept) {
     givenSynced({"A/mine", "A/theirs"});
     givenLocal("A/mine", "edited here");
@@ -76,6 +130,24 @@ TEST_F(Sync, EditsTravelBothWaysAndTheReplacedContentIsKept) {
     EXPECT_EQ(local("A/theirs"), "edited there");
     EXPECT_EQ(keptContents(), 1U);
     EXPECT_EQ(stagedFiles(), 0U);
+}
+
+TEST_F(Sync, OtherRightsOfTheAccountsFileAreNoEditOfIt) {
+    givenSynced({"A/x.txt"});
+    givenLocal("A/x.txt", "ours");
+    ASSERT_EQ(::chmod(remotePath("A/x.txt").c_str(), 0600), 0);
+    synced();
+    EXPECT_EQ(remoteContent("A/x.txt"), "ours");
+    EXPECT_EQ(names(layout.root() + "/A"), std::vector<std::string>{"x.txt"});
+}
+
+TEST_F(Sync, AFolderThatMovedThereAndTheOneThatTookItsNameAreTwo) {
+    givenSynced({"C/one"});
+    moveRemote("C", "Rest/C");
+    givenRemote("C/one", "another");
+    synced();
+    EXPECT_EQ(local("Rest/C/one"), "C/one");
+    EXPECT_TRUE(isPromised("C/one"));
 }
 
 TEST_F(Sync, OfTwoEditsTheRemoteKeepsTheNameAndBothAreOnBothSides) {
@@ -256,8 +328,10 @@ TEST_F(Sync, WhatVanishesInMassesIsAskedAbout) {
     queue->sync([&] { EXPECT_EQ(synchronizer->answer(DeletionAnswer::putBack), std::nullopt); });
     synced();
     EXPECT_TRUE(isPromised("Rest/7"));
+    ASSERT_EQ(fetch("Rest/1"), std::nullopt);
     removeRemote("Rest");
-    EXPECT_EQ(sync().question->side, Side::remote);
+    EXPECT_EQ(sync().question, (DeletionQuestion{Side::remote, 13, 11}))
+        << "the folder, one with its content, and those that nobody has any more";
     EXPECT_TRUE(isPromised("Rest/7"));
     queue->sync([&] { EXPECT_EQ(synchronizer->answer(DeletionAnswer::deleteThem), std::nullopt); });
     synced();

@@ -5,6 +5,7 @@
 
 #include <cstdint>
 #include <cstring>
+#include <functional>
 #include <map>
 #include <string>
 #include <string_view>
@@ -12,12 +13,14 @@
 
 namespace simulation {
 
-/// Fails calls of the engine's by their number from now on. The database is spared: what it makes
-/// of a failing disk is its makers' to test.
+/// Fails calls of the engine's by their number from now on, and tells of those that changed
+/// something. The database is spared: what it makes of a failing disk is its makers' to test.
 class DiskTrouble final : public DiskListener {
 public:
     /// By the number of the call (0 is the next one), with the errno.
     std::map<std::uint64_t, int> faults;
+    /// Hears of every path that was changed.
+    std::function<void(const std::string& path)> follow;
     /// Those that failed, for the story.
     std::vector<std::string> failed;
 
@@ -32,7 +35,13 @@ public:
                          std::strerror(fault->second));
         return fault->second;
     }
-    void after(const DiskCall&, long) override {}
+    void after(const DiskCall& call, long result) override {
+        if (!call.changes || result < 0 || !follow)
+            return;
+        follow(call.path);
+        if (!call.to.empty())
+            follow(call.to);
+    }
     void begin(std::map<std::uint64_t, int> those) {
         faults = std::move(those);
         calls_ = 0;

@@ -17,7 +17,7 @@ namespace {
 using namespace platform;
 
 constexpr std::size_t turnsAtMost = 3'000'000;
-constexpr int runsUntilRest = 14;
+constexpr int runsUntilRest = 20;
 constexpr auto between = std::chrono::minutes(6);
 
 Machine& machine() {
@@ -68,6 +68,7 @@ World::World(std::uint64_t seed) : luck_(seed) {
     disk_ = std::make_shared<Disk>(setup, [] { return machine().stamp(); });
     machine().mount("/sim/home", disk_);
     machine().setListener(&trouble_);
+    trouble_.follow = [this](const std::string& path) { noticed(path); };
     far_ = std::make_unique<FarSide>(habitsOf(luck_), [] { return machine().wall(); });
     line_.luck = luck_.split();
     line_.keepsLog = true;
@@ -123,10 +124,24 @@ void World::close() {
     store_.reset();
 }
 
-Synchronizer::Report World::synchronize(std::size_t turnsUntilStop) {
+/// As the kernel does, who tells of the engine's own changes as well.
+void World::noticed(const std::string& path) {
+    const std::string root = layout_.root() + '/';
+    if (path.starts_with(root) && !luck_.percent(lostNotices_))
+        notices_.insert(path.substr(0, std::max(path.rfind('/'), root.size() - 1)));
+}
+
+void World::deliverNotices() {
+    for (const std::string& folder : std::exchange(notices_, {}))
+        synchronizer_->changedOnDisk(
+            folder.substr(std::min(folder.size(), layout_.root().size() + 1)));
+}
+
+Synchronizer::Report World::synchronize(Look look, std::size_t turnsUntilStop) {
     Synchronizer::Report report;
     if (!synchronizer_)
         return report;
+    deliverNotices();
     bool ended = false;
     std::thread thread([&] {
         const Result<std::string> mark = remote_->connect(*cancel_);
@@ -135,7 +150,7 @@ Synchronizer::Report World::synchronize(std::size_t turnsUntilStop) {
         else if (*mark != SimRemote::mark) // as the owner of the engine sees to
             report.failure = makeError(ErrorCode::serverNotAvailable);
         else
-            report = synchronizer_->run({true, true, {}, true, false});
+            report = synchronizer_->run({true, look == Look::all, {}, true, false});
         ended = true;
     });
     if (turnsUntilStop > 0) {
@@ -153,6 +168,8 @@ Synchronizer::Report World::synchronize(std::size_t turnsUntilStop) {
             actMeanwhile();
         else if (Fibers::shared().allWait())
             break;
+        if (luck_.percent(50))
+            deliverNotices();
     }
     thread.join();
     for (std::string& change : line_.log)
@@ -165,7 +182,7 @@ Synchronizer::Report World::synchronize(std::size_t turnsUntilStop) {
 
 void World::crash() {
     tell("the machine stops in the middle of a run");
-    synchronize(1 + luck_.below(luck_.percent(50) ? 300 : 5000));
+    synchronize(someLook(), 1 + luck_.below(luck_.percent(50) ? 300 : 5000));
     close();
     if (off_) {
         machine().restart();
@@ -209,8 +226,9 @@ std::optional<std::string> World::run() {
         if (luck_.percent(25)) {
             crash();
         } else {
-            tell("run");
-            synchronize();
+            const Look look = someLook();
+            tell(look == Look::all ? "run" : "run for what was noticed");
+            synchronize(look);
         }
         endFaults();
         machine().time().creep(std::chrono::milliseconds(luck_.below(4000)));
@@ -234,7 +252,9 @@ std::optional<std::string> World::settle() {
             open();
         if (!store_)
             return "the store cannot be opened";
-        const Synchronizer::Report report = synchronize();
+        // What notices told of brings nearly everything; that nothing is left a look at all proves.
+        const Look look = run % 2 == 1 ? Look::all : Look::marked;
+        const Synchronizer::Report report = synchronize(look);
         if (report.failure)
             tell("run: " + report.failure->localizedDescription.value_or("") + " " +
                  report.failure->localizedFailureReason.value_or(""));
@@ -249,23 +269,31 @@ std::optional<std::string> World::settle() {
         }
         bool agreed = false;
         queue_->sync([&] { agreed = store_->database->disagreements().empty(); });
-        if (!report.failure && !report.settlesIn && !report.secondLook && report.changes == 0 &&
+        if (look == Look::all && !report.failure && !report.settlesIn && !report.secondLook && report.changes == 0 &&
             agreed) {
             if (auto lost = missingContent(true))
                 return lost;
-            return difference();
+            auto differs = difference();
+            return differs ? *differs + '\n' + records(false) : differs;
         }
     }
-    std::string text = "does not come to rest\n";
+    return "does not come to rest\n" + records(true);
+}
+
+/// What the engine has written down: what both sides do not agree on, or all.
+std::string World::records(bool disagreeing) {
+    std::string text;
     queue_->sync([&] {
-        for (const ItemState& state : store_->database->disagreements()) {
+        StateDatabase& database = *store_->database;
+        for (const ItemState& state :
+             disagreeing ? database.disagreements() : database.localItems()) {
             const auto place = [](const auto& row) {
                 return row ? std::to_string(row->place.parent) + '/' + row->place.name : "-";
             };
             text += std::to_string(state.item.id) + ": " + place(state.local) + " | " +
                     place(state.remote) + " | " + place(state.base) + '\n';
         }
-        for (const PendingWork& work : Synchronizer::pending(*store_->database))
+        for (const PendingWork& work : Synchronizer::pending(database))
             text += work.kind + ' ' + work.path + ": " + work.cause + '\n';
     });
     return text;

@@ -51,7 +51,12 @@ private:
     // The device.
     void open();
     void close();
-    platform::Synchronizer::Report synchronize(std::size_t turnsUntilStop = 0);
+    /// Looks at the whole disk, or at what notices tell of.
+    enum class Look { all, marked };
+    platform::Synchronizer::Report synchronize(Look look, std::size_t turnsUntilStop = 0);
+    Look someLook() { return luck_.percent(50) ? Look::all : Look::marked; }
+    void noticed(const std::string& path);
+    void deliverNotices();
     void fetchOne();
     void crash();
 
@@ -65,6 +70,7 @@ private:
     std::optional<std::string> settle();
     std::optional<std::string> missingContent(bool atRest);
     std::optional<std::string> difference();
+    std::string records(bool disagreeing);
     void collect(const std::string& folder, std::set<std::string>& contents) const;
     void listHere(const std::string& folder, const std::string& shown,
                   std::map<std::string, std::string>& tree) const;
@@ -77,6 +83,8 @@ private:
     std::vector<std::string> story_;
     DiskTrouble trouble_;
     bool busyUsers_ = false;                       // they do not wait until the engine rests
+    unsigned lostNotices_ = 0;                     // of a hundred
+    std::set<std::string> notices_;                // folders that were changed
     bool hasYesterday_ = false;                    // a copy of the database
     std::set<std::string> wanted_;                 // contents that nobody gave up
     std::map<std::string, std::string> lastThere_; // contents of the far side after the last run

@@ -34,6 +34,7 @@ void World::chooseFaults() {
         tell("the disk is full");
         disk_->setup().room = 0;
     }
+    lostNotices_ = luck_.percent(20) ? static_cast<unsigned>(luck_.below(100)) : 0;
     line_.away = luck_.percent(5);
     line_.otherDisk = luck_.percent(3);
     line_.muddled = luck_.percent(3);
@@ -49,6 +50,7 @@ void World::endFaults() {
     trouble_.begin({});
     disk_->setup().room = UINT64_MAX;
     busyUsers_ = false;
+    lostNotices_ = 0;
 }
 
 void World::copyDatabase(const std::string& from, const std::string& to) {
