@@ -2,6 +2,7 @@
 #include "platform/base/Text.h"
 #include "platform/cloud/FolderRemote.h"
 #include "platform/cloud/FolderVersion.h"
+#include "platform/cloud/StoreContext.h"
 #include "platform/cloud/SyncNames.h"
 #include "platform/files/PathText.h"
 
@@ -76,7 +77,7 @@ Error FolderRemote::refused(const Error& error, const std::string& path) const {
         return makeError(ErrorCode::quotaExceeded, name);
     if (error.is(ErrorCode::nameTooLong) || error.is(ErrorCode::invalidArgument))
         return nameRefused(name, error.localizedFailureReason.value_or(std::string()));
-    return translated(error);
+    return namedForPeople(translated(error), name);
 }
 
 Failure FolderRemote::checkChange(const std::string& path, CancelFlag& cancel) const {

@@ -34,9 +34,11 @@ Result<std::string> RemoteTrash::findPlace(const std::string& itemPath,
     for (int attempt = 0;; ++attempt) {
         std::string place = placeFor(itemPath, attempt);
         Failure failure = arrive(place);
-        if (failure && failure->is(ErrorCode::noSuchItem) &&
-            !FileManager::createDirectory(Url::file(folderOf(place), true), true))
-            failure = arrive(place);
+        if (failure && failure->is(ErrorCode::noSuchItem)) {
+            failure = FileManager::createDirectory(Url::file(folderOf(place), true), true);
+            if (!failure)
+                failure = arrive(place);
+        }
         if (!failure)
             return place;
         if (attempt == namesTried ||

@@ -29,7 +29,7 @@ Failure StoreRemovals::remove(const std::string& relative) {
         return makeErrorWithText(
             ErrorCode::unsupportedOperation,
             localizedFormat("“%1$@” belongs to the store itself and cannot be deleted.",
-                            nameOf(relative)));
+                            nameOf(context_.pathOf(relative))));
     const std::string path = context_.pathOf(relative);
     const Result<FileAttributes> attributes = context_.disk.attributes(path);
     if (!attributes && !attributes.error().is(ErrorCode::noSuchItem))

@@ -11,7 +11,8 @@ namespace {
 
 using namespace platform;
 
-void printStatus(const AccountSummary& account, const CloudStatus& status) {
+void printStatus(const AccountSummary& account, const CloudStatus& status,
+                 const std::optional<std::string>& problem) {
     std::printf("Account:   %s\n", account.name.c_str());
     std::printf("Kind:      %s\n", account.kind.c_str());
     std::printf("Address:   %s\n", account.address.c_str());
@@ -22,6 +23,8 @@ void printStatus(const AccountSummary& account, const CloudStatus& status) {
     if (status.refused > 0)
         std::printf("Left out:  %lld that this device cannot hold\n",
                     static_cast<long long>(status.refused));
+    if (problem)
+        std::printf("Problem:   %s\n", problem->c_str());
     if (status.question)
         std::printf("Question:  %lld items have vanished from %s; see \"pelmora sync --help\"\n",
                     static_cast<long long>(status.question->items),
@@ -55,12 +58,13 @@ int showStatus(const std::vector<std::string>& arguments) {
         return noAccount;
     }
     const std::optional<CloudStatus> status = session.cloud().status();
-    if (status) {
-        printStatus(*account, *status);
-    } else {
-        std::printf("Account:   %s\nKind:      %s\nAddress:   %s\nStore:     not set up yet\n",
-                    account->name.c_str(), account->kind.c_str(), account->address.c_str());
-    }
+    const std::optional<std::string> problem = session.cloud().accounts().problem();
+    if (status)
+        printStatus(*account, *status, problem);
+    else
+        std::printf("Account:   %s\nKind:      %s\nAddress:   %s\nStore:     %s\n",
+                    account->name.c_str(), account->kind.c_str(), account->address.c_str(),
+                    problem.value_or("not set up yet").c_str());
     return done;
 }
 

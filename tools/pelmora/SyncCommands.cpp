@@ -24,7 +24,9 @@ int tellQuestion(const DeletionQuestion& question) {
              (here ? "this device" : "the account") +
              "; nothing was changed. Say \"pelmora sync --delete\" to delete them on " +
              (here ? "the account" : "this device") +
-             " as well, or \"pelmora sync --put-back\" to bring them back");
+             " as well, or \"pelmora sync --put-back\" to bring them back" +
+             (question.lost == 0 ? "" : "; " + std::to_string(question.lost) +
+                                            " of them have no copy here and cannot come back"));
     return failed;
 }
 
@@ -67,12 +69,13 @@ int synchronize(const std::vector<std::string>& arguments) {
     if (answer)
         if (const Failure failure = session.cloud().answer(*answer))
             return complainOf(*failure);
-    if (const Failure failure = syncAndWait(session.cloud()))
-        return complainOf(*failure);
+    const Failure failure = syncAndWait(session.cloud());
+    const int result = failure ? complainOf(*failure) : done;
     const std::optional<CloudStatus> status = session.cloud().status();
     if (status && status->question)
         return tellQuestion(*status->question);
-    return tellPending(session.cloud());
+    const int pending = tellPending(session.cloud());
+    return result == done ? pending : result;
 }
 
 int evict(const std::vector<std::string>& arguments) {
