@@ -38,6 +38,8 @@ AccountReading accountFrom(const Json& object, const std::string& file) {
     account.kind = textOf(object, "kind");
     account.address = textOf(object, "address");
     account.name = textOf(object, "name");
+    account.user = textOf(object, "user");
+    account.authorities = textOf(object, "authorities");
     account.rateLimit = countOf(object, "rateLimit");
     account.quota = countOf(object, "quota");
     if (account.kind != folderAccountKind && account.kind != webDavAccountKind)
@@ -102,6 +104,10 @@ Failure writeAccount(const Folders& folders, const AccountRecord& account) {
     object["kind"] = account.kind;
     object["address"] = account.address;
     object["name"] = account.name;
+    if (!account.user.empty())
+        object["user"] = account.user;
+    if (!account.authorities.empty())
+        object["authorities"] = account.authorities;
     object["identity"] = hexText(account.identity);
     if (account.rateLimit)
         object["rateLimit"] = *account.rateLimit;
@@ -122,7 +128,9 @@ Failure removeAccount(const Folders& folders) {
 }
 
 std::string storeFolderName(const AccountRecord& account) {
-    Bytes hash = ContentHash::of(account.kind + '\n' + account.address);
+    // Two who share a server share nothing of what is here.
+    const std::string who = account.user.empty() ? std::string() : '\n' + account.user;
+    Bytes hash = ContentHash::of(account.kind + '\n' + account.address + who);
     hash.resize(6);
     const std::size_t slash = account.address.find_last_of('/');
     const std::string_view last =

@@ -26,6 +26,10 @@ struct AccountRecord {
     std::optional<std::uint64_t> rateLimit;
     /// Size of the account in bytes where the remote itself has no limit.
     std::optional<std::uint64_t> quota;
+    /// Who signs in to a server; "" where nobody has to.
+    std::string user = {};
+    /// A file of certificate authorities that are trusted beside the system's; "" for none.
+    std::string authorities = {};
     bool operator==(const AccountRecord&) const = default;
 };
 

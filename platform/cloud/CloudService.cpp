@@ -5,6 +5,7 @@
 #include "platform/base/Text.h"
 #include "platform/cloud/AccountMonitor.h"
 #include "platform/cloud/KeyValueCloudStore.h"
+#include "platform/cloud/StandardRemotes.h"
 #include "platform/cloud/StoreDocuments.h"
 #include "platform/cloud/StoreEngine.h"
 #include "platform/cloud/StoreFileSystem.h"

@@ -1,7 +1,6 @@
 #include "platform/cloud/FolderRemote.h"
 
 #include "platform/base/Text.h"
-#include "platform/cloud/AccountFile.h"
 #include "platform/cloud/FolderVersion.h"
 #include "platform/cloud/SyncTimes.h"
 #include "platform/cloud/Tokens.h"
@@ -36,14 +35,6 @@ bool meansAway(const Error& error) {
 }
 
 } // namespace
-
-RemoteFactory standardRemotes(Clock& clock) {
-    return [&clock](const AccountRecord& account) -> std::unique_ptr<Remote> {
-        if (account.kind == folderAccountKind)
-            return std::make_unique<FolderRemote>(account.address, clock);
-        return nullptr;
-    };
-}
 
 FolderRemote::FolderRemote(std::string root, Clock& clock)
     : root_(std::move(root)),

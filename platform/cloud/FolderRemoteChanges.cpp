@@ -2,6 +2,7 @@
 #include "platform/base/Text.h"
 #include "platform/cloud/FolderRemote.h"
 #include "platform/cloud/FolderVersion.h"
+#include "platform/cloud/RemoteNames.h"
 #include "platform/cloud/StoreContext.h"
 #include "platform/cloud/SyncNames.h"
 #include "platform/files/PathText.h"
@@ -36,26 +37,6 @@ bool isNetworkMount(const struct statfs& disk) {
     }
 }
 
-Error nameRefused(std::string_view name, std::string reason) {
-    Error error = makeError(ErrorCode::nameRefused, name);
-    error.localizedFailureReason = std::move(reason);
-    return error;
-}
-
-Failure nameProblem(std::string_view path, std::string_view name) {
-    if (name.empty() || name == "." || name == ".." || name.find('\0') != std::string_view::npos)
-        return nameRefused(name, localized("The disk cannot have an item of that name."));
-    if (name.size() > longestItemName)
-        return nameRefused(name, localized("The name is too long for the disk."));
-    if (hasSidecarForm(name))
-        return nameRefused(
-            name,
-            localized("Names that begin with “.” and end in “.promise” are kept for promises."));
-    if (path == remoteServiceFolder)
-        return nameRefused(name, localized("The name is one that the account uses itself."));
-    return std::nullopt;
-}
-
 } // namespace
 
 /// A content that waits in the trash for its place.
@@ -76,7 +57,7 @@ Error FolderRemote::refused(const Error& error, const std::string& path) const {
     if (error.is(ErrorCode::outOfSpace))
         return makeError(ErrorCode::quotaExceeded, name);
     if (error.is(ErrorCode::nameTooLong) || error.is(ErrorCode::invalidArgument))
-        return nameRefused(name, error.localizedFailureReason.value_or(std::string()));
+        return nameRefusedError(name, error.localizedFailureReason.value_or(std::string()));
     return namedForPeople(translated(error), name);
 }
 
@@ -85,7 +66,7 @@ Failure FolderRemote::checkChange(const std::string& path, CancelFlag& cancel) c
         return makeError(ErrorCode::userCancelled);
     if (Failure failure = checkRoot())
         return failure;
-    if (Failure problem = nameProblem(path, nameOf(path)))
+    if (Failure problem = remoteNameProblem(path, nameOf(path)))
         return problem;
     for (std::size_t slash = path.find('/'); slash != std::string::npos;
          slash = path.find('/', slash + 1)) {

@@ -110,9 +110,8 @@ public:
 
 struct AccountRecord;
 /// Makes the remote of an account; empty for a kind that this version does not know. Does not
-/// touch the remote: that is for connect().
+/// touch the remote: that is for connect(). See StandardRemotes.h.
 using RemoteFactory = std::function<std::unique_ptr<Remote>(const AccountRecord& account)>;
-RemoteFactory standardRemotes(Clock& clock);
 
 /// Files and folders of a remote that serve the store and are no items of it.
 inline constexpr std::string_view remoteServiceFolder = ".pelmora";
