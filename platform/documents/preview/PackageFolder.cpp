@@ -9,7 +9,7 @@ namespace platform {
 namespace {
 
 /// Folders in folders; nobody opens more of them one by one.
-constexpr int mostLevels = 48;
+constexpr int mostPackageLevels = 48;
 
 struct OpenFolder {
     Url url;
@@ -54,12 +54,12 @@ Result<PackageContents> listPackage(const Url& package, const CloudDocumentServi
             const Url url = folder.url.appending(entry.name);
             const ContentsTree::Item item = itemFor(entry, url);
             const auto number = contents.tree->addTo(folder.number, std::move(entry.name), item);
-            contents.cut = contents.cut || !number || (item.folder && folder.level >= mostLevels);
+            contents.cut = contents.cut || !number || (item.folder && folder.level >= mostPackageLevels);
             if (!number) {
                 open.clear();
                 break;
             }
-            if (item.folder && folder.level < mostLevels)
+            if (item.folder && folder.level < mostPackageLevels)
                 open.push_back({url, *number, folder.level + 1});
         }
     }

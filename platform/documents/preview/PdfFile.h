@@ -27,8 +27,13 @@ public:
     std::vector<QSizeF> pageSizes(std::size_t from, std::size_t count) const;
     /// The page on white, that many pixels wide.
     QImage render(int page, int width) const;
+    /// The same of its top alone, so many pixels high at most.
+    QImage renderTop(int page, int width, int height) const;
 
 private:
+    /// How many pixels high the page is; 0 for one without a size.
+    int heightOf(int page, int width) const;
+
     std::unique_ptr<QPdfDocument> document_;
 };
 

@@ -16,7 +16,7 @@ namespace {
 /// Of a picture's file beside the text.
 constexpr off_t longestPicture = 16LL * 1024 * 1024;
 /// Of all pictures of a text together; 64 MB. None needs more than twice a wide column.
-constexpr double mostPixels = 16e6;
+constexpr double mostPixelsTogether = 16e6;
 constexpr double mostPixelsEach = 2e6;
 /// Each is decoded, however small it is drawn.
 constexpr qsizetype mostPictures = 200;
@@ -47,7 +47,7 @@ std::optional<InlinePicture> PictureShelf::read(const QString& address) {
                        ? written(address)
                        : beside(address);
     const double pixels = static_cast<double>(image.width()) * image.height();
-    if (image.isNull() || pixels + pixels_ > mostPixels)
+    if (image.isNull() || pixels + pixels_ > mostPixelsTogether)
         return std::nullopt;
     pixels_ += pixels;
     const QString name = QStringLiteral("picture-%1").arg(images_.size());
