@@ -65,6 +65,38 @@ TEST_F(AccessibilityTest, AViewThatCanBeTappedIsAButtonThatCanBePressed) {
     EXPECT_EQ(journal, Journal{"tapped"});
 }
 
+TEST_F(AccessibilityTest, TextThatIsSetThroughItIsTheUsersOwn) {
+    const auto field = shown(std::make_shared<TextField>());
+    field->setEditingChangedHandler(
+        [this](TextField& changed) { journal.push_back(changed.text()); });
+    field->setText("by the program");
+    heard(*field).setText(QAccessible::Value, toQt("by the user"));
+    EXPECT_EQ(journal, Journal{"by the user"});
+}
+
+TEST_F(AccessibilityTest, WhatLiesBelowADialogTakesNoAction) {
+    const auto label = shown(std::make_shared<Label>());
+    label->addTapHandler([this] { journal.push_back("tapped"); });
+    const auto below = shown(std::make_shared<Button>(ButtonType::system));
+    below->addAction(ControlEvent::touchUpInside, [this] { journal.push_back("pressed"); });
+    const auto press = [](const View& view) {
+        heard(view).actionInterface()->doAction(QAccessibleActionInterface::pressAction());
+    };
+    const auto alert = AlertController::create("Rename Item", "", AlertStyle::alert);
+    alert->addAction(AlertAction::make("OK", ActionStyle::standard));
+    window().rootViewController()->presentViewController(alert, false);
+    for (const View* each : {static_cast<View*>(label.get()), static_cast<View*>(below.get())}) {
+        EXPECT_TRUE(heard(*each).state().disabled);
+        press(*each);
+    }
+    EXPECT_EQ(journal, Journal{});
+    EXPECT_FALSE(heard(*button("OK")).state().disabled);
+    alert->dismissViewController(false);
+    settle();
+    press(*below);
+    EXPECT_EQ(journal, Journal{"pressed"});
+}
+
 TEST_F(AccessibilityTest, AnAlertIsADialogCalledByItsTitle) {
     const auto alert = AlertController::create("Rename Item", "", AlertStyle::alert);
     alert->addAction(AlertAction::make("OK", ActionStyle::standard));
