@@ -160,8 +160,14 @@ Failure RemoteLister::bringIn(const Folder& folder, const Result<RemoteListing>&
     std::unordered_map<std::string_view, const ItemState*> missing = visit.known.remote;
     for (const RemoteEntry& entry : listing->entries)
         missing.erase(entry.name);
+    std::vector<ItemId> unreadable; // there, and for now refused: that is not absent
+    for (const RefusedRow& row : listing->refused)
+        if (const auto known = missing.extract(row.name))
+            unreadable.push_back(known.mapped()->item.id);
     visit.generation =
         std::max<std::int64_t>(1, visit.known.scan.generation + (missing.empty() ? 0 : 1));
+    for (const ItemId item : unreadable)
+        batch_.seen.emplace_back(item, visit.generation);
     for (const RemoteEntry& entry : listing->entries) {
         if (Failure failure = take(visit, entry))
             return failure;

@@ -1,12 +1,12 @@
 #pragma once
 
 #include "platform/base/WorkQueue.h"
+#include "platform/cloud/Remote.h"
 #include "platform/cloud/StateDatabase.h"
 #include "platform/cloud/StoreFolder.h"
 
 namespace platform {
 
-class Remote;
 class StoreFileSystem;
 
 /// An open store, as those who work on it see it. Outlives them.
@@ -42,6 +42,12 @@ inline LocalRow localRowOf(const Place& place, const FileAttributes& attributes,
 inline BaseRow baseRowOf(const Place& place, const std::string& etag, std::uint64_t size,
                          Bytes hash, const FileAttributes& here) {
     return {place, etag, size, std::move(hash), here.identity, here.modified, here.changed};
+}
+
+/// The version that a listing told of, and not all of it: a content that something on the way cut
+/// and passed on as whole.
+inline bool isCutShort(const RemoteEntry& received, const RemoteRow& listed) {
+    return received.etag == listed.etag && received.size != listed.size;
 }
 
 /// An error of the disk about a file of the store's own (a promise, a staged content, the records),

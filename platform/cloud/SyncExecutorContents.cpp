@@ -75,7 +75,7 @@ Result<SyncExecutor::Staged> SyncExecutor::stage(const Work& work, CancelFlag& c
     };
     const Result<RemoteEntry> version = context_.remote.read(work.remotePath, sink, cancel);
     Failure failure = version ? Failure() : Failure(version.error());
-    if (!failure && received != version->size)
+    if (!failure && (received != version->size || isCutShort(*version, *work.state.remote)))
         failure = makeError(ErrorCode::changedWhileRead, version->name);
     if (!failure)
         failure = (*file)->finish(version->modified, version->tags);

@@ -27,6 +27,8 @@ struct Transfers::Transfer {
     /// Relative to the store's root.
     std::string path;
     std::shared_ptr<Progress> progress;
+    /// As a listing told of it.
+    std::optional<RemoteRow> expected;
     CancelFlag cancel;
     int waiting = 0; // guarded by the transfers' mutex, as are the two below
     bool done = false;
@@ -139,6 +141,7 @@ Failure Transfers::run(Transfer& transfer) {
     if (!state || !state->remote || !remotePath)
         return makeError(ErrorCode::noSuchItem, transfer.url.lastPathComponent());
     const std::uint64_t size = state->remote->size;
+    transfer.expected = state->remote;
     transfer.progress->update(0, static_cast<std::int64_t>(size));
     const auto published = progress_.publish(transfer.url, transfer.progress);
     Failure failure;
@@ -204,7 +207,7 @@ Result<RemoteEntry> Transfers::stage(Transfer& transfer, const std::string& remo
     Result<RemoteEntry> version = context_.remote.read(remotePath, sink, transfer.cancel);
     if (!version)
         return version;
-    if (received != version->size)
+    if (received != version->size || isCutShort(*version, *transfer.expected))
         return makeError(ErrorCode::changedWhileRead, version->name);
     if (Failure failure = (*file)->finish(version->modified, version->tags))
         return *failure;
