@@ -3,6 +3,7 @@
 #include "platform/base/Text.h"
 #include "platform/cloud/ContentHash.h"
 #include "platform/cloud/Tokens.h"
+#include "platform/cloud/webdav/WebDavAddress.h"
 #include "platform/files/FileManager.h"
 
 #include <nlohmann/json.hpp>
@@ -50,6 +51,9 @@ AccountReading accountFrom(const Json& object, const std::string& file) {
         return refused(localizedFormat("The account's folder “%1$@” is not an absolute path. Sign "
                                        "in again with the whole path.",
                                        account.address));
+    if (account.kind == webDavAccountKind)
+        if (const Result<WebDavAddress> server = WebDavAddress::parse(account.address); !server)
+            return refused(server.error().localizedDescription.value_or(account.address));
     const std::optional<Bytes> identity = bytesOfHex(textOf(object, "identity"));
     if (!identity || identity->size() < shortestIdentity)
         return refused(localizedFormat("The account file “%1$@” does not say who is signed in. "

@@ -1093,5 +1093,150 @@
         <source>Select All</source>
         <translation>تحديد الكل</translation>
     </message>
+    <!-- A WebDAV server -->
+    <message>
+        <source>This is not the address of a server. It begins with “https://”.</source>
+        <translation>هذا ليس عنوان خادم. يبدأ العنوان بـ «https://».</translation>
+    </message>
+    <message>
+        <source>The address of a WebDAV server begins with “https://” or “http://”.</source>
+        <translation>يبدأ عنوان خادم WebDAV بـ «https://» أو «http://».</translation>
+    </message>
+    <message>
+        <source>Give the user and the password apart from the address.</source>
+        <translation>اكتب المستخدم وكلمة المرور منفصلين عن العنوان.</translation>
+    </message>
+    <message>
+        <source>The address of a WebDAV folder has neither a “?” nor a “#” in it.</source>
+        <translation>لا يحتوي عنوان مجلد WebDAV على «?» ولا «#».</translation>
+    </message>
+    <message>
+        <source>The path in the address is not well-formed.</source>
+        <translation>المسار في العنوان غير سليم.</translation>
+    </message>
+    <message>
+        <source>The name is not valid UTF-8, and a WebDAV server takes no other.</source>
+        <translation>الاسم ليس بترميز UTF-8 صحيح، ولا يقبل خادم WebDAV غيره.</translation>
+    </message>
+    <message>
+        <source>The server does not list names that begin with a dot, so that the item would look deleted.</source>
+        <translation>لا يعرض الخادم الأسماء التي تبدأ بنقطة، فيبدو العنصر محذوفًا.</translation>
+    </message>
+    <message>
+        <source>The account on the server takes no changes; “%1$@” stays as it is there.</source>
+        <translation>لا يقبل الحساب على الخادم أي تغيير؛ يبقى «%1$@» هناك كما هو.</translation>
+    </message>
+    <message>
+        <source>The server replaces what stands at a name without being asked to. Nothing is changed on it.</source>
+        <translation>يستبدل الخادم ما يحمل الاسم دون طلب. لن يُغيَّر عليه شيء.</translation>
+    </message>
+    <message>
+        <source>“%1$@” was changed while it was being replaced. What was there lies at “%2$@” on the server.</source>
+        <translation>تغيّر «%1$@» أثناء استبداله. ما كان هناك موجود في «%2$@» على الخادم.</translation>
+    </message>
+    <message>
+        <source>The server's list of “%1$@” makes no sense. Nothing is concluded from it; it is asked again later.</source>
+        <translation>قائمة الخادم لـ «%1$@» غير منطقية. لا يُستنتج منها شيء، ويُسأل الخادم لاحقًا.</translation>
+    </message>
+    <message>
+        <source>The server's list of a folder is not whole or not well-formed. Nothing is concluded from it; it is asked again later.</source>
+        <translation>قائمة المجلد من الخادم ناقصة أو غير سليمة. لا يُستنتج منها شيء، ويُسأل الخادم لاحقًا.</translation>
+    </message>
+    <message>
+        <source>Its name is not valid UTF-8.</source>
+        <translation>اسمه ليس بترميز UTF-8 صحيح.</translation>
+    </message>
+    <message>
+        <source>The server does not allow it to be read.</source>
+        <translation>لا يسمح الخادم بقراءته.</translation>
+    </message>
+    <message>
+        <source>The server does not tell its size.</source>
+        <translation>لا يذكر الخادم حجمه.</translation>
+    </message>
+    <message>
+        <source>The server “%1$@” cannot be reached. Check the network and the address.</source>
+        <translation>تعذّر الوصول إلى الخادم «%1$@». تحقق من الشبكة والعنوان.</translation>
+    </message>
+    <message>
+        <source>The server “%1$@” cannot prove who it is: its certificate is not valid or not known here. Nothing was sent to it.</source>
+        <translation>لا يستطيع الخادم «%1$@» إثبات هويته: شهادته غير صالحة أو غير معروفة هنا. لم يُرسل إليه شيء.</translation>
+    </message>
+    <message>
+        <source>The server “%1$@” does not answer any more. It is tried again.</source>
+        <translation>لم يعد الخادم «%1$@» يستجيب. ستُعاد المحاولة.</translation>
+    </message>
+    <message>
+        <source>The connection to the server “%1$@” broke off. It is tried again.</source>
+        <translation>انقطع الاتصال بالخادم «%1$@». ستُعاد المحاولة.</translation>
+    </message>
+    <message>
+        <source>The server does not accept the user or the password. Sign in again.</source>
+        <translation>لا يقبل الخادم المستخدم أو كلمة المرور. سجّل الدخول من جديد.</translation>
+    </message>
+    <message>
+        <source>The server sends on to “%1$@”, which is not followed. Sign in with that address if it is the right one.</source>
+        <translation>يحيل الخادم إلى «%1$@» ولا يُتَّبع ذلك. سجّل الدخول بهذا العنوان إن كان صحيحًا.</translation>
+    </message>
+    <message>
+        <source>The server is busy and asks to be left alone for %1$@ seconds. Everything waits until then.</source>
+        <translation>الخادم مشغول ويطلب الانتظار %1$@ ثانية. ينتظر كل شيء حتى ذلك الحين.</translation>
+    </message>
+    <message>
+        <source>The server does not allow “%1$@” to be changed.</source>
+        <translation>لا يسمح الخادم بتغيير «%1$@».</translation>
+    </message>
+    <message>
+        <source>The server does not allow “%1$@” to be read.</source>
+        <translation>لا يسمح الخادم بقراءة «%1$@».</translation>
+    </message>
+    <message>
+        <source>The server takes no file as large as “%1$@”.</source>
+        <translation>لا يقبل الخادم ملفًا بحجم «%1$@».</translation>
+    </message>
+    <message>
+        <source>“%1$@” is locked on the server by another program. It is tried again.</source>
+        <translation>«%1$@» مقفل على الخادم بواسطة برنامج آخر. ستُعاد المحاولة.</translation>
+    </message>
+    <message>
+        <source>The server does not reach what stands behind it. It is tried again.</source>
+        <translation>لا يصل الخادم إلى ما وراءه. ستُعاد المحاولة.</translation>
+    </message>
+    <message>
+        <source>The server refused a request for “%1$@” (%2$@). It is tried again.</source>
+        <translation>رفض الخادم طلبًا بشأن «%1$@» (%2$@). ستُعاد المحاولة.</translation>
+    </message>
+    <message>
+        <source>The server sends “%1$@” in an encoding that was not asked for.</source>
+        <translation>يرسل الخادم «%1$@» بترميز لم يُطلب.</translation>
+    </message>
+    <message>
+        <source>What the server sent of “%1$@” does not have the checksum that the server gives. It is tried again.</source>
+        <translation>ما أرسله الخادم من «%1$@» لا يطابق المجموع الذي يذكره. ستُعاد المحاولة.</translation>
+    </message>
+    <message>
+        <source>What is at “%1$@” now is not what this account was linked with. Nothing is changed until it is back.</source>
+        <translation>ما يوجد الآن في «%1$@» ليس ما رُبط به هذا الحساب. لن يُغيَّر شيء حتى يعود.</translation>
+    </message>
+    <message>
+        <source>The name is too long for the server.</source>
+        <translation>الاسم أطول مما يقبله الخادم.</translation>
+    </message>
+    <message>
+        <source>The server answers for “%1$@”, and not as a WebDAV server does. Check the address: it is that of a folder, and often longer than that of the site.</source>
+        <translation>يجيب الخادم عن «%1$@» لكن ليس كخادم WebDAV. تحقق من العنوان: فهو عنوان مجلد، وغالبًا أطول من عنوان الموقع.</translation>
+    </message>
+    <message>
+        <source>There is nothing at “%1$@” on the server. Check the address.</source>
+        <translation>لا يوجد شيء في «%1$@» على الخادم. تحقق من العنوان.</translation>
+    </message>
+    <message>
+        <source>The server does not allow the folder “%1$@” to be read.</source>
+        <translation>لا يسمح الخادم بقراءة المجلد «%1$@».</translation>
+    </message>
+    <message>
+        <source>The server has a fault of its own and does not answer for “%1$@”. It is tried again.</source>
+        <translation>في الخادم خلل ولا يجيب عن «%1$@». ستُعاد المحاولة.</translation>
+    </message>
 </context>
 </TS>

@@ -1065,5 +1065,150 @@
         <source>Select All</source>
         <translation>Alles auswählen</translation>
     </message>
+    <!-- A WebDAV server -->
+    <message>
+        <source>This is not the address of a server. It begins with “https://”.</source>
+        <translation>Das ist keine Adresse eines Servers. Sie beginnt mit „https://“.</translation>
+    </message>
+    <message>
+        <source>The address of a WebDAV server begins with “https://” or “http://”.</source>
+        <translation>Die Adresse eines WebDAV-Servers beginnt mit „https://“ oder „http://“.</translation>
+    </message>
+    <message>
+        <source>Give the user and the password apart from the address.</source>
+        <translation>Geben Sie Benutzer und Passwort getrennt von der Adresse an.</translation>
+    </message>
+    <message>
+        <source>The address of a WebDAV folder has neither a “?” nor a “#” in it.</source>
+        <translation>Die Adresse eines WebDAV-Ordners enthält weder „?“ noch „#“.</translation>
+    </message>
+    <message>
+        <source>The path in the address is not well-formed.</source>
+        <translation>Der Pfad in der Adresse ist nicht wohlgeformt.</translation>
+    </message>
+    <message>
+        <source>The name is not valid UTF-8, and a WebDAV server takes no other.</source>
+        <translation>Der Name ist kein gültiges UTF-8, und ein WebDAV-Server nimmt keinen anderen.</translation>
+    </message>
+    <message>
+        <source>The server does not list names that begin with a dot, so that the item would look deleted.</source>
+        <translation>Der Server zeigt Namen nicht, die mit einem Punkt beginnen; das Objekt sähe wie gelöscht aus.</translation>
+    </message>
+    <message>
+        <source>The account on the server takes no changes; “%1$@” stays as it is there.</source>
+        <translation>Das Konto auf dem Server nimmt keine Änderungen an; „%1$@“ bleibt dort, wie es ist.</translation>
+    </message>
+    <message>
+        <source>The server replaces what stands at a name without being asked to. Nothing is changed on it.</source>
+        <translation>Der Server ersetzt ungefragt, was unter einem Namen steht. Auf ihm wird nichts geändert.</translation>
+    </message>
+    <message>
+        <source>“%1$@” was changed while it was being replaced. What was there lies at “%2$@” on the server.</source>
+        <translation>„%1$@“ wurde geändert, während es ersetzt wurde. Was dort war, liegt unter „%2$@“ auf dem Server.</translation>
+    </message>
+    <message>
+        <source>The server's list of “%1$@” makes no sense. Nothing is concluded from it; it is asked again later.</source>
+        <translation>Die Liste des Servers von „%1$@“ ergibt keinen Sinn. Daraus wird nichts geschlossen; er wird später wieder gefragt.</translation>
+    </message>
+    <message>
+        <source>The server's list of a folder is not whole or not well-formed. Nothing is concluded from it; it is asked again later.</source>
+        <translation>Die Liste eines Ordners vom Server ist nicht vollständig oder nicht wohlgeformt. Daraus wird nichts geschlossen; er wird später wieder gefragt.</translation>
+    </message>
+    <message>
+        <source>Its name is not valid UTF-8.</source>
+        <translation>Sein Name ist kein gültiges UTF-8.</translation>
+    </message>
+    <message>
+        <source>The server does not allow it to be read.</source>
+        <translation>Der Server erlaubt nicht, es zu lesen.</translation>
+    </message>
+    <message>
+        <source>The server does not tell its size.</source>
+        <translation>Der Server nennt seine Größe nicht.</translation>
+    </message>
+    <message>
+        <source>The server “%1$@” cannot be reached. Check the network and the address.</source>
+        <translation>Der Server „%1$@“ ist nicht zu erreichen. Prüfen Sie Netz und Adresse.</translation>
+    </message>
+    <message>
+        <source>The server “%1$@” cannot prove who it is: its certificate is not valid or not known here. Nothing was sent to it.</source>
+        <translation>Der Server „%1$@“ kann nicht beweisen, wer er ist: Sein Zertifikat ist ungültig oder hier nicht bekannt. Ihm wurde nichts gesendet.</translation>
+    </message>
+    <message>
+        <source>The server “%1$@” does not answer any more. It is tried again.</source>
+        <translation>Der Server „%1$@“ antwortet nicht mehr. Es wird wieder versucht.</translation>
+    </message>
+    <message>
+        <source>The connection to the server “%1$@” broke off. It is tried again.</source>
+        <translation>Die Verbindung zum Server „%1$@“ ist abgerissen. Es wird wieder versucht.</translation>
+    </message>
+    <message>
+        <source>The server does not accept the user or the password. Sign in again.</source>
+        <translation>Der Server nimmt Benutzer oder Passwort nicht an. Melden Sie sich neu an.</translation>
+    </message>
+    <message>
+        <source>The server sends on to “%1$@”, which is not followed. Sign in with that address if it is the right one.</source>
+        <translation>Der Server verweist auf „%1$@“; dem wird nicht gefolgt. Melden Sie sich mit dieser Adresse an, wenn sie die richtige ist.</translation>
+    </message>
+    <message>
+        <source>The server is busy and asks to be left alone for %1$@ seconds. Everything waits until then.</source>
+        <translation>Der Server ist beschäftigt und will %1$@ Sekunden in Ruhe gelassen werden. Bis dahin wartet alles.</translation>
+    </message>
+    <message>
+        <source>The server does not allow “%1$@” to be changed.</source>
+        <translation>Der Server erlaubt nicht, „%1$@“ zu ändern.</translation>
+    </message>
+    <message>
+        <source>The server does not allow “%1$@” to be read.</source>
+        <translation>Der Server erlaubt nicht, „%1$@“ zu lesen.</translation>
+    </message>
+    <message>
+        <source>The server takes no file as large as “%1$@”.</source>
+        <translation>Der Server nimmt keine so große Datei wie „%1$@“ an.</translation>
+    </message>
+    <message>
+        <source>“%1$@” is locked on the server by another program. It is tried again.</source>
+        <translation>„%1$@“ ist auf dem Server von einem anderen Programm gesperrt. Es wird wieder versucht.</translation>
+    </message>
+    <message>
+        <source>The server does not reach what stands behind it. It is tried again.</source>
+        <translation>Der Server erreicht nicht, was hinter ihm steht. Es wird wieder versucht.</translation>
+    </message>
+    <message>
+        <source>The server refused a request for “%1$@” (%2$@). It is tried again.</source>
+        <translation>Der Server hat eine Anfrage nach „%1$@“ abgelehnt (%2$@). Es wird wieder versucht.</translation>
+    </message>
+    <message>
+        <source>The server sends “%1$@” in an encoding that was not asked for.</source>
+        <translation>Der Server sendet „%1$@“ in einer Kodierung, nach der nicht gefragt war.</translation>
+    </message>
+    <message>
+        <source>What the server sent of “%1$@” does not have the checksum that the server gives. It is tried again.</source>
+        <translation>Was der Server von „%1$@“ gesendet hat, hat nicht die Prüfsumme, die er nennt. Es wird wieder versucht.</translation>
+    </message>
+    <message>
+        <source>What is at “%1$@” now is not what this account was linked with. Nothing is changed until it is back.</source>
+        <translation>Was jetzt unter „%1$@“ liegt, ist nicht das, womit dieses Konto verbunden wurde. Nichts wird geändert, bis es wieder da ist.</translation>
+    </message>
+    <message>
+        <source>The name is too long for the server.</source>
+        <translation>Der Name ist zu lang für den Server.</translation>
+    </message>
+    <message>
+        <source>The server answers for “%1$@”, and not as a WebDAV server does. Check the address: it is that of a folder, and often longer than that of the site.</source>
+        <translation>Der Server antwortet für „%1$@“, aber nicht wie ein WebDAV-Server. Prüfen Sie die Adresse: Sie ist die eines Ordners und oft länger als die der Site.</translation>
+    </message>
+    <message>
+        <source>There is nothing at “%1$@” on the server. Check the address.</source>
+        <translation>Unter „%1$@“ ist auf dem Server nichts. Prüfen Sie die Adresse.</translation>
+    </message>
+    <message>
+        <source>The server does not allow the folder “%1$@” to be read.</source>
+        <translation>Der Server erlaubt nicht, den Ordner „%1$@“ zu lesen.</translation>
+    </message>
+    <message>
+        <source>The server has a fault of its own and does not answer for “%1$@”. It is tried again.</source>
+        <translation>Der Server hat einen eigenen Fehler und antwortet nicht für „%1$@“. Es wird wieder versucht.</translation>
+    </message>
 </context>
 </TS>

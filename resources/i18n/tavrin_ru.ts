@@ -1072,5 +1072,150 @@
         <source>Select All</source>
         <translation>Выбрать всё</translation>
     </message>
+    <!-- A WebDAV server -->
+    <message>
+        <source>This is not the address of a server. It begins with “https://”.</source>
+        <translation>Это не адрес сервера. Он начинается с «https://».</translation>
+    </message>
+    <message>
+        <source>The address of a WebDAV server begins with “https://” or “http://”.</source>
+        <translation>Адрес сервера WebDAV начинается с «https://» или «http://».</translation>
+    </message>
+    <message>
+        <source>Give the user and the password apart from the address.</source>
+        <translation>Укажите пользователя и пароль отдельно от адреса.</translation>
+    </message>
+    <message>
+        <source>The address of a WebDAV folder has neither a “?” nor a “#” in it.</source>
+        <translation>В адресе папки WebDAV нет ни «?», ни «#».</translation>
+    </message>
+    <message>
+        <source>The path in the address is not well-formed.</source>
+        <translation>Путь в адресе записан неверно.</translation>
+    </message>
+    <message>
+        <source>The name is not valid UTF-8, and a WebDAV server takes no other.</source>
+        <translation>Имя записано не в UTF-8, а других сервер WebDAV не принимает.</translation>
+    </message>
+    <message>
+        <source>The server does not list names that begin with a dot, so that the item would look deleted.</source>
+        <translation>Сервер не показывает имена, начинающиеся с точки: объект выглядел бы удалённым.</translation>
+    </message>
+    <message>
+        <source>The account on the server takes no changes; “%1$@” stays as it is there.</source>
+        <translation>Учётная запись на сервере не принимает изменений; «%1$@» остаётся там как есть.</translation>
+    </message>
+    <message>
+        <source>The server replaces what stands at a name without being asked to. Nothing is changed on it.</source>
+        <translation>Сервер без спроса заменяет то, что занимает имя. На нём ничего не изменяется.</translation>
+    </message>
+    <message>
+        <source>“%1$@” was changed while it was being replaced. What was there lies at “%2$@” on the server.</source>
+        <translation>«%1$@» изменился во время замены. То, что там было, лежит на сервере в «%2$@».</translation>
+    </message>
+    <message>
+        <source>The server's list of “%1$@” makes no sense. Nothing is concluded from it; it is asked again later.</source>
+        <translation>Список «%1$@» от сервера не имеет смысла. Выводов из него не делается; запрос повторится позже.</translation>
+    </message>
+    <message>
+        <source>The server's list of a folder is not whole or not well-formed. Nothing is concluded from it; it is asked again later.</source>
+        <translation>Список папки от сервера неполон или записан неверно. Выводов из него не делается; запрос повторится позже.</translation>
+    </message>
+    <message>
+        <source>Its name is not valid UTF-8.</source>
+        <translation>Его имя записано не в UTF-8.</translation>
+    </message>
+    <message>
+        <source>The server does not allow it to be read.</source>
+        <translation>Сервер не разрешает его читать.</translation>
+    </message>
+    <message>
+        <source>The server does not tell its size.</source>
+        <translation>Сервер не сообщает его размер.</translation>
+    </message>
+    <message>
+        <source>The server “%1$@” cannot be reached. Check the network and the address.</source>
+        <translation>Сервер «%1$@» недоступен. Проверьте сеть и адрес.</translation>
+    </message>
+    <message>
+        <source>The server “%1$@” cannot prove who it is: its certificate is not valid or not known here. Nothing was sent to it.</source>
+        <translation>Сервер «%1$@» не может доказать, кто он: его сертификат недействителен или здесь неизвестен. Ему ничего не отправлено.</translation>
+    </message>
+    <message>
+        <source>The server “%1$@” does not answer any more. It is tried again.</source>
+        <translation>Сервер «%1$@» больше не отвечает. Попытка будет повторена.</translation>
+    </message>
+    <message>
+        <source>The connection to the server “%1$@” broke off. It is tried again.</source>
+        <translation>Связь с сервером «%1$@» прервалась. Попытка будет повторена.</translation>
+    </message>
+    <message>
+        <source>The server does not accept the user or the password. Sign in again.</source>
+        <translation>Сервер не принимает пользователя или пароль. Войдите снова.</translation>
+    </message>
+    <message>
+        <source>The server sends on to “%1$@”, which is not followed. Sign in with that address if it is the right one.</source>
+        <translation>Сервер отсылает к «%1$@», туда программа не идёт. Войдите с этим адресом, если он верен.</translation>
+    </message>
+    <message>
+        <source>The server is busy and asks to be left alone for %1$@ seconds. Everything waits until then.</source>
+        <translation>Сервер занят и просит подождать %1$@ с. До тех пор всё ждёт.</translation>
+    </message>
+    <message>
+        <source>The server does not allow “%1$@” to be changed.</source>
+        <translation>Сервер не разрешает изменить «%1$@».</translation>
+    </message>
+    <message>
+        <source>The server does not allow “%1$@” to be read.</source>
+        <translation>Сервер не разрешает читать «%1$@».</translation>
+    </message>
+    <message>
+        <source>The server takes no file as large as “%1$@”.</source>
+        <translation>Сервер не принимает таких больших файлов, как «%1$@».</translation>
+    </message>
+    <message>
+        <source>“%1$@” is locked on the server by another program. It is tried again.</source>
+        <translation>«%1$@» заблокирован на сервере другой программой. Попытка будет повторена.</translation>
+    </message>
+    <message>
+        <source>The server does not reach what stands behind it. It is tried again.</source>
+        <translation>Сервер не достигает того, что стоит за ним. Попытка будет повторена.</translation>
+    </message>
+    <message>
+        <source>The server refused a request for “%1$@” (%2$@). It is tried again.</source>
+        <translation>Сервер отклонил запрос о «%1$@» (%2$@). Попытка будет повторена.</translation>
+    </message>
+    <message>
+        <source>The server sends “%1$@” in an encoding that was not asked for.</source>
+        <translation>Сервер присылает «%1$@» в кодировке, о которой не просили.</translation>
+    </message>
+    <message>
+        <source>What the server sent of “%1$@” does not have the checksum that the server gives. It is tried again.</source>
+        <translation>Присланное сервером содержимое «%1$@» не совпадает с его контрольной суммой. Попытка будет повторена.</translation>
+    </message>
+    <message>
+        <source>What is at “%1$@” now is not what this account was linked with. Nothing is changed until it is back.</source>
+        <translation>То, что сейчас находится по адресу «%1$@», — не то, с чем была связана эта учётная запись. Ничего не изменяется, пока оно не вернётся.</translation>
+    </message>
+    <message>
+        <source>The name is too long for the server.</source>
+        <translation>Имя слишком длинное для сервера.</translation>
+    </message>
+    <message>
+        <source>The server answers for “%1$@”, and not as a WebDAV server does. Check the address: it is that of a folder, and often longer than that of the site.</source>
+        <translation>Сервер отвечает по адресу «%1$@», но не как сервер WebDAV. Проверьте адрес: это адрес папки, и часто он длиннее адреса сайта.</translation>
+    </message>
+    <message>
+        <source>There is nothing at “%1$@” on the server. Check the address.</source>
+        <translation>По адресу «%1$@» на сервере ничего нет. Проверьте адрес.</translation>
+    </message>
+    <message>
+        <source>The server does not allow the folder “%1$@” to be read.</source>
+        <translation>Сервер не разрешает читать папку «%1$@».</translation>
+    </message>
+    <message>
+        <source>The server has a fault of its own and does not answer for “%1$@”. It is tried again.</source>
+        <translation>На сервере неполадка, и по адресу «%1$@» он не отвечает. Попытка будет повторена.</translation>
+    </message>
 </context>
 </TS>

@@ -34,8 +34,10 @@ TEST_F(Account, EachFaultOfTheFileHasWordsOfItsOwn) {
     problems.insert(problemWith(R"({"kind": "tape", "address": "/", )" + identity + "}"));
     problems.insert(problemWith(R"({"kind": "folder", "address": "a/b", )" + identity + "}"));
     problems.insert(problemWith(R"({"kind": "folder", "address": "/tmp"})"));
-    problems.insert(problemWith(R"({"kind": "webdav", "address": "https://x", )" + identity + "}"));
-    EXPECT_EQ(problems.size(), 6U);
+    problems.insert(problemWith(R"({"kind": "webdav", "address": "ftp://x", )" + identity + "}"));
+    problems.insert(
+        problemWith(R"({"kind": "webdav", "address": "https://u:p@x", )" + identity + "}"));
+    EXPECT_EQ(problems.size(), 7U);
     EXPECT_FALSE(problems.contains(""));
 }
 

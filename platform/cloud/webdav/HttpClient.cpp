@@ -1,11 +1,11 @@
 #include "platform/cloud/webdav/HttpClient.h"
 
 #include "platform/cloud/webdav/HttpErrors.h"
+#include "platform/cloud/webdav/HttpExchange.h"
 #include "platform/cloud/webdav/WebDavAddress.h"
 
 #include <algorithm>
 #include <csignal>
-#include <cstring>
 #include <curl/curl.h>
 
 namespace platform {
@@ -19,14 +19,6 @@ constexpr long curlPieceSize = 512L * 1024;
 constexpr int redirectsAtMost = 5;
 /// Longer than that nobody is left alone on a server's word.
 constexpr std::int64_t longestWait = 3600;
-
-template<auto close>
-struct Closer {
-    template<class Handle>
-    void operator()(Handle* handle) const {
-        close(handle);
-    }
-};
 
 void prepareLibrary() {
     static const bool once = [] {
@@ -48,108 +40,8 @@ bool changesNothing(const std::string& method) {
 } // namespace
 
 struct HttpClient::Lane {
-    std::unique_ptr<CURLM, Closer<&curl_multi_cleanup>> multi{curl_multi_init()};
-    std::unique_ptr<CURL, Closer<&curl_easy_cleanup>> easy{curl_easy_init()};
-};
-
-/// One request on its way.
-struct HttpClient::Exchange {
-    const HttpRequest& request;
-    CancelFlag& cancel;
-    HttpReply reply = {};
-    Failure failure = {};
-    std::uint64_t sent = 0;
-    std::unique_ptr<curl_slist, Closer<&curl_slist_free_all>> headers = nullptr;
-    std::optional<WebDavCredentials> credentials = {};
-    char detail[CURL_ERROR_SIZE] = {};
-
-    bool stop(Failure why) {
-        if (!failure)
-            failure = why ? std::move(why) : Failure(makeError(ErrorCode::userCancelled));
-        return false;
-    }
-
-    static std::size_t onHeader(char* data, std::size_t, std::size_t size, void* user) {
-        auto* const self = static_cast<Exchange*>(user);
-        std::string_view line(data, size);
-        while (!line.empty() && (line.back() == '\r' || line.back() == '\n'))
-            line.remove_suffix(1);
-        if (line.starts_with("HTTP/")) { // also after a 100, or a first answer of 401
-            self->reply = {};
-            const std::size_t blank = line.find(' ');
-            if (blank != std::string_view::npos)
-                self->reply.status = std::atoi(std::string(line.substr(blank + 1, 3)).c_str());
-        } else if (const std::size_t colon = line.find(':'); colon != std::string_view::npos) {
-            std::string name(line.substr(0, colon));
-            std::transform(name.begin(), name.end(), name.begin(), [](char c) {
-                return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c;
-            });
-            const std::size_t begin = line.find_first_not_of(" \t", colon + 1);
-            self->reply.headers.emplace_back(
-                std::move(name),
-                begin == std::string_view::npos ? std::string_view() : line.substr(begin));
-        }
-        return size;
-    }
-
-    static std::size_t onBody(char* data, std::size_t, std::size_t size, void* user) {
-        auto* const self = static_cast<Exchange*>(user);
-        if (self->cancel.isCancelled()) {
-            self->stop({});
-            return 0;
-        }
-        if (!self->reply.isGood() || !self->request.onBody)
-            return size;
-        if (Failure failure = self->request.onBody(
-                self->reply, {reinterpret_cast<const std::byte*>(data), size})) {
-            self->stop(std::move(failure));
-            return 0;
-        }
-        return size;
-    }
-
-    static std::size_t onRead(char* buffer, std::size_t, std::size_t size, void* user) {
-        auto* const self = static_cast<Exchange*>(user);
-        const HttpUpload& upload = *self->request.upload;
-        if (self->cancel.isCancelled()) {
-            self->stop({});
-            return CURL_READFUNC_ABORT;
-        }
-        const std::uint64_t left = upload.size - self->sent;
-        const Result<std::size_t> got =
-            left == 0 ? Result<std::size_t>(std::size_t{0})
-                      : upload.read(self->sent, {reinterpret_cast<std::byte*>(buffer),
-                                                 static_cast<std::size_t>(
-                                                     std::min<std::uint64_t>(size, left))});
-        Failure failure = got ? Failure() : Failure(got.error());
-        if (!failure && *got == 0 && left > 0)
-            failure = makeError(ErrorCode::changedWhileRead);
-        if (!failure) {
-            self->sent += *got;
-            // Before the last bytes leave: what the content is has to hold to its end.
-            if (self->sent == upload.size && left > 0)
-                failure = self->checkEnd();
-        }
-        if (!failure)
-            return *got;
-        self->stop(std::move(failure));
-        return CURL_READFUNC_ABORT;
-    }
-
-    Failure checkEnd() const {
-        std::byte more{};
-        const Result<std::size_t> got = request.upload->read(request.upload->size, {&more, 1});
-        if (!got)
-            return got.error();
-        return *got == 0 ? Failure() : Failure(makeError(ErrorCode::changedWhileRead));
-    }
-
-    static int onSeek(void* user, curl_off_t offset, int origin) {
-        if (origin != SEEK_SET)
-            return CURL_SEEKFUNC_CANTSEEK;
-        static_cast<Exchange*>(user)->sent = static_cast<std::uint64_t>(offset);
-        return CURL_SEEKFUNC_OK;
-    }
+    std::unique_ptr<CURLM, CurlCloser<&curl_multi_cleanup>> multi{curl_multi_init()};
+    std::unique_ptr<CURL, CurlCloser<&curl_easy_cleanup>> easy{curl_easy_init()};
 };
 
 HttpClient::HttpClient(HttpOptions options, Clock& clock)
@@ -178,7 +70,7 @@ void HttpClient::giveBack(std::unique_ptr<Lane> lane) {
 
 // The handle is not reset between requests: it knows the server's challenge, and every option that
 // differs from request to request is set each time.
-void HttpClient::prepare(Lane& lane, Exchange& exchange) {
+void HttpClient::prepare(Lane& lane, HttpExchange& exchange) {
     CURL* const easy = lane.easy.get();
     const HttpRequest& request = exchange.request;
     const auto set = [easy](CURLoption option, auto value) { curl_easy_setopt(easy, option, value); };
@@ -197,13 +89,13 @@ void HttpClient::prepare(Lane& lane, Exchange& exchange) {
     if (!options_.authorities.empty()) // beside the system's, which stay in their folder
         set(CURLOPT_CAINFO, options_.authorities.c_str());
     set(CURLOPT_ERRORBUFFER, exchange.detail);
-    set(CURLOPT_HEADERFUNCTION, &Exchange::onHeader);
+    set(CURLOPT_HEADERFUNCTION, &HttpExchange::onHeader);
     set(CURLOPT_HEADERDATA, &exchange);
-    set(CURLOPT_WRITEFUNCTION, &Exchange::onBody);
+    set(CURLOPT_WRITEFUNCTION, &HttpExchange::onBody);
     set(CURLOPT_WRITEDATA, &exchange);
-    set(CURLOPT_READFUNCTION, &Exchange::onRead);
+    set(CURLOPT_READFUNCTION, &HttpExchange::onRead);
     set(CURLOPT_READDATA, &exchange);
-    set(CURLOPT_SEEKFUNCTION, &Exchange::onSeek);
+    set(CURLOPT_SEEKFUNCTION, &HttpExchange::onSeek);
     set(CURLOPT_SEEKDATA, &exchange);
 
     set(CURLOPT_UPLOAD, 0L);
@@ -238,8 +130,9 @@ void HttpClient::prepare(Lane& lane, Exchange& exchange) {
     set(CURLOPT_PASSWORD, who ? who->password.c_str() : nullptr);
 }
 
-HttpResult HttpClient::once(const HttpRequest& request, CancelFlag& cancel) {
-    Exchange exchange{request, cancel};
+HttpResult HttpClient::once(const HttpRequest& request,
+                            std::optional<WebDavCredentials>& who, CancelFlag& cancel) {
+    HttpExchange exchange{request, cancel};
     if (request.upload && request.upload->size == 0)
         if (Failure failure = exchange.checkEnd())
             return {HttpTrouble::caller, std::move(failure), {}};
@@ -281,9 +174,7 @@ HttpResult HttpClient::once(const HttpRequest& request, CancelFlag& cancel) {
         else if (digest)
             schemes_ = CURLAUTH_DIGEST;
     }
-    if (exchange.reply.status == 401)
-        return renewCredentials(exchange.credentials) ? HttpResult{{}, {}, exchange.reply}
-                                                      : passwordResult();
+    who = std::move(exchange.credentials);
     return {{}, {}, std::move(exchange.reply)};
 }
 
@@ -295,15 +186,16 @@ HttpResult HttpClient::perform(const HttpRequest& request, CancelFlag& cancel) {
             return {HttpTrouble::caller, makeError(ErrorCode::userCancelled), {}};
         if (std::optional<HttpResult> waiting = mustWait())
             return std::move(*waiting);
-        HttpResult result = once(sent, cancel);
+        std::optional<WebDavCredentials> who;
+        HttpResult result = once(sent, who, cancel);
         if (!result.ok())
             return result;
         const HttpReply& reply = result.reply;
         noteReply(reply);
         if (reply.status == 401) {
-            if (again) {
+            if (again || !renewCredentials(who)) {
                 const std::lock_guard lock(asking_);
-                asked_ = false;
+                asked_ = false; // the next request asks anew: somebody may have signed in by then
                 return passwordResult();
             }
             again = true;
@@ -354,10 +246,8 @@ bool HttpClient::renewCredentials(const std::optional<WebDavCredentials>& refuse
     if (!options_.credentials)
         return false;
     std::optional<WebDavCredentials> fresh = options_.credentials(true);
-    if (!fresh) {
-        asked_ = false; // the next request asks anew: somebody may have signed in by then
+    if (!fresh)
         return false;
-    }
     credentials_ = std::move(fresh);
     return true;
 }

@@ -13,6 +13,8 @@
 
 namespace platform {
 
+struct HttpExchange;
+
 struct WebDavCredentials {
     std::string user;
     std::string password;
@@ -58,11 +60,12 @@ public:
 
 private:
     struct Lane;
-    struct Exchange;
     std::unique_ptr<Lane> borrow();
     void giveBack(std::unique_ptr<Lane> lane);
-    HttpResult once(const HttpRequest& request, CancelFlag& cancel);
-    void prepare(Lane& lane, Exchange& exchange);
+    /// `who` becomes those that were sent along.
+    HttpResult once(const HttpRequest& request, std::optional<WebDavCredentials>& who,
+                    CancelFlag& cancel);
+    void prepare(Lane& lane, HttpExchange& exchange);
     std::optional<WebDavCredentials> credentials();
     /// After a 401 for those; false when there are no others.
     bool renewCredentials(const std::optional<WebDavCredentials>& refused);

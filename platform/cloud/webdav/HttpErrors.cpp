@@ -59,6 +59,12 @@ HttpResult brokenResult(int code, const std::string& detail, const std::string& 
                                         "is not valid or not known here. Nothing was sent to it.",
                                         server),
                         detail);
+    case CURLE_OPERATION_TIMEDOUT:
+        return troubledResult(HttpTrouble::stalled, ErrorCode::timedOut,
+                              localizedFormat("The server “%1$@” does not answer any more. It is "
+                                              "tried again.",
+                                              server),
+                              detail);
     default:
         return troubledResult(HttpTrouble::broken, ErrorCode::timedOut,
                         localizedFormat("The connection to the server “%1$@” broke off. It is "
@@ -92,11 +98,13 @@ Error errorOfStatus(const HttpReply& reply, std::string_view method, std::string
     const bool change = isChange(method);
     switch (reply.status) {
     case 403:
-        return refusedByServer(reply, change ? ErrorCode::writeNoPermission : ErrorCode::readNoPermission,
-                       localizedFormat(change
-                                           ? "The server does not allow “%1$@” to be changed."
-                                           : "The server does not allow “%1$@” to be read.",
-                                       name));
+        if (change)
+            return refusedByServer(
+                reply, ErrorCode::writeNoPermission,
+                localizedFormat("The server does not allow “%1$@” to be changed.", name));
+        return refusedByServer(
+            reply, ErrorCode::readNoPermission,
+            localizedFormat("The server does not allow “%1$@” to be read.", name));
     case 404:
     case 410:
         return makeError(ErrorCode::noSuchItem, name);

@@ -59,8 +59,10 @@ enum class HttpTrouble {
     /// No connection came about: the server has not seen the request.
     unreachable,
     certificate,
-    /// The connection broke or nothing came any more: what was asked may have been done.
+    /// The connection broke: what was asked may have been done.
     broken,
+    /// Nothing came any more, and it was given up: the same.
+    stalled,
     password,
     /// The server asked to wait, and did nothing.
     wait,
@@ -75,6 +77,10 @@ struct HttpResult {
     HttpReply reply = {};
     bool ok() const { return trouble == HttpTrouble::none; }
     bool isGood() const { return ok() && reply.isGood(); }
+    /// What was asked may have been done, or not.
+    bool isOpen() const {
+        return trouble == HttpTrouble::broken || trouble == HttpTrouble::stalled;
+    }
     /// A change was made, whole: a 207 tells of parts that were not, a 202 of what is not yet.
     bool isMade() const { return isGood() && reply.status != 207 && reply.status != 202; }
 };

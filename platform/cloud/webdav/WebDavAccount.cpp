@@ -22,6 +22,7 @@ WebDavProblem signInProblemOf(const HttpResult& result, bool isFolder) {
         return WebDavProblem::password;
     case HttpTrouble::unreachable:
     case HttpTrouble::broken:
+    case HttpTrouble::stalled:
         return WebDavProblem::unreachable;
     case HttpTrouble::wait:
     case HttpTrouble::elsewhere:

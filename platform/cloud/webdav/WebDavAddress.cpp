@@ -21,8 +21,8 @@ std::string partOf(CURLU* url, CURLUPart part) {
     return copy;
 }
 
-Error badAddress(const char* words) {
-    return makeErrorWithText(ErrorCode::invalidArgument, localized(words));
+Error badAddress(std::string words) {
+    return makeErrorWithText(ErrorCode::invalidArgument, std::move(words));
 }
 
 } // namespace
@@ -30,19 +30,22 @@ Error badAddress(const char* words) {
 Result<WebDavAddress> WebDavAddress::parse(std::string_view text) {
     const UrlHandle url(curl_url(), &curl_url_cleanup);
     if (curl_url_set(url.get(), CURLUPART_URL, std::string(text).c_str(), 0) != CURLUE_OK)
-        return badAddress("This is not the address of a server. It begins with “https://”.");
+        return badAddress(
+            localized("This is not the address of a server. It begins with “https://”."));
     const std::string scheme = partOf(url.get(), CURLUPART_SCHEME);
     if (scheme != "https" && scheme != "http")
-        return badAddress("The address of a WebDAV server begins with “https://” or “http://”.");
+        return badAddress(
+            localized("The address of a WebDAV server begins with “https://” or “http://”."));
     if (!partOf(url.get(), CURLUPART_USER).empty() ||
         !partOf(url.get(), CURLUPART_PASSWORD).empty())
-        return badAddress("Give the user and the password apart from the address.");
+        return badAddress(localized("Give the user and the password apart from the address."));
     if (!partOf(url.get(), CURLUPART_QUERY).empty() ||
         !partOf(url.get(), CURLUPART_FRAGMENT).empty())
-        return badAddress("The address of a WebDAV folder has neither a “?” nor a “#” in it.");
+        return badAddress(
+            localized("The address of a WebDAV folder has neither a “?” nor a “#” in it."));
     const std::optional<std::string> folder = pathOfHref(partOf(url.get(), CURLUPART_PATH));
     if (!folder)
-        return badAddress("The path in the address is not well-formed.");
+        return badAddress(localized("The path in the address is not well-formed."));
     std::string origin = scheme + "://" + partOf(url.get(), CURLUPART_HOST);
     const std::string port = partOf(url.get(), CURLUPART_PORT);
     if (!port.empty() && port != (scheme == "https" ? "443" : "80"))

@@ -3,6 +3,7 @@
 #include "platform/base/Log.h"
 #include "platform/cloud/Tokens.h"
 #include "platform/cloud/webdav/DavVersion.h"
+#include "platform/cloud/webdav/HttpErrors.h"
 
 namespace platform {
 namespace {
@@ -110,6 +111,8 @@ Result<WebDavCapabilities> WebDavProbe::run(const DavItem& root) {
     if (found_.writable)
         for (const std::string& each : {file, other, moved, torn, hidden})
             server_.erase(each, false, cancel_);
+    else // what listings tell is all that there is
+        found_.etags = true;
     if (failure_)
         return *failure_;
     server_.askFor(found_.deadProperties,
@@ -123,6 +126,9 @@ bool WebDavProbe::look(const std::string& file) {
     found_.server = made.reply.header("server");
     const std::string etag(made.reply.header("etag"));
     RemoteEntry entry;
+    if (made.ok() && made.reply.status >= 500 && made.reply.status != 501 &&
+        made.reply.status != 507) // a fault of the moment, and no answer
+        failure_ = errorOfStatus(made.reply, "PUT", file);
     if (!went(made) || !made.reply.isGood() || !seen(file, entry) ||
         entry.size != firstContent.size())
         return false;
@@ -182,7 +188,7 @@ bool WebDavProbe::lookAtTorn(const std::string& file) {
     std::string text;
     const HttpResult left = server_.read(file, largestContent, text, cancel_);
     found_.tornPutsVanish = found_.tornPutsVanish && left.isGood() && text == secondContent;
-    return left.trouble == HttpTrouble::broken || went(left); // what is torn may have no end
+    return left.isOpen() || went(left); // what is torn may have no end
 }
 
 /// Some servers hide names that begin with a dot, which then look as if they had been deleted.
@@ -235,6 +241,7 @@ bool WebDavProbe::tryMoves(const std::string& file, const std::string& other,
         return false;
     found_.safeMoves = onto.reply.status == 412 && kept && stayed && away.reply.isGood() && whole;
     found_.moveKeepsVersion = before.etag == after.etag;
+    found_.moveKeepsDate = before.modified == after.modified;
     found_.deadProperties = found_.deadProperties && tags == probeTags;
     return true;
 }

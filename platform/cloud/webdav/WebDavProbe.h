@@ -30,6 +30,8 @@ struct WebDavCapabilities {
     bool safeMoves = false;
     /// A file keeps its version when it is moved.
     bool moveKeepsVersion = false;
+    /// Or its date at least.
+    bool moveKeepsDate = false;
     /// Listings tell of names that begin with a dot.
     bool showsHidden = false;
     /// A property of our own stays with a file over a change and a move.
@@ -45,6 +47,8 @@ struct WebDavCapabilities {
 
     /// A content may go to its name directly: what others see is the former one or the new one.
     bool directUploads() const { return conditionalPut && tornPutsVanish; }
+    /// There is a way to change something that replaces nothing by mistake.
+    bool takesChanges() const { return writable && (safeMoves || directUploads()); }
     std::string description() const;
 };
 

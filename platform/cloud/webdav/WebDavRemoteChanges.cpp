@@ -37,7 +37,7 @@ Failure WebDavRemote::checkChange(const Session& session, const std::string& pat
             localizedFormat("The account on the server takes no changes; “%1$@” stays as it is "
                             "there.",
                             name));
-    if (!session.can.safeMoves && !session.can.directUploads())
+    if (!session.can.takesChanges())
         return makeErrorWithText(
             ErrorCode::unsupportedOperation,
             localized("The server replaces what stands at a name without being asked to. Nothing "
@@ -60,9 +60,10 @@ bool WebDavRemote::isSame(Session& session, const std::string& place, const Remo
         return false;
     if (before.kind == ItemKind::folder)
         return now->remoteId == before.remoteId;
-    return now->size == before.size && (session.can.moveKeepsVersion
-                                            ? now->etag == before.etag
-                                            : now->modified == before.modified);
+    if (session.can.moveKeepsVersion)
+        return now->etag == before.etag;
+    return now->size == before.size &&
+           (!session.can.moveKeepsDate || now->modified == before.modified);
 }
 
 HttpResult WebDavRemote::moveSurely(Session& session, const std::string& from,
@@ -71,7 +72,7 @@ HttpResult WebDavRemote::moveSurely(Session& session, const std::string& from,
     const bool folder = item.kind == ItemKind::folder;
     HttpResult result = session.server.move(from, to, folder, cancel);
     // The answer may have got lost, and the request been sent a second time by the connection.
-    const bool open = result.trouble == HttpTrouble::broken ||
+    const bool open = result.isOpen() ||
                       (result.ok() && !result.isMade() && result.reply.status != 403);
     if (!open || !isSurelyGone(find(session, from, cancel)) || !isSame(session, to, item, cancel))
         return result;
@@ -150,7 +151,7 @@ Result<std::string> WebDavRemote::displace(Session& session, const std::string& 
                                            const RemoteEntry& expected, CancelFlag& cancel) {
     const WebDavTrash::Taken taken = session.trash.take(path, false, cancel);
     const bool open = !taken.result.isMade();
-    if (open && (taken.result.trouble != HttpTrouble::broken || !isSurelyGone(find(session, path, cancel))))
+    if (open && (!taken.result.isOpen() || !isSurelyGone(find(session, path, cancel))))
         return refusal(session, taken.result, "MOVE", path, cancel);
     if (isSame(session, taken.place, expected, cancel))
         return taken.place;
@@ -176,7 +177,7 @@ Failure WebDavRemote::removeFolder(Session& session, const std::string& path, Ca
         return makeError(ErrorCode::folderNotEmpty, nameOf(path));
     const WebDavTrash::Taken taken = session.trash.take(path, true, cancel);
     const bool open = !taken.result.isMade();
-    if (open && (taken.result.trouble != HttpTrouble::broken || !isSurelyGone(find(session, path, cancel))))
+    if (open && (!taken.result.isOpen() || !isSurelyGone(find(session, path, cancel))))
         return refusal(session, taken.result, "MOVE", path, cancel);
     const Failure unread = isEmpty(taken.place, empty);
     if (!unread && empty)

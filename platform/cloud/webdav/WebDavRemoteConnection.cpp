@@ -26,17 +26,22 @@ Error asAway(Error error) {
 }
 
 Error notThere(const HttpReply& reply, const std::string& address) {
-    const char* words = "The server answers for “%1$@”, and not as a WebDAV server does. Check the "
-                        "address: it is that of a folder, and often longer than that of the site.";
+    std::string words;
     if (reply.status == 404 || reply.status == 410)
-        words = "There is nothing at “%1$@” on the server. Check the address.";
+        words = localizedFormat("There is nothing at “%1$@” on the server. Check the address.",
+                                address);
     else if (reply.status == 403)
-        words = "The server does not allow the folder “%1$@” to be read.";
+        words = localizedFormat("The server does not allow the folder “%1$@” to be read.", address);
     else if (reply.status >= 500)
-        words = "The server has a fault of its own and does not answer for “%1$@”. It is tried "
-                "again.";
-    Error error =
-        makeErrorWithText(ErrorCode::serverNotAvailable, localizedFormat(words, address));
+        words = localizedFormat("The server has a fault of its own and does not answer for “%1$@”. "
+                                "It is tried again.",
+                                address);
+    else
+        words = localizedFormat(
+            "The server answers for “%1$@”, and not as a WebDAV server does. Check the address: it "
+            "is that of a folder, and often longer than that of the site.",
+            address);
+    Error error = makeErrorWithText(ErrorCode::serverNotAvailable, std::move(words));
     error.localizedFailureReason = "HTTP " + std::to_string(reply.status);
     return error;
 }
@@ -105,7 +110,8 @@ Result<DavItem> WebDavRemote::findRoot(Session& session, std::string& url, Cance
 Result<std::string> WebDavRemote::connect(CancelFlag& cancel) {
     const std::lock_guard one(connecting_);
     Held held = session();
-    const bool fresh = !held;
+    // One that took no changes is tried once more: it may have had a bad moment.
+    const bool fresh = !held || !held->can.takesChanges();
     if (fresh)
         held = std::make_shared<Session>(address_, options_, clock_);
     std::string url;
@@ -144,7 +150,7 @@ Result<std::string> WebDavRemote::connect(CancelFlag& cancel) {
         held->marked = !mark->empty();
         const std::lock_guard lock(mutex_);
         session_ = held;
-    } else if (held->marked && mark->empty()) {
+    } else if (mark->empty() && held->marked) {
         return away();
     }
     return mark->empty() ? "unmarked " + held->root : std::move(*mark);
@@ -204,7 +210,7 @@ Error WebDavRemote::errorOf(Session& session, const HttpResult& result, std::str
         return error;
     }
     // One item that breaks the connection each time must not keep the others waiting.
-    if (result.trouble == HttpTrouble::broken)
+    if (result.isOpen())
         return checkThere(session, cancel).value_or(*result.failure);
     return *result.failure;
 }

@@ -64,7 +64,7 @@ Result<RemoteEntry> WebDavRemote::standing(Session& session, const std::string& 
     if (!session.can.headTellsVersion || session.can.stableIds)
         return find(session, path, cancel);
     const HttpResult result = session.server.head(path, cancel);
-    if (result.trouble == HttpTrouble::broken)
+    if (result.isOpen())
         return find(session, path, cancel);
     if (!result.isGood())
         return errorOf(session, result, "HEAD", path, cancel);

@@ -69,14 +69,14 @@ Result<RemoteEntry> WebDavRemote::writeDirectly(Session& session, Upload& upload
         {version ? conditionOn(*version, session.can.weakEtags) : "If-None-Match: *"}, cancel);
     if (put.ok() && (put.reply.status == 412 || put.reply.status == 405))
         return version ? changedThere(upload.path) : makeError(ErrorCode::fileExists, nameOf(upload.path));
-    if (!put.isMade() && put.trouble != HttpTrouble::broken)
+    if (!put.isMade() && !put.isOpen())
         return refusal(session, put, "PUT", upload.path, cancel);
     Result<RemoteEntry> entry = standing(session, upload.path, cancel);
     const std::string told =
         session.can.putTellsVersion
             ? DavVersion::of(put.reply.header("etag"), 0, Date{}, Date{}).text
             : std::string();
-    if (put.trouble == HttpTrouble::broken) {
+    if (put.isOpen()) {
         // The answer got lost. What stands there tells whether it was made.
         if (!entry || !upload.isSmall() || upload.hashed != upload.content.size ||
             prove(session, {upload.path, *entry, upload.digest()}, cancel))
@@ -116,14 +116,17 @@ Result<RemoteEntry> WebDavRemote::sendHidden(Session& session, Upload& upload,
                                              const std::string& place, CancelFlag& cancel) {
     const HttpResult put =
         session.server.put(place, upload.body(upload.isSmall()), {}, cancel);
-    if (!put.isMade() && put.trouble != HttpTrouble::broken)
+    if (!put.isMade() && !put.isOpen()) {
+        session.trash.forget(place);
         return refusal(session, put, "PUT", upload.path, cancel);
+    }
     if (put.isMade() && session.can.deadProperties && !upload.content.tags.empty())
         sendTags(session, place, upload.path, upload.content.tags, cancel);
-    // Of what is large a successor could not be told by reading it once more.
-    Result<RemoteEntry> sent = upload.isSmall() ? standing(session, place, cancel)
-                                                : settled(session, place, cancel);
-    if (put.trouble == HttpTrouble::broken && (!sent || sent->size != upload.content.size))
+    // What is large is not read once more; where time alone tells versions, it is waited for.
+    const bool wait = !upload.isSmall() && !session.can.etags;
+    Result<RemoteEntry> sent =
+        wait ? settled(session, place, cancel) : standing(session, place, cancel);
+    if (put.isOpen() && (!sent || sent->size != upload.content.size))
         return refusal(session, put, "PUT", upload.path, cancel);
     if (sent && sent->size != upload.content.size)
         return makeError(ErrorCode::changedWhileRead, nameOf(upload.path));

@@ -52,17 +52,19 @@ WebDavTrash::Taken WebDavTrash::take(const std::string& path, bool isFolder, Can
     const std::string day = hiddenFolder("trash/") + dayText(server_.now()) + '/';
     Taken taken;
     for (int attempt = 0; attempt < placesTried; ++attempt) {
-        // Replaced more than once a day; or a file of the trash has the name of a folder.
-        const std::string mark = attempt == 0 ? std::string() : '~' + hexText(randomBytes(4));
+        // Replaced more than once a day; or a file of the trash has the name of a folder; or a
+        // folder's name has been made there already, for what was in it.
+        const bool plain = attempt == 0 && !isFolder;
+        const std::string mark = plain ? std::string() : '~' + hexText(randomBytes(4));
         const std::string name(cutAtCharacter(nameOf(path), 200));
         const bool flat = attempt == placesTried - 1 || path.find('/') == std::string::npos;
         taken.place = day + (flat ? std::string() : std::string(folderOf(path)) + '/') +
-                      (attempt == 0 ? std::string(nameOf(path)) : name + mark);
+                      (plain ? std::string(nameOf(path)) : name + mark);
         const std::string folder(folderOf(taken.place));
         taken.result = makeFolders(folder, cancel);
         if (taken.result.isGood())
             taken.result = server_.move(path, taken.place, isFolder, cancel);
-        if (!taken.result.ok() || taken.result.isGood())
+        if (!taken.result.ok() || taken.result.isMade())
             return taken;
         forget(folder); // it may have been emptied by another device
     }

@@ -26,6 +26,9 @@ public:
     /// A new name for a content on its way; its folder is there.
     HttpResult incoming(std::string& place, CancelFlag& cancel);
 
+    /// The folder may not be there any more, nor those above it: they are made anew.
+    void forget(const std::string& folder);
+
     /// Removes what has lain in the trash for longer than the time that is promised, and what was
     /// left on its way a day ago.
     void expire(CancelFlag& cancel);
@@ -33,7 +36,6 @@ public:
 private:
     /// Makes the folder and those above it; what is there already is fine.
     HttpResult makeFolders(const std::string& folder, CancelFlag& cancel);
-    void forget(const std::string& folder);
     void expireIn(const std::string& folder, bool days, CancelFlag& cancel);
 
     DavServer& server_;
