@@ -73,7 +73,9 @@ void HttpClient::giveBack(std::unique_ptr<Lane> lane) {
 void HttpClient::prepare(Lane& lane, HttpExchange& exchange) {
     CURL* const easy = lane.easy.get();
     const HttpRequest& request = exchange.request;
-    const auto set = [easy](CURLoption option, auto value) { curl_easy_setopt(easy, option, value); };
+    const auto set = [easy](CURLoption option, auto value) {
+        curl_easy_setopt(easy, option, value);
+    };
     set(CURLOPT_URL, request.url.c_str());
     set(CURLOPT_PROTOCOLS_STR, "http,https");
     set(CURLOPT_HTTP_VERSION, static_cast<long>(CURL_HTTP_VERSION_1_1));

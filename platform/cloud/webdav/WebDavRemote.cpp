@@ -40,7 +40,7 @@ bool hasNameTwice(const std::vector<RemoteEntry>& entries) {
 /// A listing while it arrives.
 struct ListedFolder {
     const std::string& path;
-    /// As the server names it, decoded; and in its own spelling, with a slash at the end, once seen.
+    /// As the server names it, decoded; and in its own spelling, with a slash at the end.
     std::string self;
     std::string spelled = {};
     bool sawSelf = false;

@@ -159,13 +159,14 @@ Result<std::string> WebDavRemote::connect(CancelFlag& cancel) {
 /// "" where there is none.
 Result<std::string> WebDavRemote::readMark(Session& session, CancelFlag& cancel) {
     std::string mark;
-    const HttpResult result = session.server.read(hiddenFile("root"), largestMarkFile, mark, cancel);
+    const std::string file = hiddenFile("root");
+    const HttpResult result = session.server.read(file, largestMarkFile, mark, cancel);
     if (!result.ok())
         return *result.failure;
     if (result.reply.status == 404 || result.reply.status == 409)
         return std::string();
     if (!result.reply.isGood())
-        return errorOfStatus(result.reply, "GET", hiddenFile("root"));
+        return errorOfStatus(result.reply, "GET", file);
     return mark;
 }
 

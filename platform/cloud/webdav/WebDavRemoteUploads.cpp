@@ -68,7 +68,8 @@ Result<RemoteEntry> WebDavRemote::writeDirectly(Session& session, Upload& upload
         upload.path, upload.body(upload.isSmall()),
         {version ? conditionOn(*version, session.can.weakEtags) : "If-None-Match: *"}, cancel);
     if (put.ok() && (put.reply.status == 412 || put.reply.status == 405))
-        return version ? changedThere(upload.path) : makeError(ErrorCode::fileExists, nameOf(upload.path));
+        return version ? changedThere(upload.path)
+                       : makeError(ErrorCode::fileExists, nameOf(upload.path));
     if (!put.isMade() && !put.isOpen())
         return refusal(session, put, "PUT", upload.path, cancel);
     Result<RemoteEntry> entry = standing(session, upload.path, cancel);
@@ -146,7 +147,7 @@ Result<RemoteEntry> WebDavRemote::writeInSteps(Session& session, Upload& upload,
     std::string place;
     const HttpResult folder = session.trash.incoming(place, cancel);
     if (!folder.isGood())
-        return refusal(session, folder, "MKCOL", place, cancel);
+        return refusal(session, folder, "MKCOL", upload.path, cancel);
     const Result<RemoteEntry> sent = sendHidden(session, upload, place, cancel);
     Failure failure = sent ? Failure() : Failure(sent.error());
     if (!failure && before) {
@@ -204,7 +205,9 @@ Failure WebDavRemote::prove(Session& session, const Unproven& content, CancelFla
         cancel);
     if (!result.isGood())
         return errorOf(session, result, "GET", content.path, cancel);
-    return other || hash.finish() != content.hash ? Failure(changedThere(content.path)) : std::nullopt;
+    if (other || hash.finish() != content.hash)
+        return changedThere(content.path);
+    return std::nullopt;
 }
 
 void WebDavRemote::renameUnproven(const std::string& from, const std::string& to) {

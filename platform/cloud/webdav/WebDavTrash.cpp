@@ -61,7 +61,10 @@ WebDavTrash::Taken WebDavTrash::take(const std::string& path, bool isFolder, Can
         taken.place = day + (flat ? std::string() : std::string(folderOf(path)) + '/') +
                       (plain ? std::string(nameOf(path)) : name + mark);
         const std::string folder(folderOf(taken.place));
-        taken.result = makeFolders(folder, cancel);
+        {
+            const std::lock_guard one(making_);
+            taken.result = makeFolders(folder, cancel);
+        }
         if (taken.result.isGood())
             taken.result = server_.move(path, taken.place, isFolder, cancel);
         if (!taken.result.ok() || taken.result.isMade())
@@ -74,6 +77,7 @@ WebDavTrash::Taken WebDavTrash::take(const std::string& path, bool isFolder, Can
 HttpResult WebDavTrash::incoming(std::string& place, CancelFlag& cancel) {
     const std::string folder = hiddenFolder("incoming");
     place = folder + '/' + hexText(randomBytes(12));
+    const std::lock_guard one(making_);
     return makeFolders(folder, cancel);
 }
 

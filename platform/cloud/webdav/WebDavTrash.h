@@ -39,6 +39,7 @@ private:
     void expireIn(const std::string& folder, bool days, CancelFlag& cancel);
 
     DavServer& server_;
+    std::mutex making_; // some servers refuse the same folder to several at once
     std::mutex mutex_;
     std::set<std::string> made_; // guarded by mutex_
 };
