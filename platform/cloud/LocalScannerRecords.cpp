@@ -122,6 +122,11 @@ Failure LocalScanner::clearPlace(Found& found, ItemId other) {
     }
     database.removeLocal(other); // its place is another's
     database.setItemPlace(other, std::nullopt);
+    // Whoever puts something where a promise was need not know of it, and records of yesterday do
+    // not know what came after it: neither is a deletion.
+    if ((before && before->local && before->local->promise) ||
+        !database.meta(restoredKey).empty())
+        database.removeBase(other);
     return std::nullopt;
 }
 

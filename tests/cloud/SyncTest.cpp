@@ -301,6 +301,16 @@ TEST_F(Sync, RecordsOfYesterdayDeleteNothing) {
     EXPECT_TRUE(isPromised("A/two"));
 }
 
+TEST_F(Sync, AStrangePromiseInThePlaceOfAnotherIsNoDeletionOfIt) {
+    givenSynced({});
+    const std::optional<FoundSidecar> own = sidecar("Rest/3");
+    ASSERT_EQ(disk->setMark(own->path, encodedMark({own->mark.store, own->mark.item + 1'000'000, {}})),
+              std::nullopt);
+    synced();
+    EXPECT_EQ(remoteContent("Rest/3"), "rest");
+    EXPECT_TRUE(isPromised("Rest/3"));
+}
+
 TEST_F(Sync, TwoPopulatedSidesAreMerged) {
     givenRemote("A/same", "same");
     givenRemote("A/other", "theirs");
