@@ -26,6 +26,7 @@
 #include <functional>
 #include <future>
 #include <string>
+#include <sys/resource.h>
 #include <sys/stat.h>
 #include <sys/xattr.h>
 #include <unistd.h>
@@ -39,6 +40,7 @@ namespace fs = std::filesystem;
 constexpr int rounds = 3;
 constexpr int folders = 100;
 constexpr int filesInFolder = 1000;
+constexpr int idleSeconds = 20;
 constexpr std::uint64_t largeFile = 1ULL << 30;
 
 double secondsOf(const std::function<void()>& work) {
@@ -90,6 +92,17 @@ public:
         if (done.get_future().get())
             std::abort();
     }
+    /// The signing-in has set the listing going.
+    void waitUntilListed() {
+        while (!cloud_->status())
+            usleep(1000);
+        const auto reader = StateReader::open(cloud_->status()->folder + "/state.db");
+        while (!(*reader)->ask([](StateQueries& queries) {
+            return queries.scan(rootItem, Side::remote).complete &&
+                   queries.unfinishedScans(Side::remote).empty();
+        }))
+            usleep(5000);
+    }
     void sync() {
         std::promise<Failure> done;
         cloud_->sync([&](const Failure& failure) { done.set_value(failure); });
@@ -112,22 +125,30 @@ private:
     std::unique_ptr<CloudService> cloud_;
 };
 
-/// Both sides make new files only: inodes that were just freed make the disk slow for a while.
-void listing(const std::string& base) {
-    const std::string remote = base + "/many";
+void makeMany(const std::string& remote) {
     for (int folder = 0; folder < folders; ++folder) {
         const std::string path = remote + "/Library/Folder " + std::to_string(folder);
         fs::create_directories(path);
         for (int i = 0; i < filesInFolder; ++i)
             std::ofstream(path + "/Document " + std::to_string(i) + ".pdf");
     }
+}
+
+/// Both sides make new files only: inodes that were just freed make the disk slow for a while.
+void listing(const std::string& base) {
+    const std::string remote = base + "/many";
+    makeMany(remote);
     std::vector<double> ours;
     std::vector<double> copies;
     for (int round = 0; round < rounds; ++round) {
         const std::string number = std::to_string(round);
         copies.push_back(
             secondsOf([&] { run("cp -r " + remote + ' ' + base + "/copy" + number); }));
-        ours.push_back(secondsOf([&] { Service(base + "/home" + number, remote).readAll(); }));
+        std::optional<Service> service;
+        ours.push_back(secondsOf([&] {
+            service.emplace(base + "/home" + number, remote);
+            service->waitUntilListed();
+        }));
     }
     report("first listing, 100,000", ours, "cp -r", copies);
 }
@@ -194,40 +215,71 @@ void uploads(const std::string& base) {
     report("upload, 10,000 of 4 KiB", ours, "cp -r and sync", copies);
 }
 
-/// From a save here until the account has it, with nobody asking for it.
+double millisecondsUntil(const std::function<bool()>& holds) {
+    return 1000 * secondsOf([&] {
+        while (!holds())
+            usleep(500);
+    });
+}
+
+double processorSeconds() {
+    rusage used{};
+    getrusage(RUSAGE_SELF, &used);
+    const auto seconds = [](const timeval& time) {
+        return static_cast<double>(time.tv_sec) + static_cast<double>(time.tv_usec) / 1e6;
+    };
+    return seconds(used.ru_utime) + seconds(used.ru_stime);
+}
+
+/// In a store of 100,000: from a change here until it is known, and until the account has it, with
+/// nobody asking for it; and what the engine uses while nothing happens.
 void notice(const std::string& base) {
     const std::string remote = base + "/notice";
-    fs::create_directories(remote + "/Library");
+    makeMany(remote);
     Service service(base + "/notice-home", remote);
     service.sync();
-    service.sync();
-    std::vector<double> young;
-    std::vector<double> old;
-    for (int round = 0; round < rounds; ++round)
-        for (const bool fresh : {true, false}) {
-            const std::string name = "/Library/" + std::to_string(round) + (fresh ? "f" : "o");
-            const std::string path = service.url(name.substr(1)).path();
-            (fresh ? young : old).push_back(secondsOf([&] {
-                if (fresh)
-                    std::ofstream(path) << "content";
-                else
-                    writeOld(path, "content");
-                while (!fs::exists(remote + name)) {
-                }
-            }));
-        }
-    report("saved here, on the remote", young, "of a file not written now", old);
+    const auto reader = StateReader::open(service.cloud().status()->folder + "/state.db");
+    if (!reader)
+        std::abort();
+    sleep(5); // what the start has set going comes to its end
+    const double before = processorSeconds();
+    sleep(idleSeconds);
+    std::printf("idle for %d s: %.0f ms of processor time\n", idleSeconds,
+                1000 * (processorSeconds() - before));
+    std::vector<double> known;
+    std::vector<double> sent;
+    std::vector<double> fresh;
+    std::vector<double> removed;
+    for (int round = 0; round < 5 * rounds; ++round) {
+        const std::string name = "Library/Folder 7/" + std::to_string(round);
+        const std::string path = service.url(name).path();
+        writeOld(path, "content");
+        known.push_back(millisecondsUntil([&] {
+            return (*reader)->ask([&](StateQueries& queries) {
+                return queries.itemAtPath(name).has_value();
+            });
+        }));
+        sent.push_back(known.back() +
+                       millisecondsUntil([&] { return fs::exists(remote + '/' + name); }));
+        std::ofstream(path + 'f') << "content";
+        fresh.push_back(
+            millisecondsUntil([&] { return fs::exists(remote + '/' + name + 'f'); }));
+        fs::remove(path);
+        removed.push_back(
+            millisecondsUntil([&] { return !fs::exists(remote + '/' + name); }));
+    }
+    for (const auto& [what, figures] :
+         {std::pair("known after", &known), {"sent after", &sent},
+          {"sent, written just now", &fresh}, {"deletion sent after", &removed}})
+        std::printf("%-28s %8.0f ms   worst %8.0f ms\n", what, median(*figures),
+                    *std::max_element(figures->begin(), figures->end()));
+    std::fflush(stdout);
 }
 
 /// A whole look at both sides that finds nothing; and what of it is finding out what to do.
 void unchanged(const std::string& base) {
     const std::string remote = base + "/same";
-    for (int folder = 0; folder < folders; ++folder) {
-        const std::string path = remote + "/Library/Folder " + std::to_string(folder);
-        fs::create_directories(path);
-        for (int i = 0; i < filesInFolder; ++i)
-            std::ofstream(path + "/Document " + std::to_string(i) + ".pdf");
-    }
+    makeMany(remote);
     Service service(base + "/same-home", remote);
     service.sync();
     const auto reader = StateReader::open(service.cloud().status()->folder + "/state.db");

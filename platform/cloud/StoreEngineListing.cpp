@@ -87,6 +87,7 @@ Failure StoreEngine::followRemote() {
     if (cancel_.isCancelled()) // stopped: there may be no store any more
         return makeError(ErrorCode::userCancelled);
     Failure failure = connect();
+    bool allListed = false;
     if (!failure) {
         std::vector<ItemId> unfinished;
         queue_->sync([&] {
@@ -96,6 +97,8 @@ Failure StoreEngine::followRemote() {
         exchangeValues();
         if (!unfinished.empty())
             failure = list(unfinished, false);
+        // From the root on nothing was known: all of it was read a moment ago.
+        allListed = std::find(unfinished.begin(), unfinished.end(), rootItem) != unfinished.end();
     }
     if (!failure || !concernsWholeStore(*failure)) {
         const std::lock_guard lock(mutex_);
@@ -107,11 +110,13 @@ Failure StoreEngine::followRemote() {
             backoff_.reset();
         }
         if (!std::exchange(followed_, true))
-            want({false, true, {}, true, false});
+            want({false, true, {}, !allListed, false});
         return std::nullopt;
     }
     if (failure->is(ErrorCode::userCancelled))
         return failure;
+    if (failure->is(ErrorCode::serverNotAvailable))
+        followed_ = false; // what happens there until it is back is heard of by nobody
     platformLog(LogLevel::warning, "cloud: cannot read the account: %@", *failure);
     retryLater([](StoreEngine& engine) {
         engine.listing_->async([&engine] { engine.setProblem(engine.followRemote()); });
