@@ -304,8 +304,8 @@ TEST_F(Sync, RecordsOfYesterdayDeleteNothing) {
 TEST_F(Sync, AStrangePromiseInThePlaceOfAnotherIsNoDeletionOfIt) {
     givenSynced({});
     const std::optional<FoundSidecar> own = sidecar("Rest/3");
-    ASSERT_EQ(disk->setMark(own->path, encodedMark({own->mark.store, own->mark.item + 1'000'000, {}})),
-              std::nullopt);
+    const SidecarMark strange{own->mark.store, own->mark.item + 1'000'000, {}};
+    ASSERT_EQ(disk->setMark(own->path, encodedMark(strange)), std::nullopt);
     synced();
     EXPECT_EQ(remoteContent("Rest/3"), "rest");
     EXPECT_TRUE(isPromised("Rest/3"));
