@@ -239,13 +239,13 @@ RemoteRow SyncExecutor::rowOf(const Place& place, const RemoteEntry& entry,
             entry.role,     entry.tags,    before.remote ? before.remote->generation : 1};
 }
 
-void SyncExecutor::agreeLater(ItemId item, BaseRow base) {
+void SyncExecutor::agreeLater(ItemId item, BaseRow base, std::optional<RemoteRow> remote) {
     const std::lock_guard lock(mutex_);
-    agreements_.emplace_back(item, std::move(base));
+    agreements_.push_back({item, std::move(base), std::move(remote)});
 }
 
 Failure SyncExecutor::flush(CancelFlag& cancel) {
-    std::vector<std::pair<ItemId, BaseRow>> agreements;
+    std::vector<Agreement> agreements;
     {
         const std::lock_guard lock(mutex_);
         agreements.swap(agreements_);
@@ -259,9 +259,12 @@ Failure SyncExecutor::flush(CancelFlag& cancel) {
     Failure failure;
     context_.queue.sync([&] {
         failure = context_.database.transaction([&]() -> Failure {
-            for (const auto& [item, base] : agreements)
-                if (context_.database.state(item))
+            for (const auto& [item, base, remote] : agreements)
+                if (context_.database.state(item)) {
+                    if (remote)
+                        context_.database.putRemote(item, *remote);
                     context_.database.putBase(item, base);
+                }
             return std::nullopt;
         });
     });

@@ -116,8 +116,14 @@ private:
 
     std::optional<std::string> remotePlace(const Place& place);
     RemoteRow rowOf(const Place& place, const RemoteEntry& entry, const ItemState& before) const;
+    struct Agreement {
+        ItemId item = 0;
+        BaseRow base;
+        /// What the remote has since; where no other step needs to know it sooner.
+        std::optional<RemoteRow> remote;
+    };
     /// Once the effect is surely on both disks.
-    void agreeLater(ItemId item, BaseRow base);
+    void agreeLater(ItemId item, BaseRow base, std::optional<RemoteRow> remote = {});
     Failure flush(CancelFlag& cancel);
 
     StoreContext& context_;
@@ -125,7 +131,7 @@ private:
     RateLimiter& limiter_;
     std::mutex mutex_;
     Outcome outcome_; // guarded by mutex_, as are the next three
-    std::vector<std::pair<ItemId, BaseRow>> agreements_;
+    std::vector<Agreement> agreements_;
     std::set<CancelFlag*> running_;
     bool cancelled_ = false;
 };
