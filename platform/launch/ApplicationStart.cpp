@@ -64,7 +64,7 @@ Error cannotStart(const std::string& name, const Error& cause) {
 
 } // namespace
 
-Failure ApplicationStart::open(const DesktopEntry& entry, const std::optional<Url>& document,
+Failure ApplicationStart::open(const DesktopEntry& entry, const std::optional<ExecTarget>& document,
                                EndedAtOnce endedAtOnce) {
     std::vector<std::string> arguments;
     if (entry.needsTerminal)

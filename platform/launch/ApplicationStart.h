@@ -3,6 +3,7 @@
 #include "platform/base/Result.h"
 #include "platform/base/Url.h"
 #include "platform/launch/DesktopEntry.h"
+#include "platform/launch/ExecLine.h"
 
 #include <functional>
 #include <optional>
@@ -19,7 +20,7 @@ public:
     using EndedAtOnce = std::function<void(const Error& error)>;
 
     /// The application with the document (a file, or an address of a scheme that it handles).
-    static Failure open(const DesktopEntry& entry, const std::optional<Url>& document,
+    static Failure open(const DesktopEntry& entry, const std::optional<ExecTarget>& document,
                         EndedAtOnce endedAtOnce);
     /// A program by its arguments; `name` is what the user knows it by.
     static Failure run(std::vector<std::string> arguments, const std::string& name,

@@ -83,7 +83,8 @@ bool fieldsAreKnown(std::string_view word) {
 }
 
 /// What stands for one field inside a word.
-std::string fieldText(char field, const DesktopEntry& entry, const std::optional<Url>& document) {
+std::string fieldText(char field, const DesktopEntry& entry,
+                      const std::optional<ExecTarget>& document) {
     switch (field) {
     case '%':
         return "%";
@@ -93,17 +94,17 @@ std::string fieldText(char field, const DesktopEntry& entry, const std::optional
         return entry.path;
     case 'f':
     case 'F':
-        return document ? document->path() : "";
+        return document ? document->path : "";
     case 'u':
     case 'U':
-        return document ? document->absoluteString() : "";
+        return document ? document->address : "";
     default:
         return {};
     }
 }
 
 std::string filled(const std::string& word, const DesktopEntry& entry,
-                   const std::optional<Url>& document) {
+                   const std::optional<ExecTarget>& document) {
     std::string out;
     for (std::size_t i = 0; i < word.size(); ++i) {
         if (word[i] == '%')
@@ -136,7 +137,7 @@ bool ExecLine::takesDocument() const {
 }
 
 std::vector<std::string> ExecLine::arguments(const DesktopEntry& entry,
-                                             const std::optional<Url>& document) const {
+                                             const std::optional<ExecTarget>& document) const {
     std::vector<std::string> out;
     for (const std::string& word : words_) {
         if (word == "%i") {
@@ -150,7 +151,7 @@ std::vector<std::string> ExecLine::arguments(const DesktopEntry& entry,
             out.push_back(std::move(text));
     }
     if (document && !takesDocument())
-        out.push_back(document->isFile() ? document->path() : document->absoluteString());
+        out.push_back(document->isFile ? document->path : document->address);
     return out;
 }
 

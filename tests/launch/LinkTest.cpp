@@ -36,10 +36,10 @@ TEST_F(Link, GoesToTheBrowserOfTheDesk) {
     givenProgram("browser");
     givenApplication("browser", "Browser",
                      "Exec=browser --new %u\nMimeType=x-scheme-handler/https;");
-    given("https://a.org/x?y=%20&z#end");
+    given("https://a.org/x%2Fy?z=%20&a#end");
     touch();
     EXPECT_EQ(argumentsOf("browser"),
-              (std::vector<std::string>{"--new", "https://a.org/x?y=%20&z#end"}));
+              (std::vector<std::string>{"--new", "https://a.org/x%2Fy?z=%20&a#end"}));
     EXPECT_EQ(topPresented(), nullptr);
 }
 

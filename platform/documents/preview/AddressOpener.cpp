@@ -1,7 +1,6 @@
 #include "platform/documents/preview/AddressOpener.h"
 
 #include "platform/base/Text.h"
-#include "platform/base/Url.h"
 #include "platform/documents/preview/CleanHtml.h"
 #include "platform/launch/Alerts.h"
 #include "platform/launch/ApplicationDatabase.h"
@@ -11,8 +10,7 @@ namespace platform {
 
 void openAddress(const std::string& address) {
     const QString text = QString::fromStdString(address);
-    const std::optional<Url> url = Url::parse(address);
-    if (!isOpenableAddress(text) || !url)
+    if (!isOpenableAddress(text))
         return;
     const std::string title = localizedFormat("“%1$@” could not be opened", address);
     const auto tell = [title](const Error& error) { showFailure(title, error); };
@@ -24,7 +22,7 @@ void openAddress(const std::string& address) {
                                localized("There is no application for it on this device.")));
         return;
     }
-    if (const Failure failure = ApplicationStart::open(*handler, url, tell))
+    if (const Failure failure = ApplicationStart::open(*handler, ExecTarget(address), tell))
         tell(*failure);
 }
 

@@ -79,6 +79,7 @@ public:
     void load(const Url& file) override {
         file_ = file;
         rich_->setAccessibleName(displayName(file.lastPathComponent()));
+        rich_->setFrame(frame_->bounds()); // what is read first is laid out for it
         read();
     }
 
