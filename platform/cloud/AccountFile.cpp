@@ -96,14 +96,17 @@ AccountReading readAccount(const Folders& folders) {
         return refused(localizedFormat("The account file “%1$@” cannot be read. Check its "
                                        "permissions.",
                                        file));
-    const auto* const text = reinterpret_cast<const char*>(content->data());
-    const Json object = Json::parse(text, text + content->size(), nullptr, false);
+    return accountOfText({reinterpret_cast<const char*>(content->data()), content->size()}, file);
+}
+
+AccountReading accountOfText(std::string_view text, const std::string& file) {
+    const Json object = Json::parse(text.begin(), text.end(), nullptr, false);
     if (!object.is_object())
         return refused(localizedFormat("The account file “%1$@” is damaged. Sign in again.", file));
     return accountFrom(object, file);
 }
 
-Failure writeAccount(const Folders& folders, const AccountRecord& account) {
+std::string textOfAccount(const AccountRecord& account) {
     Json object;
     object["kind"] = account.kind;
     object["address"] = account.address;
@@ -117,11 +120,14 @@ Failure writeAccount(const Folders& folders, const AccountRecord& account) {
         object["rateLimit"] = *account.rateLimit;
     if (account.quota)
         object["quota"] = *account.quota;
+    return object.dump(4, ' ', false, Json::error_handler_t::replace) + '\n';
+}
+
+Failure writeAccount(const Folders& folders, const AccountRecord& account) {
     if (Failure failure = FileManager::createDirectory(Url::file(accountFolder(folders)), true))
         return failure;
-    return FileManager::writeAtomically(
-        Url::file(accountFile(folders)),
-        object.dump(4, ' ', false, Json::error_handler_t::replace) + '\n', 0600);
+    return FileManager::writeAtomically(Url::file(accountFile(folders)), textOfAccount(account),
+                                        0600);
 }
 
 Failure removeAccount(const Folders& folders) {

@@ -47,6 +47,9 @@ std::string accountFolder(const Folders& folders);
 std::string accountFile(const Folders& folders);
 
 AccountReading readAccount(const Folders& folders);
+/// The same of a text that `file` holds.
+AccountReading accountOfText(std::string_view text, const std::string& file);
+std::string textOfAccount(const AccountRecord& account);
 /// The whole file at once, readable by the user alone.
 [[nodiscard]] Failure writeAccount(const Folders& folders, const AccountRecord& account);
 /// Success when there is none.
