@@ -27,6 +27,12 @@ public:
     /// written (see open), it is in memory alone.
     [[nodiscard]] Failure setValue(std::string_view key, Value value);
 
+    /// Something was set that the remote has not heard of.
+    bool hasUnsent() const {
+        const std::lock_guard lock(mutex_);
+        return !pending_.empty();
+    }
+
     /// From now on the file is this object's to write; what was set before goes there.
     void open();
     void close();

@@ -777,6 +777,26 @@
         <source>There is no space left in your Pelmora account. Delete something to make room.</source>
         <translation>لم تعد هناك مساحة في حسابك في Pelmora. احذف شيئًا لإفساح المجال.</translation>
     </message>
+    <message>
+        <source>The file of passwords “%1$@” is damaged. Move it away and sign in again.</source>
+        <translation>ملف كلمات المرور «&#x2068;%1$@&#x2069;» تالف. انقله إلى مكان آخر وسجّل الدخول من جديد.</translation>
+    </message>
+    <message>
+        <source>The keyring does not answer. Unlock it, or restart its service, and try again.</source>
+        <translation>لا تستجيب حلقة المفاتيح. افتح قفلها أو أعد تشغيل خدمتها ثم حاول مرة أخرى.</translation>
+    </message>
+    <message>
+        <source>The keyring refused (%1$@). Unlock it and try again.</source>
+        <translation>رفضت حلقة المفاتيح (&#x2068;%1$@&#x2069;). افتح قفلها ثم حاول مرة أخرى.</translation>
+    </message>
+    <message>
+        <source>There is no keyring on this desk that could keep the password.</source>
+        <translation>لا توجد على هذا الجهاز حلقة مفاتيح يمكنها حفظ كلمة المرور.</translation>
+    </message>
+    <message>
+        <source>The store has work in it that was interrupted. Use it once more, so that it comes to its end, and sign out then.</source>
+        <translation>في المخزن عمل لم يكتمل. استخدمه مرة أخرى حتى ينتهي ثم سجّل الخروج.</translation>
+    </message>
     <!-- The store and its documents -->
     <message>
         <source>The store has not been set up yet.</source>

@@ -749,6 +749,26 @@
         <source>There is no space left in your Pelmora account. Delete something to make room.</source>
         <translation>In Ihrem Pelmora-Konto ist kein Platz mehr. Löschen Sie etwas, um Platz zu schaffen.</translation>
     </message>
+    <message>
+        <source>The file of passwords “%1$@” is damaged. Move it away and sign in again.</source>
+        <translation>Die Datei mit den Passwörtern „%1$@“ ist beschädigt. Verschieben Sie sie und melden Sie sich erneut an.</translation>
+    </message>
+    <message>
+        <source>The keyring does not answer. Unlock it, or restart its service, and try again.</source>
+        <translation>Der Schlüsselbund antwortet nicht. Entsperren Sie ihn oder starten Sie seinen Dienst neu, und versuchen Sie es noch einmal.</translation>
+    </message>
+    <message>
+        <source>The keyring refused (%1$@). Unlock it and try again.</source>
+        <translation>Der Schlüsselbund hat abgelehnt (%1$@). Entsperren Sie ihn und versuchen Sie es noch einmal.</translation>
+    </message>
+    <message>
+        <source>There is no keyring on this desk that could keep the password.</source>
+        <translation>Hier gibt es keinen Schlüsselbund, der das Passwort aufbewahren könnte.</translation>
+    </message>
+    <message>
+        <source>The store has work in it that was interrupted. Use it once more, so that it comes to its end, and sign out then.</source>
+        <translation>Im Speicher liegt noch unterbrochene Arbeit. Benutzen Sie ihn noch einmal, damit sie zu Ende kommt, und melden Sie sich dann ab.</translation>
+    </message>
     <!-- The store and its documents -->
     <message>
         <source>The store has not been set up yet.</source>

@@ -756,6 +756,26 @@
         <source>There is no space left in your Pelmora account. Delete something to make room.</source>
         <translation>В вашей учётной записи Pelmora не осталось места. Удалите что-нибудь, чтобы освободить его.</translation>
     </message>
+    <message>
+        <source>The file of passwords “%1$@” is damaged. Move it away and sign in again.</source>
+        <translation>Файл паролей «%1$@» повреждён. Уберите его и войдите снова.</translation>
+    </message>
+    <message>
+        <source>The keyring does not answer. Unlock it, or restart its service, and try again.</source>
+        <translation>Связка ключей не отвечает. Разблокируйте её или перезапустите её службу и попробуйте ещё раз.</translation>
+    </message>
+    <message>
+        <source>The keyring refused (%1$@). Unlock it and try again.</source>
+        <translation>Связка ключей отказала (%1$@). Разблокируйте её и попробуйте ещё раз.</translation>
+    </message>
+    <message>
+        <source>There is no keyring on this desk that could keep the password.</source>
+        <translation>На этом устройстве нет связки ключей, которая могла бы хранить пароль.</translation>
+    </message>
+    <message>
+        <source>The store has work in it that was interrupted. Use it once more, so that it comes to its end, and sign out then.</source>
+        <translation>В хранилище осталась прерванная работа. Откройте его ещё раз, чтобы она завершилась, и затем выйдите.</translation>
+    </message>
     <!-- The store and its documents -->
     <message>
         <source>The store has not been set up yet.</source>
