@@ -1,7 +1,9 @@
 #include "platform/Platform.h"
 
+#include "platform/base/Identity.h"
 #include "platform/base/Process.h"
 #include "platform/cloud/AccountFile.h"
+#include "platform/cloud/AccountManager.h"
 #include "platform/cloud/CloudService.h"
 #include "platform/files/DirectoryWatcher.h"
 #include "platform/files/FileCoordinator.h"
@@ -31,6 +33,9 @@ std::string stateFolder(const Folders& folders) {
 std::string noticeFolder(const Folders& folders) {
     return (folders.runtime ? *folders.runtime + "/pelmora" : stateFolder(folders)) + "/notices";
 }
+
+/// The account's remote is watched in its place; see ReachabilityService::setWatchedRemote.
+constexpr const char* remoteStandIn = "www.pelmora.com";
 
 /// The host of an authority ("user@host:port", "[::1]:80").
 std::string hostOf(std::string_view authority) {
@@ -80,7 +85,10 @@ struct Platform::State {
             preferences = makeFilePreferences(runtime.folders.config, parts.managedSettingsFile);
         standardPreferences = std::make_unique<StandardPreferences>(*preferences);
         cloud = std::make_unique<CloudService>(CloudService::Parts{
-            *clock, main, notifications, watcher, progress, runtime.folders, false, nullptr, {}});
+            *clock, main, notifications, watcher, progress, runtime.folders, false, nullptr, {},
+            std::move(parts.secrets)});
+        accountManager =
+            std::make_unique<AccountManager>(*cloud, runtime.folders, *clock, main);
         FileCoordinator::setContentProvider(&cloud->contents());
         if (!reachability)
             reachability = makeReachability(*clock, environmentVariable("PELMORA_NETWORK"));
@@ -89,6 +97,29 @@ struct Platform::State {
         };
         accountChanged = notifications.observe(cloudIdentityDidChangeNotification, followAccount);
         followAccount({});
+        followNetwork();
+    }
+
+    ~State() {
+        if (!remoteReach)
+            return;
+        remoteReach->setCallback({});
+        remoteReach->setQueue(nullptr);
+    }
+
+    /// What nobody waits for is not transferred where the network costs.
+    void followNetwork() {
+        remoteReach = reachability->createTarget(remoteStandIn);
+        if (!remoteReach)
+            return;
+        remoteReach->setCallback([this](std::uint32_t flags) {
+            main.async([this, flags] {
+                if (cloud)
+                    cloud->setMetered((flags & reachabilityCellular) != 0);
+            });
+        });
+        remoteReach->setQueue(std::make_shared<WorkQueue>(
+            std::string(applicationIdentifier) + ".cloud.network"));
     }
 
     /// The lowest floor finds the runtime for as long as anything here lives.
@@ -114,6 +145,8 @@ struct Platform::State {
     DirectoryWatcher watcher;
     FileProgressSubscription progress;
     std::unique_ptr<CloudService> cloud;
+    std::unique_ptr<AccountManager> accountManager;
+    std::unique_ptr<ReachabilityTarget> remoteReach;
     Observation accountChanged;
 };
 
@@ -123,6 +156,7 @@ Platform::Platform(PlatformParts parts) : state_(std::make_unique<State>(std::mo
 
 Platform::~Platform() {
     FileCoordinator::setContentProvider(nullptr);
+    state_->accountManager.reset();
     state_->cloud.reset();  // what ends with it may still ask for the others
     state_->notify.reset(); // its handlers use the platform
     FileCoordinator::waitUntilIdle();
@@ -184,6 +218,10 @@ CloudService& Platform::cloud() {
 
 CloudAccountService& Platform::accounts() {
     return state_->cloud->accounts();
+}
+
+AccountManager& Platform::accountManager() {
+    return *state_->accountManager;
 }
 
 CloudDocumentService& Platform::documents() {

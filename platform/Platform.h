@@ -10,6 +10,7 @@
 
 namespace platform {
 
+class AccountManager;
 class CloudAccountService;
 class CloudDatabase;
 class CloudDocumentService;
@@ -22,6 +23,7 @@ class NetworkActivityIndicator;
 class NotifyService;
 class PreferencesStore;
 class ReachabilityService;
+class SecretStore;
 class StandardPreferences;
 
 /// What a platform is put together from. Empty slots get the real thing.
@@ -37,6 +39,7 @@ struct PlatformParts {
     std::unique_ptr<NotifyService> notify;
     std::unique_ptr<PreferencesStore> preferences;
     std::unique_ptr<ReachabilityService> reachability;
+    std::shared_ptr<SecretStore> secrets;
     /// Where an administrator's settings lie.
     std::string managedSettingsFile = "/etc/tavrin/managed-settings.json";
     /// Answers whether a file exists, for marker files outside the user's folders.
@@ -70,6 +73,7 @@ public:
     NetworkActivityIndicator& networkActivityIndicator();
     CloudService& cloud();
     CloudAccountService& accounts();
+    AccountManager& accountManager();
     CloudDocumentService& documents();
     KeyValueCloudStore& keyValueStore();
     /// The private database of the container with that identifier.

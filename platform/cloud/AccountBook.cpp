@@ -1,5 +1,6 @@
 #include "platform/cloud/AccountBook.h"
 
+#include "platform/base/Identity.h"
 #include "platform/base/Log.h"
 #include "platform/cloud/Tokens.h"
 #include "platform/files/FileManager.h"
@@ -98,6 +99,10 @@ std::string accountsFile(const Folders& folders) {
 
 std::string secretNameOf(const AccountRecord& account) {
     return hexText(account.identity);
+}
+
+std::string secretLabelOf(const AccountRecord& account) {
+    return std::string(applicationName) + ": " + account.name;
 }
 
 std::vector<AccountRecord> storedAccounts(const Folders& folders) {

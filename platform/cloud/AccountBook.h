@@ -29,6 +29,8 @@ std::optional<AccountRecord> storedAccountLike(const Folders& folders,
 
 /// What a password is kept under.
 std::string secretNameOf(const AccountRecord& account);
+/// What a keyring shows of it.
+std::string secretLabelOf(const AccountRecord& account);
 std::string accountsFile(const Folders& folders);
 
 } // namespace platform

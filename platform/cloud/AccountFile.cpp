@@ -84,14 +84,16 @@ std::string accountFile(const Folders& folders) {
     return accountFolder(folders) + "/account.json";
 }
 
+std::string nobodySignedInText() {
+    return localized("No Pelmora account is signed in. Sign in with the command “pelmora "
+                     "sign-in”.");
+}
+
 AccountReading readAccount(const Folders& folders) {
     const std::string file = accountFile(folders);
     const Result<Bytes> content = FileManager::contents(Url::file(file), largestAccountFile);
     if (!content && content.error().is(ErrorCode::noSuchItem))
-        return {std::nullopt,
-                localized("No Pelmora account is signed in. Sign in with the command “pelmora "
-                          "sign-in”."),
-                true};
+        return {std::nullopt, nobodySignedInText(), true};
     if (!content)
         return refused(localizedFormat("The account file “%1$@” cannot be read. Check its "
                                        "permissions.",

@@ -47,6 +47,8 @@ std::string accountFolder(const Folders& folders);
 std::string accountFile(const Folders& folders);
 
 AccountReading readAccount(const Folders& folders);
+/// The problem of a missing file.
+std::string nobodySignedInText();
 /// The same of a text that `file` holds.
 AccountReading accountOfText(std::string_view text, const std::string& file);
 std::string textOfAccount(const AccountRecord& account);

@@ -21,10 +21,11 @@ public:
     AccountMonitor& operator=(const AccountMonitor&) = delete;
 
     const AccountReading& reading() const { return reading_; }
+    /// Reads the file now, before a notice tells of a change.
+    void look();
 
 private:
     struct Alive;
-    void look();
     /// Watches the account folder or, while it is not there, the nearest folder above it.
     void watchNearest();
 

@@ -16,6 +16,10 @@ inline constexpr std::string_view cloudIdentityDidChangeNotification =
 inline constexpr std::string_view cloudProblemDidChangeNotification =
     "CloudProblemDidChangeNotification";
 
+/// Posted on the main thread when a transfer has begun or ended; many at once are told once.
+inline constexpr std::string_view cloudActivityDidChangeNotification =
+    "CloudActivityDidChangeNotification";
+
 /// Who is signed in: opaque, comparable, and storable as bytes.
 class IdentityToken {
 public:

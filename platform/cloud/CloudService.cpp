@@ -4,12 +4,15 @@
 #include "platform/base/NotificationCenter.h"
 #include "platform/base/Text.h"
 #include "platform/cloud/AccountMonitor.h"
+#include "platform/cloud/AccountPasswords.h"
 #include "platform/cloud/KeyValueCloudStore.h"
 #include "platform/cloud/StandardRemotes.h"
 #include "platform/cloud/StoreDocuments.h"
 #include "platform/cloud/StoreEngine.h"
 #include "platform/cloud/StoreFileSystem.h"
+#include "platform/cloud/TransferActivity.h"
 
+#include <atomic>
 #include <mutex>
 
 namespace platform {
@@ -29,7 +32,11 @@ struct CloudService::State final : CloudAccountService,
         if (!parts.disk)
             parts.disk = makeRealStoreFileSystem();
         if (!parts.remotes)
-            parts.remotes = standardRemotes(parts.clock);
+            parts.remotes =
+                standardRemotes(parts.clock, [this](const AccountRecord& account, bool refused) {
+                    return passwords.credentials(account, refused);
+                });
+        activity.setListener([this] { tellOfActivity(); });
     }
 
     // CloudAccountService
@@ -112,6 +119,19 @@ struct CloudService::State final : CloudAccountService,
             answer(makeError(ErrorCode::noAccount));
     }
 
+    /// One notice for all that changes until it is given.
+    void tellOfActivity() {
+        if (activityTold.exchange(true))
+            return;
+        parts.main.async([weak = weak_from_this()] {
+            const std::shared_ptr<State> self = weak.lock();
+            if (!self)
+                return;
+            self->activityTold = false;
+            self->parts.notifications.post(cloudActivityDidChangeNotification);
+        });
+    }
+
     std::shared_ptr<StoreEngine> current() const {
         const std::lock_guard lock(mutex);
         return engine;
@@ -148,15 +168,22 @@ struct CloudService::State final : CloudAccountService,
                                              parts.folders,
                                              *parts.disk,
                                              slot,
+                                             activity,
                                              [this] { tellOfValues(); },
                                              [this] { tellOfCondition(); }};
         auto next = std::make_shared<StoreEngine>(services, *now.account, std::move(remote));
+        next->setMetered(metered);
         next->open(parts.readOnly);
         const std::lock_guard lock(mutex);
         engine = std::move(next);
     }
 
     Parts parts;
+    TransferActivity activity;
+    AccountPasswords passwords{parts.secrets ? parts.secrets : makeSecretStore(parts.folders),
+                               [this] { tellOfCondition(); }};
+    std::atomic<bool> activityTold{false};
+    bool metered = false; // main thread
     StoreViewSlot slot;
     StoreDocuments documents;
     mutable std::mutex mutex;
@@ -214,6 +241,7 @@ void CloudService::refresh(const std::optional<Url>& folder,
 }
 
 void CloudService::sync(std::function<void(const Failure& failure)> done) {
+    state_->passwords.tryAgain();
     if (const std::shared_ptr<StoreEngine> engine = state_->current())
         engine->sync(std::move(done));
     else if (done)
@@ -234,7 +262,47 @@ std::vector<PendingWork> CloudService::pending() const {
     const std::shared_ptr<const StoreView> view = state_->slot.load();
     if (!view || !view->reader)
         return {};
-    return view->reader->ask(&Synchronizer::pending);
+    std::vector<PendingWork> work = view->reader->ask(&Synchronizer::pending);
+    if (const std::shared_ptr<StoreEngine> engine = state_->current())
+        for (PendingWork& waiting : engine->waitingForNetwork())
+            work.push_back(std::move(waiting));
+    return work;
+}
+
+std::vector<RefusedRow> CloudService::refusedNames(std::size_t atMost) const {
+    const std::shared_ptr<const StoreView> view = state_->slot.load();
+    if (!view || !view->reader)
+        return {};
+    return view->reader->ask([atMost](StateQueries& queries) {
+        return queries.refusedPaths(atMost);
+    });
+}
+
+std::vector<TransferInfo> CloudService::transfers() const {
+    return state_->activity.now();
+}
+
+void CloudService::setMetered(bool metered) {
+    state_->metered = metered;
+    if (const std::shared_ptr<StoreEngine> engine = state_->current())
+        engine->setMetered(metered);
+}
+
+std::optional<std::string> CloudService::passwordWanted() const {
+    std::optional<AccountRecord> account;
+    {
+        const std::lock_guard lock(state_->mutex);
+        account = state_->reading.account;
+    }
+    return account ? state_->passwords.whyWanted(*account) : std::nullopt;
+}
+
+SecretStore& CloudService::secrets() {
+    return state_->passwords.secrets();
+}
+
+void CloudService::readAccountFile() {
+    state_->monitor->look();
 }
 
 std::vector<std::string> CloudService::conflicts() const {

@@ -23,8 +23,10 @@ class KeyValueCloudStore;
 class MainQueue;
 class NotificationCenter;
 class Remote;
+class SecretStore;
 class StoreFileSystem;
 struct AccountRecord;
+struct TransferInfo;
 
 /// What people may want to know of the store of the account.
 struct CloudStatus {
@@ -62,6 +64,8 @@ public:
         std::shared_ptr<StoreFileSystem> disk;
         /// Empty: the kinds that this version knows.
         std::function<std::unique_ptr<Remote>(const AccountRecord& account)> remotes;
+        /// Empty: the desk's.
+        std::shared_ptr<SecretStore> secrets = {};
     };
     explicit CloudService(Parts parts);
     ~CloudService();
@@ -96,6 +100,22 @@ public:
     std::vector<std::string> conflicts() const;
     /// None without an account whose store can be read.
     std::optional<CloudStatus> status() const;
+    /// Names that one side has and the other cannot hold, with the reasons, at most so many.
+    std::vector<RefusedRow> refusedNames(std::size_t atMost) const;
+
+    /// What is being sent and received now. cloudActivityDidChangeNotification tells when one
+    /// begins or ends, not how far it is.
+    std::vector<TransferInfo> transfers() const;
+    /// The network costs: what nobody waits for is not transferred before that is over. A command
+    /// (sync) and what the user opens are.
+    void setMetered(bool metered);
+
+    /// Why somebody has to give the password of the account before anything goes on, in the user's
+    /// language; none while nobody has to. cloudProblemDidChangeNotification tells of a change.
+    std::optional<std::string> passwordWanted() const;
+    SecretStore& secrets();
+    /// Follows a change of the account file now, before its notice comes.
+    void readAccountFile();
 
 private:
     struct State;

@@ -61,6 +61,8 @@ public:
     std::vector<OpRow> operations();
     std::vector<RefusedRow> refused(ItemId folder, Side side);
     std::int64_t refusedCount(Side side);
+    /// Of both sides, with the folder's path before the name.
+    std::vector<RefusedRow> refusedPaths(std::size_t limit);
     /// Items with a role and an observation of the disk.
     std::vector<ItemState> sharedItems();
     StoreCounts counts();

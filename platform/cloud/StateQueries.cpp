@@ -321,6 +321,27 @@ std::int64_t StateQueries::refusedCount(Side side) {
         .value_or(0);
 }
 
+std::vector<RefusedRow> StateQueries::refusedPaths(std::size_t limit) {
+    struct Found {
+        ItemId folder;
+        RefusedRow row;
+    };
+    std::vector<Found> found;
+    Statement& rows = handles_->prepared(
+        "SELECT folder, name, reason FROM refused ORDER BY folder, name LIMIT ?1");
+    rows.with(static_cast<std::int64_t>(limit));
+    while (rows.step())
+        found.push_back({rows.integer(0), {rows.text(1), rows.text(2)}});
+    std::vector<RefusedRow> refused;
+    for (Found& each : found) {
+        const std::string folder = pathOf(each.folder).value_or("");
+        if (!folder.empty())
+            each.row.name = folder + '/' + each.row.name;
+        refused.push_back(std::move(each.row));
+    }
+    return refused;
+}
+
 std::vector<std::pair<ItemId, std::string>> StateQueries::remoteFolders() {
     Statement& rows = handles_->prepared(
         "WITH RECURSIVE tree(id, path) AS (SELECT 1, '' UNION ALL SELECT r.item,"

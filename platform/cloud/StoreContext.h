@@ -8,6 +8,7 @@
 namespace platform {
 
 class StoreFileSystem;
+class TransferActivity;
 
 /// An open store, as those who work on it see it. Outlives them.
 struct StoreContext {
@@ -21,6 +22,8 @@ struct StoreContext {
     /// Nothing on it waits for the remote.
     WorkQueue& queue;
     StateDatabase& database;
+    /// Where transfers are shown; none where nobody looks.
+    TransferActivity* activity = nullptr;
 
     std::string pathOf(const std::string& relative) const {
         return relative.empty() ? layout.root() : layout.root() + '/' + relative;

@@ -156,7 +156,7 @@ void StoreEngine::begin(OpenedStore store) {
     }
     store_.emplace(std::move(store));
     context_.emplace(StoreContext{layout_, store_->mark, services_.disk, *remote_, services_.clock,
-                                  *queue_, *store_->database});
+                                  *queue_, *store_->database, &services_.activity});
     Transfers::recover(*context_);
     // The user's own library is there from the first moment, also before the remote was seen.
     if (const Failure failure =
@@ -176,6 +176,7 @@ void StoreEngine::begin(OpenedStore store) {
         auto synchronizer = std::make_shared<Synchronizer>(
             *context_, transfers->queue(), transfers->limiter(), cancel_, store_->lock.afterCrash(),
             [this](const ListingBatch& batch) { written(batch); });
+        synchronizer->setMetered(metered_);
         KeptFolder(*context_).expire();
         const std::lock_guard lock(mutex_);
         transfers_ = std::move(transfers);

@@ -24,6 +24,7 @@
 namespace platform {
 
 class RemoteLister;
+class TransferActivity;
 
 /// The store of one account: opens it, keeps the view that reads answer from, brings in what the
 /// remote has and fetches contents. Where another process has the store, reads go on and changes
@@ -37,9 +38,10 @@ public:
         const Folders& folders;
         StoreFileSystem& disk;
         StoreViewSlot& slot;
+        TransferActivity& activity;
         /// Called on a thread of the engine's when another device set values.
         std::function<void()> valuesChanged;
-        /// The same when `problem` or `usable` may answer something else.
+        /// The same when `problem`, `usable`, `question` or what waits may be something else.
         std::function<void()> conditionChanged;
     };
     using Done = std::function<void(const Failure& failure)>;
@@ -81,6 +83,10 @@ public:
     void refresh(const std::optional<Url>& folder, Done done);
     /// Makes both sides agree now, whatever has failed before. `done` as above.
     void sync(Done done);
+    /// While it is metered, contents that nobody waits for stay where they are. From any thread.
+    void setMetered(bool metered);
+    /// What stays because of that.
+    std::vector<PendingWork> waitingForNetwork() const;
     std::optional<DeletionQuestion> question() const;
     [[nodiscard]] Failure answer(DeletionAnswer answer);
     void freeBytes(std::function<void(const Result<std::uint64_t>&)> done);
@@ -160,6 +166,7 @@ private:
     std::vector<StoreMoves::Moved> moved_; // on the disk, and not yet written down
     std::shared_ptr<Synchronizer> synchronizer_;
     std::optional<DeletionQuestion> question_;
+    std::size_t waiting_ = 0;
     std::optional<Synchronizer::Request> wanted_;
     std::map<Alarm, Pending> alarms_;
     Duration nextLook_{0}; // because of a notice
@@ -186,6 +193,7 @@ private:
 
     std::mutex connecting_;
     std::atomic<bool> connected_{false};
+    std::atomic<bool> metered_{false};
 
     std::unique_ptr<WorkQueue> queue_;
     std::unique_ptr<WorkQueue> listing_;

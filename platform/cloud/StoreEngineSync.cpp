@@ -141,8 +141,9 @@ void StoreEngine::plan(const Synchronizer::Report& report) {
     bool news = false;
     {
         const std::lock_guard lock(mutex_);
-        news = question_ != report.question;
+        news = question_ != report.question || waiting_ != report.waiting;
         question_ = report.question;
+        waiting_ = report.waiting;
     }
     if (news)
         services_.conditionChanged();
@@ -260,6 +261,20 @@ void StoreEngine::syncNow(Done done, int times) {
             done(failure || !settlesIn ? failure : stillChanging(youngFile));
         }
     });
+}
+
+void StoreEngine::setMetered(bool metered) {
+    if (metered_.exchange(metered) == metered)
+        return;
+    if (const std::shared_ptr<Synchronizer> synchronizer = this->synchronizer())
+        synchronizer->setMetered(metered);
+    if (!metered) // what has waited goes now
+        want({false, true, {}, false, false});
+}
+
+std::vector<PendingWork> StoreEngine::waitingForNetwork() const {
+    const std::shared_ptr<Synchronizer> synchronizer = this->synchronizer();
+    return synchronizer ? synchronizer->waitingForNetwork() : std::vector<PendingWork>();
 }
 
 Failure StoreEngine::answer(DeletionAnswer answer) {

@@ -6,6 +6,7 @@
 #include "platform/cloud/StoreFileSystem.h"
 #include "platform/cloud/SyncExecutor.h"
 #include "platform/cloud/Tokens.h"
+#include "platform/cloud/TransferActivity.h"
 #include "platform/files/FileCoordinator.h"
 #include "platform/files/PathText.h"
 
@@ -60,6 +61,7 @@ Result<SyncExecutor::Staged> SyncExecutor::stage(const Work& work, CancelFlag& c
         return file.error();
     ContentHash hash;
     std::uint64_t received = 0;
+    TransferActivity::Entry shown(context_.activity, work.localPath, false, size);
     const auto sink = [&](std::span<const std::byte> piece) -> Failure {
         while (!piece.empty()) {
             const auto part = piece.first(std::min(limiter_.largestPortion(), piece.size()));
@@ -69,6 +71,7 @@ Result<SyncExecutor::Staged> SyncExecutor::stage(const Work& work, CancelFlag& c
                 return failure;
             hash.add(part);
             received += part.size();
+            shown.setDone(received);
             piece = piece.subspan(part.size());
         }
         return std::nullopt;

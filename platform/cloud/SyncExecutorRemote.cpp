@@ -3,6 +3,7 @@
 #include "platform/cloud/StoreFileSystem.h"
 #include "platform/cloud/SyncExecutor.h"
 #include "platform/cloud/SyncTimes.h"
+#include "platform/cloud/TransferActivity.h"
 #include "platform/files/PathText.h"
 
 namespace platform {
@@ -141,6 +142,7 @@ Failure SyncExecutor::send(Work& work, const std::string& path, const Place& pla
         const Result<FileAttributes> now = (*file)->attributes();
         return now && sameContentAs(*now, *before) && now->changed == before->changed;
     };
+    TransferActivity::Entry shown(context_.activity, work.localPath, true, before->size);
     RemoteUpload upload{before->size,
                         before->modified,
                         extendedAttribute(local, "user.xdg.tags", FollowLinks::no).value_or(""),
@@ -154,6 +156,7 @@ Failure SyncExecutor::send(Work& work, const std::string& path, const Place& pla
             return same() ? got : Result<std::size_t>(changed);
         if (!limiter_.take(*got, cancel))
             return makeError(ErrorCode::userCancelled);
+        shown.setDone(offset + *got);
         if (offset == hashed) { // a remote that begins anew has it hashed already
             hash.add(buffer.first(*got));
             hashed += *got;

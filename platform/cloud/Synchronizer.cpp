@@ -2,6 +2,7 @@
 
 #include "platform/base/Describe.h"
 #include "platform/base/Log.h"
+#include "platform/base/Text.h"
 #include "platform/cloud/LocalScanner.h"
 #include "platform/cloud/SyncTimes.h"
 
@@ -46,6 +47,7 @@ Synchronizer::Synchronizer(StoreContext& context, TransferQueue& transfers, Rate
 
 Synchronizer::Report Synchronizer::run(const Request& request) {
     Report report;
+    commanded_ = request.commanded;
     for (auto& [item, trouble] : troubles_) {
         trouble.triesInThisRun = 0;
         if (request.commanded) {
@@ -71,6 +73,7 @@ Synchronizer::Report Synchronizer::run(const Request& request) {
                 report.retryAt = trouble.nextAt;
     if (!report.failure)
         report.failure = report.incomplete;
+    report.waiting = troubles_.size() + waitingForNetwork().size();
     return report;
 }
 
@@ -168,7 +171,35 @@ std::vector<SyncStep> Synchronizer::plan() {
         return !mayTry(step.item) || vanishing.contains(step.item) ||
                vanishing.contains(step.other);
     });
+    leaveTransfers(steps);
     return steps;
+}
+
+void Synchronizer::leaveTransfers(std::vector<SyncStep>& steps) {
+    std::vector<PendingWork> left;
+    if (metered_ && !commanded_)
+        std::erase_if(steps, [&](const SyncStep& step) {
+            const bool transfers =
+                step.kind == StepKind::upload || step.kind == StepKind::uploadChange ||
+                step.kind == StepKind::download || step.kind == StepKind::reconcile;
+            if (transfers)
+                left.push_back({step.item, std::string(nameOf(step.kind)), {}, 0, {}, {}});
+            return transfers;
+        });
+    if (!left.empty())
+        context_.queue.sync([&] {
+            for (PendingWork& work : left)
+                work.path = context_.database.localPathOf(work.item).value_or("");
+        });
+    for (PendingWork& work : left)
+        work.cause = localized("Waits for a network that is not metered. “Sync Now” does not wait.");
+    const std::lock_guard lock(waitingMutex_);
+    waiting_ = std::move(left);
+}
+
+std::vector<PendingWork> Synchronizer::waitingForNetwork() const {
+    const std::lock_guard lock(waitingMutex_);
+    return waiting_;
 }
 
 /// What disagrees, with all folders above it and whoever has a place that it wants.

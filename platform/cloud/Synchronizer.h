@@ -6,7 +6,9 @@
 #include "platform/cloud/SyncExecutor.h"
 #include "platform/cloud/SyncState.h"
 
+#include <atomic>
 #include <map>
+#include <mutex>
 #include <optional>
 #include <set>
 #include <string>
@@ -51,6 +53,8 @@ public:
         /// How long the looks at the disk took.
         Duration looked{0};
         std::size_t changes = 0;
+        /// Items that wait for another try, or for a network that does not cost.
+        std::size_t waiting = 0;
         /// Folders of the remote could not be read: of those nothing is known, all else goes on.
         Failure incomplete;
         /// The same of a folder of the disk. Nothing is tried again because of it: a notice tells
@@ -74,6 +78,10 @@ public:
     void changedOnDisk(const std::string& folder) { dirty_.add(folder); }
     /// Ends a run soon, and those that come. From any thread.
     void cancel() { executor_.cancel(); }
+    /// Contents are transferred by command alone, from the next plan on. From any thread.
+    void setMetered(bool metered) { metered_ = metered; }
+    /// What the last plans left for a network that is not metered. From any thread.
+    std::vector<PendingWork> waitingForNetwork() const;
     /// On the store's queue.
     [[nodiscard]] Failure answer(DeletionAnswer answer);
     static std::optional<DeletionQuestion> question(StateQueries& queries);
@@ -118,6 +126,8 @@ private:
     void noteTrouble(const SyncStep& step, const Error& error);
     void forgetTrouble(ItemId item);
     bool mayTry(ItemId item);
+    /// Takes the transfers that nobody asked for out of the plan of a metered network.
+    void leaveTransfers(std::vector<SyncStep>& steps);
 
     StoreContext& context_;
     CancelFlag& cancel_;
@@ -131,6 +141,10 @@ private:
     std::map<Side, Vanishing> vanishing_;
     DirtyFolders dirty_;
     bool lookedAtAll_ = false; // since the start
+    std::atomic<bool> metered_{false};
+    bool commanded_ = false; // the run that is under way
+    mutable std::mutex waitingMutex_;
+    std::vector<PendingWork> waiting_; // guarded by waitingMutex_
     bool afterCrash_ = false;                // and not looked for damage yet
     std::map<ItemId, std::int64_t> damaged_; // with the operation that tells of it
 };

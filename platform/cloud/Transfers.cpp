@@ -7,6 +7,7 @@
 #include "platform/cloud/StoreFileSystem.h"
 #include "platform/cloud/SyncExecutor.h"
 #include "platform/cloud/Tokens.h"
+#include "platform/cloud/TransferActivity.h"
 #include "platform/files/PathText.h"
 #include "platform/files/Progress.h"
 
@@ -29,6 +30,7 @@ struct Transfers::Transfer {
     std::shared_ptr<Progress> progress;
     /// As a listing told of it.
     std::optional<RemoteRow> expected;
+    TransferActivity::Entry* shown = nullptr; // while it runs; its thread's
     CancelFlag cancel;
     int waiting = 0; // guarded by the transfers' mutex, as are the two below
     bool done = false;
@@ -144,6 +146,8 @@ Failure Transfers::run(Transfer& transfer) {
     transfer.expected = state->remote;
     transfer.progress->update(0, static_cast<std::int64_t>(size));
     const auto published = progress_.publish(transfer.url, transfer.progress);
+    TransferActivity::Entry shown(context_.activity, transfer.path, false, size);
+    transfer.shown = &shown;
     Failure failure;
     for (int i = 0; i < fetchAttempts; ++i) {
         failure = attempt(transfer, *remotePath, size);
@@ -198,6 +202,7 @@ Result<RemoteEntry> Transfers::stage(Transfer& transfer, const std::string& remo
                 return failure;
             content.add(part);
             received += part.size();
+            transfer.shown->setDone(received);
             transfer.progress->update(static_cast<std::int64_t>(received),
                                       static_cast<std::int64_t>(std::max(size, received)));
             piece = piece.subspan(part.size());

@@ -16,6 +16,11 @@ public:
 
     bool hasKeyring() override { return keyringIsThere(); }
 
+    bool isInFile(const std::string& account) override {
+        const Result<std::optional<std::string>> kept = file_.lookUp(account);
+        return kept && *kept;
+    }
+
     Result<std::optional<std::string>> lookUp(const std::string& account) override {
         Result<std::optional<std::string>> kept = file_.lookUp(account);
         if (kept && *kept)

@@ -25,6 +25,8 @@ public:
 
     /// There is a keyring, or one that starts when it is asked.
     virtual bool hasKeyring() = 0;
+    /// The user has wanted this account's in the file.
+    virtual bool isInFile(const std::string& account) = 0;
     /// None when nothing is kept for the account. An error says that the place where it may be
     /// cannot be read, and what to do.
     virtual Result<std::optional<std::string>> lookUp(const std::string& account) = 0;

@@ -1,6 +1,7 @@
 // Several accounts, their passwords, and taking one off the device.
 
 #include "platform/cloud/AccountBook.h"
+#include "platform/cloud/SignIn.h"
 #include "platform/cloud/StoreTakingAway.h"
 #include "platform/system/SecretStore.h"
 #include "tests/cloud/StoreFixture.h"
@@ -76,7 +77,19 @@ TEST_F(Accounts, WhatALaterVersionWroteStaysInTheList) {
     EXPECT_THAT(names(), ElementsAre("new", "other"));
 }
 
+TEST_F(Accounts, APasswordInTheClearIsKnownBeforeItIsSent) {
+    const auto clear = [](const char* address) {
+        return sendsInTheClear({std::string(webDavAccountKind), address});
+    };
+    EXPECT_TRUE(clear("http://example.org/dav/"));
+    EXPECT_TRUE(clear(" http://localhost.example.org/"));
+    for (const char* const good : {"https://example.org", "example.org/dav",
+                                   "http://127.0.0.1:8080/", "http://localhost/x", "http://[::1]"})
+        EXPECT_FALSE(clear(good)) << good;
+}
+
 TEST_F(Accounts, ThePasswordFileIsForItsOwnerAlone) {
+    ::setenv("DBUS_SESSION_BUS_ADDRESS", "", 1); // whoever runs this may have a keyring
     const auto secrets = makeSecretStore(folders);
     const std::string file = secretFile(folders);
     const std::string odd = "p\"\xFF\n\xC3\xA4";

@@ -366,6 +366,25 @@ TEST_F(Sync, OneBadItemDoesNotStopTheOthers) {
     EXPECT_FALSE(remoteHas("A/link"));
 }
 
+TEST_F(Sync, WhereTheNetworkCostsContentsWaitForACommand) {
+    givenSynced({"A/here", "A/promise"});
+    synchronizer->setMetered(true);
+    givenLocal("A/new", "new");
+    givenRemote("A/here", "edited there");
+    givenRemote("A/listed", "is only promised");
+    clock.advance(std::chrono::minutes(1));
+    EXPECT_EQ(synchronizer->run({false, true, {}, true}).failure, std::nullopt);
+    EXPECT_FALSE(remoteHas("A/new"));
+    EXPECT_EQ(local("A/here"), "A/here");
+    EXPECT_TRUE(isPromised("A/listed")) << "what costs next to nothing goes on";
+    EXPECT_EQ(synchronizer->waitingForNetwork().size(), 2U);
+    EXPECT_EQ(fetch("A/listed"), std::nullopt) << "the user waits for that";
+    synced(); // by command
+    EXPECT_EQ(remoteContent("A/new"), "new");
+    EXPECT_EQ(local("A/here"), "edited there");
+    EXPECT_TRUE(synchronizer->waitingForNetwork().empty());
+}
+
 TEST_F(Sync, StoppedAtAnyStepNothingIsLostAndTheNextRunEndsIt) {
     for (int step = 1;; ++step) {
         givenSynced({"A/edited", "A/theirs", "A/both", "A/gone", "A/moved"});
