@@ -31,6 +31,8 @@ void complain(std::string_view message);
 int usageFault(std::string_view command, std::string_view message);
 
 int signIn(const std::vector<std::string>& arguments);
+int listAccounts(const std::vector<std::string>& arguments);
+int useStoredAccount(const std::vector<std::string>& arguments);
 int signOut(const std::vector<std::string>& arguments);
 int showStatus(const std::vector<std::string>& arguments);
 int listItems(const std::vector<std::string>& arguments);

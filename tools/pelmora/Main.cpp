@@ -9,17 +9,32 @@
 namespace pelmora {
 namespace {
 
-constexpr std::array<Command, 13> table{{
-    {"sign-in", "sign-in folder PATH [--name NAME] [--rate-limit BYTES] [--quota BYTES]",
-     "Signs in to the account whose remote is the folder PATH. An account that was signed in\n"
-     "before finds its store again.\n"
-     "  --name NAME         what the account is called; the folder's name if not given\n"
+constexpr std::array<Command, 15> table{{
+    {"sign-in",
+     "sign-in folder PATH | webdav URL --user USER [--ca FILE] [--keep-in-file] [--name NAME]\n"
+     "                  [--rate-limit BYTES] [--quota BYTES]",
+     "Signs in to the account whose documents are in the folder PATH, or on the WebDAV server at\n"
+     "URL. An account that was signed in before finds its store again. The password of a server is\n"
+     "asked for (without a terminal: the first line of standard input) and goes into the keyring.\n"
+     "  --user USER         who signs in to the server\n"
+     "  --ca FILE           certificate authorities to trust beside the system's, for a server with\n"
+     "                      a certificate of one's own\n"
+     "  --keep-in-file      where there is no keyring: the password goes into a file that you\n"
+     "                      alone may read; it is not encrypted\n"
+     "  --name NAME         what the account is called\n"
      "  --rate-limit BYTES  bytes a second that transfers may take (suffixes K, M, G)\n"
      "  --quota BYTES       size of the account (suffixes K, M, G)\n",
      &signIn},
-    {"sign-out", "sign-out",
-     "Signs out. The store and everything in it stay on the disk, and are found again when the\n"
-     "same account signs in.\n",
+    {"accounts", "accounts",
+     "Lists the accounts that are signed in to; \"*\" marks the active one, whose documents are\n"
+     "shown.\n",
+     &listAccounts},
+    {"use", "use NAME", "Makes the account NAME the active one.\n", &useStoredAccount},
+    {"sign-out", "sign-out [NAME] [--remove-files]",
+     "Signs out of the active account, or of the one called NAME. The store and everything in it\n"
+     "stay on the disk, and are found again when the same account signs in.\n"
+     "  --remove-files  takes the documents off this device; refused while the account does not\n"
+     "                  have all of them\n",
      &signOut},
     {"status", "status", "Tells who is signed in, where the store is, and what is in it.\n",
      &showStatus},
