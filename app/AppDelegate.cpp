@@ -64,6 +64,11 @@ bool AppDelegate::applicationWillFinishLaunchingWithOptions(
     rootWindow_->makeKeyAndVisible();
     statusStrip_ = std::make_unique<StatusStrip>(*rootWindow_);
     vanishedItems_ = std::make_unique<VanishedItems>(*rootWindow_);
+    passwordPrompt_ = std::make_unique<PasswordPrompt>(*rootWindow_);
+    rootWindow_->setStatusStripHandler([weak = std::weak_ptr(root)] {
+        if (const auto screen = weak.lock(); screen && !screen->presentedViewController())
+            screen->showAccount();
+    });
     return true;
 }
 

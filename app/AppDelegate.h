@@ -1,5 +1,6 @@
 #pragma once
 
+#include "app/PasswordPrompt.h"
 #include "app/StatusStrip.h"
 #include "app/VanishedItems.h"
 #include "platform/ui/Application.h"
@@ -36,6 +37,7 @@ private:
     std::unique_ptr<platform::Window> rootWindow_;
     std::unique_ptr<StatusStrip> statusStrip_; // shows itself in the window
     std::unique_ptr<VanishedItems> vanishedItems_;
+    std::unique_ptr<PasswordPrompt> passwordPrompt_;
 };
 
 } // namespace tavrin

@@ -1,5 +1,6 @@
 #include "app/VanishedItems.h"
 
+#include "app/FreeScreen.h"
 #include "app/VXLogging.h"
 #include "platform/Platform.h"
 #include "platform/base/Identity.h"
@@ -9,8 +10,6 @@
 #include "platform/ui/AlertController.h"
 #include "platform/ui/Application.h"
 
-#include <chrono>
-
 namespace tavrin {
 namespace {
 
@@ -19,9 +18,6 @@ using platform::AlertAction;
 using platform::DeletionAnswer;
 using platform::localized;
 using platform::Platform;
-
-/// How soon it looks again while another alert is in the way.
-constexpr auto busyDelay = std::chrono::seconds(1);
 
 } // namespace
 
@@ -58,9 +54,9 @@ void VanishedItems::update() {
 }
 
 void VanishedItems::ask(const platform::DeletionQuestion& question) {
-    const std::shared_ptr<platform::ViewController> screen = topScreen();
+    const std::shared_ptr<platform::ViewController> screen = freeScreen(window_);
     if (!screen) {
-        retry_ = Platform::current().mainQueue().timer(busyDelay, [this] { update(); });
+        retry_ = Platform::current().mainQueue().timer(questionDelay, [this] { update(); });
         return;
     }
     asked_ = question;
@@ -85,11 +81,6 @@ void VanishedItems::answer(DeletionAnswer answer) {
         if (const platform::Failure failure = Platform::current().cloud().answer(answer))
             VXLOG(vxError, "Cannot tell the store what vanished items mean: %@", *failure);
     });
-}
-
-std::shared_ptr<platform::ViewController> VanishedItems::topScreen() const {
-    const std::shared_ptr<platform::ViewController> root = window_.rootViewController();
-    return root && !root->presentedViewController() ? root : nullptr;
 }
 
 } // namespace tavrin

@@ -30,8 +30,6 @@ private:
     void update();
     void ask(const platform::DeletionQuestion& question);
     void answer(platform::DeletionAnswer answer);
-    /// The screen that nothing is presented over.
-    std::shared_ptr<platform::ViewController> topScreen() const;
 
     platform::Window& window_;
     std::weak_ptr<platform::AlertController> alert_;

@@ -86,6 +86,10 @@ void NavController::showStoreRoot() {
 void NavController::showPlaceholder() {
     VXLOG(vxWarning, "Pelmora is not enabled");
     if (const auto placeholder = platform::makeScreenByClassName(placeholderClass)) {
+        if (const auto known =
+                std::dynamic_pointer_cast<platform::DocumentPickerUnavailableViewController>(
+                    placeholder))
+            offerSignIn(*known);
         setViewControllers({placeholder}, false);
         endPreview();
     } else {

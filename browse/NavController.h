@@ -1,5 +1,6 @@
 #pragma once
 
+#include "browse/SignInViewController.h"
 #include "items/FilenamePrompt.h"
 #include "items/VXItem.h"
 #include "platform/base/NotificationCenter.h"
@@ -16,6 +17,10 @@
 #include <optional>
 #include <string>
 #include <vector>
+
+namespace platform {
+class DocumentPickerUnavailableViewController;
+}
 
 namespace tavrin {
 
@@ -54,6 +59,12 @@ public:
     void navigationControllerDidShowViewController(platform::NavigationController& navigation,
                                                    platform::ViewController& screen,
                                                    bool animated) override;
+
+    // Accounts (NavControllerAccounts.cpp)
+    /// The screen that signs in, over what is shown.
+    void showSignIn(SignInViewController::Kind kind);
+    /// Who is signed in, and what goes on with the account; not while it is shown already.
+    void showAccount();
 
     // Lists (NavControllerLists.cpp)
     void initNewListController(List& list);
@@ -142,6 +153,8 @@ private:
     void pelmoraAccountAvailabilityChanged();
     void showStoreRoot();
     void showPlaceholder();
+    void offerSignIn(platform::DocumentPickerUnavailableViewController& placeholder);
+    platform::BarButtonItem::Pointer makeAccountButton();
     std::shared_ptr<PreviewItemManager> startItemManager(int previewMode);
     void endPreview();
     /// Takes the search screen away; answers whether there was one.

@@ -3,8 +3,10 @@
 #include "browse/NavController.h"
 #include "items/FileUtils.h"
 #include "items/UrlExtensions.h"
+#include "platform/Platform.h"
 #include "platform/base/Text.h"
 #include "platform/cloud/CloudContainer.h"
+#include "platform/cloud/CloudDocumentService.h"
 #include "platform/ui/Controls.h"
 
 #include <algorithm>
@@ -108,9 +110,12 @@ void NavController::configureNavBar(List& list) {
             platform::SystemItem::cancel, calling(&NavController::endEditMode)));
         item.setTitle(localized("Select Items"));
     } else {
-        item.setRightBarButtonItem(
+        std::vector<BarButtonItem::Pointer> items{
             BarButtonItem::withTitle(localized("Select"), platform::BarStyle::plain,
-                                     calling(&NavController::beginEditMode)));
+                                     calling(&NavController::beginEditMode))};
+        if (platform::Platform::current().documents().shelfroot() == list.presentedURL())
+            items.push_back(makeAccountButton());
+        item.setRightBarButtonItems(std::move(items));
         item.setTitle(viewTitle_);
     }
     item.setHidesBackButton(editMode_, false);

@@ -2,8 +2,11 @@
 
 #include "platform/ui/ViewController.h"
 
+#include <functional>
 #include <memory>
+#include <string>
 #include <string_view>
+#include <vector>
 
 namespace platform {
 
@@ -16,8 +19,17 @@ public:
     void loadView() override;
     void viewWillAppear(bool animated) override;
 
+    /// A way to an account that the program offers here.
+    struct Choice {
+        std::string title;
+        std::function<void()> choose;
+    };
+    /// Buttons in place of the advice for the command line. Once, before the screen is shown.
+    void setChoices(std::vector<Choice> choices);
+
 private:
     struct Content;
+    std::vector<Choice> choices_;
     std::shared_ptr<Content> content_;
 };
 

@@ -6,6 +6,7 @@
 #include "platform/ui/Canvas.h"
 #include "platform/ui/Direction.h"
 #include "platform/ui/Theme.h"
+#include "platform/ui/qt/ViewImpl.h"
 
 #include <algorithm>
 #include <cmath>
@@ -94,6 +95,14 @@ void StatusStrip::setContent(const StatusStripContent& content) {
     network_->setText(content.network);
     spinner_->setTurning(content.activity);
     setNeedsLayout();
+}
+
+void StatusStrip::setTapped(std::function<void()> tapped) {
+    addTapHandler(std::move(tapped));
+    // No stop of the Tab key: it is no part of any screen.
+    if (QWidget* const widget = impl().widget)
+        widget->setFocusPolicy(Qt::NoFocus);
+    impl().role = QAccessible::Client;
 }
 
 double StatusStrip::height() {

@@ -17,6 +17,7 @@ public:
 
     void setContent(const StatusStripContent& content);
     const StatusStripContent& content() const { return content_; }
+    void setTapped(std::function<void()> tapped);
     /// The height that its text needs, at least the theme's.
     static double height();
 

@@ -104,6 +104,10 @@ const StatusStripContent& Window::statusStrip() const {
     return impl_->strip->content();
 }
 
+void Window::setStatusStripHandler(std::function<void()> tapped) {
+    impl_->strip->setTapped(std::move(tapped));
+}
+
 bool Window::layoutIfNeeded() {
     return impl_->layout();
 }

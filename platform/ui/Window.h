@@ -2,6 +2,8 @@
 
 #include "platform/ui/ViewController.h"
 
+#include <functional>
+
 namespace platform {
 
 /// The text and the states that the strip at the top of the window shows.
@@ -39,6 +41,8 @@ public:
     Rect statusBarFrame() const;
     void setStatusStrip(const StatusStripContent& content);
     const StatusStripContent& statusStrip() const;
+    /// A tap on the strip. What it does must be in reach of the keyboard as well.
+    void setStatusStripHandler(std::function<void()> tapped);
 
     /// Lays everything out now; true when something was dirty.
     bool layoutIfNeeded();

@@ -70,6 +70,50 @@
         </translation>
     </message>
     <message numerus="yes">
+        <source>.DICT.SENDING.%d</source>
+        <translation>
+            <numerusform>لا يُرسل أي مستند</numerusform>
+            <numerusform>جارٍ إرسال مستند واحد</numerusform>
+            <numerusform>جارٍ إرسال مستندين</numerusform>
+            <numerusform>جارٍ إرسال %n مستندات</numerusform>
+            <numerusform>جارٍ إرسال %n مستندًا</numerusform>
+            <numerusform>جارٍ إرسال %n مستند</numerusform>
+        </translation>
+    </message>
+    <message numerus="yes">
+        <source>.DICT.RECEIVING.%d</source>
+        <translation>
+            <numerusform>لا يُستلم أي مستند</numerusform>
+            <numerusform>جارٍ استلام مستند واحد</numerusform>
+            <numerusform>جارٍ استلام مستندين</numerusform>
+            <numerusform>جارٍ استلام %n مستندات</numerusform>
+            <numerusform>جارٍ استلام %n مستندًا</numerusform>
+            <numerusform>جارٍ استلام %n مستند</numerusform>
+        </translation>
+    </message>
+    <message numerus="yes">
+        <source>.DICT.MORE.%d</source>
+        <translation>
+            <numerusform>ولا شيء آخر</numerusform>
+            <numerusform>وواحد آخر</numerusform>
+            <numerusform>واثنان آخران</numerusform>
+            <numerusform>و%n أخرى</numerusform>
+            <numerusform>و%n أخرى</numerusform>
+            <numerusform>و%n أخرى</numerusform>
+        </translation>
+    </message>
+    <message numerus="yes">
+        <source>.DICT.WAITING.%d</source>
+        <translation>
+            <numerusform>لا مستندات تنتظر</numerusform>
+            <numerusform>مستند واحد ينتظر</numerusform>
+            <numerusform>مستندان ينتظران</numerusform>
+            <numerusform>%n مستندات تنتظر</numerusform>
+            <numerusform>%n مستندًا ينتظر</numerusform>
+            <numerusform>%n مستند ينتظر</numerusform>
+        </translation>
+    </message>
+    <message numerus="yes">
         <source>.DICT.AVAILABLE.%g</source>
         <translation>
             <numerusform>المتاح %@</numerusform>
@@ -796,6 +840,266 @@
     <message>
         <source>The store has work in it that was interrupted. Use it once more, so that it comes to its end, and sign out then.</source>
         <translation>في المخزن عمل لم يكتمل. استخدمه مرة أخرى حتى ينتهي ثم سجّل الخروج.</translation>
+    </message>
+    <message>
+        <source>Waits for a network that is not metered. “Sync Now” does not wait.</source>
+        <translation>ينتظر شبكة غير محدودة الاستخدام. «المزامنة الآن» لا تنتظر.</translation>
+    </message>
+    <message>
+        <source>Your documents can be on a server, or in a folder such as a disk or a network folder.</source>
+        <translation>يمكن أن تكون مستنداتك على خادم أو في مجلد، مثل قرص أو مجلد شبكة.</translation>
+    </message>
+    <message>
+        <source>Sending “%1$@”</source>
+        <translation>جارٍ إرسال «&#x2068;%1$@&#x2069;»</translation>
+    </message>
+    <message>
+        <source>Receiving “%1$@”</source>
+        <translation>جارٍ استلام «&#x2068;%1$@&#x2069;»</translation>
+    </message>
+    <message>
+        <source>“%1$@”: %2$@</source>
+        <translation>«&#x2068;%1$@&#x2069;»: &#x2068;%2$@&#x2069;</translation>
+    </message>
+    <message>
+        <source>%1$@ at %2$@</source>
+        <translation>&#x2068;%1$@&#x2069; على &#x2068;%2$@&#x2069;</translation>
+    </message>
+    <message>
+        <source>Account</source>
+        <translation>الحساب</translation>
+    </message>
+    <message>
+        <source>On Its Way</source>
+        <translation>قيد النقل</translation>
+    </message>
+    <message>
+        <source>Waiting</source>
+        <translation>قيد الانتظار</translation>
+    </message>
+    <message>
+        <source>Sync Now</source>
+        <translation>المزامنة الآن</translation>
+    </message>
+    <message>
+        <source>Sign In to Another Account…</source>
+        <translation>تسجيل الدخول إلى حساب آخر…</translation>
+    </message>
+    <message>
+        <source>Sign Out…</source>
+        <translation>تسجيل الخروج…</translation>
+    </message>
+    <message>
+        <source>The Password Is Wanted</source>
+        <translation>كلمة المرور مطلوبة</translation>
+    </message>
+    <message>
+        <source>Enter Password…</source>
+        <translation>إدخال كلمة المرور…</translation>
+    </message>
+    <message>
+        <source>Delete on Both Sides</source>
+        <translation>الحذف من الجانبين</translation>
+    </message>
+    <message>
+        <source>Changed on Both Sides</source>
+        <translation>تغيّر في الجانبين</translation>
+    </message>
+    <message>
+        <source>Show the First</source>
+        <translation>إظهار الأول</translation>
+    </message>
+    <message>
+        <source>Names That Cannot Be Kept</source>
+        <translation>أسماء لا يمكن حفظها</translation>
+    </message>
+    <message>
+        <source>Use “%1$@”</source>
+        <translation>استخدام «&#x2068;%1$@&#x2069;»</translation>
+    </message>
+    <message>
+        <source>The server does not accept the password that is kept here. Nothing is sent or received before it has the right one.</source>
+        <translation>لا يقبل الخادم كلمة المرور المحفوظة هنا. لن يُرسل شيء أو يُستلم قبل إدخال كلمة المرور الصحيحة.</translation>
+    </message>
+    <message>
+        <source>Both versions are kept side by side. Compare them and delete the one that you do not want.</source>
+        <translation>النسختان محفوظتان جنبًا إلى جنب. قارن بينهما واحذف ما لا تريده.</translation>
+    </message>
+    <message>
+        <source>Comparing both sides…</source>
+        <translation>جارٍ مقارنة الجانبين…</translation>
+    </message>
+    <message>
+        <source>Something waits. It is tried again by itself.</source>
+        <translation>هناك ما ينتظر. ستُعاد المحاولة تلقائيًا.</translation>
+    </message>
+    <message>
+        <source>Everything is on both sides.</source>
+        <translation>كل شيء موجود في الجانبين.</translation>
+    </message>
+    <message>
+        <source>Sign In to a Server…</source>
+        <translation>تسجيل الدخول إلى خادم…</translation>
+    </message>
+    <message>
+        <source>Use a Folder…</source>
+        <translation>استخدام مجلد…</translation>
+    </message>
+    <message>
+        <source>Sign Out of “%1$@”?</source>
+        <translation>تسجيل الخروج من «&#x2068;%1$@&#x2069;»؟</translation>
+    </message>
+    <message>
+        <source>The account keeps its documents. Those on this device can stay in their folder or be removed.</source>
+        <translation>يحتفظ الحساب بمستنداته. أما ما على هذا الجهاز فيمكن إبقاؤه في مجلده أو إزالته.</translation>
+    </message>
+    <message>
+        <source>Keep Files on This Device</source>
+        <translation>إبقاء الملفات على هذا الجهاز</translation>
+    </message>
+    <message>
+        <source>Remove Files from This Device</source>
+        <translation>إزالة الملفات من هذا الجهاز</translation>
+    </message>
+    <message>
+        <source>Some Documents Stayed on This Device</source>
+        <translation>بقيت بعض المستندات على هذا الجهاز</translation>
+    </message>
+    <message>
+        <source>Not Everything Has Been Sent</source>
+        <translation>لم يُرسل كل شيء</translation>
+    </message>
+    <message>
+        <source>These are on this device alone, so nothing was removed:</source>
+        <translation>هذه موجودة على هذا الجهاز فقط، لذلك لم يُحذف شيء:</translation>
+    </message>
+    <message>
+        <source>Keep Files and Sign Out</source>
+        <translation>إبقاء الملفات وتسجيل الخروج</translation>
+    </message>
+    <message>
+        <source>Stay Signed In</source>
+        <translation>البقاء مسجلاً</translation>
+    </message>
+    <message>
+        <source>Keep the Password in a File?</source>
+        <translation>هل تُحفظ كلمة المرور في ملف؟</translation>
+    </message>
+    <message>
+        <source>It can lie in a file that you alone may read. The file is not encrypted: whoever has this disk in his hands can read it.</source>
+        <translation>يمكن حفظها في ملف لا يقرؤه سواك. الملف غير مشفّر: من يملك هذا القرص يستطيع قراءته.</translation>
+    </message>
+    <message>
+        <source>Keep It in a File</source>
+        <translation>حفظها في ملف</translation>
+    </message>
+    <message>
+        <source>Password for “%1$@”</source>
+        <translation>كلمة المرور لـ «&#x2068;%1$@&#x2069;»</translation>
+    </message>
+    <message>
+        <source>Password</source>
+        <translation>كلمة المرور</translation>
+    </message>
+    <message>
+        <source>Sign In</source>
+        <translation>تسجيل الدخول</translation>
+    </message>
+    <message>
+        <source>Not Now</source>
+        <translation>ليس الآن</translation>
+    </message>
+    <message>
+        <source>Server</source>
+        <translation>خادم</translation>
+    </message>
+    <message>
+        <source>Your documents stay on a WebDAV server, such as one of your own or your company's.</source>
+        <translation>تبقى مستنداتك على خادم WebDAV، كخادمك أو خادم شركتك.</translation>
+    </message>
+    <message>
+        <source>Your documents stay in a folder of this machine, of a disk, or of a network.</source>
+        <translation>تبقى مستنداتك في مجلد على هذا الجهاز أو على قرص أو في الشبكة.</translation>
+    </message>
+    <message>
+        <source>Address</source>
+        <translation>العنوان</translation>
+    </message>
+    <message>
+        <source>Path of the Folder</source>
+        <translation>مسار المجلد</translation>
+    </message>
+    <message>
+        <source>User</source>
+        <translation>المستخدم</translation>
+    </message>
+    <message>
+        <source>File of Certificates to Trust</source>
+        <translation>ملف الشهادات الموثوقة</translation>
+    </message>
+    <message>
+        <source>Give the address of the server.</source>
+        <translation>أدخل عنوان الخادم.</translation>
+    </message>
+    <message>
+        <source>Give the folder of the account.</source>
+        <translation>أدخل مجلد الحساب.</translation>
+    </message>
+    <message>
+        <source>Give the name of the user.</source>
+        <translation>أدخل اسم المستخدم.</translation>
+    </message>
+    <message>
+        <source>The Way to This Server Is Not Encrypted</source>
+        <translation>الاتصال بهذا الخادم غير مشفّر</translation>
+    </message>
+    <message>
+        <source>Everybody on the way can read the password and the documents. Use an address that begins with “https://” if the server has one.</source>
+        <translation>يستطيع أي شخص على الطريق قراءة كلمة المرور والمستندات. استخدم عنوانًا يبدأ بـ «https://» إن كان للخادم مثله.</translation>
+    </message>
+    <message>
+        <source>Sign In Anyway</source>
+        <translation>تسجيل الدخول على أي حال</translation>
+    </message>
+    <message>
+        <source>Looking at the server…</source>
+        <translation>جارٍ فحص الخادم…</translation>
+    </message>
+    <message>
+        <source>Looking at the folder…</source>
+        <translation>جارٍ فحص المجلد…</translation>
+    </message>
+    <message>
+        <source>Signing in…</source>
+        <translation>جارٍ تسجيل الدخول…</translation>
+    </message>
+    <message>
+        <source>“%1$@” is not a folder. Make it first, or connect its disk.</source>
+        <translation>«&#x2068;%1$@&#x2069;» ليس مجلدًا. أنشئه أولاً أو صِل قرصه.</translation>
+    </message>
+    <message>
+        <source>The name of that folder is not UTF-8 text. Choose another folder.</source>
+        <translation>اسم هذا المجلد ليس نصًا بترميز UTF-8. اختر مجلدًا آخر.</translation>
+    </message>
+    <message>
+        <source>“%1$@” holds the stores of accounts themselves. Choose another folder.</source>
+        <translation>يحتوي «&#x2068;%1$@&#x2069;» على مخازن الحسابات نفسها. اختر مجلدًا آخر.</translation>
+    </message>
+    <message>
+        <source>“%1$@” lies in the store of an account. Choose another folder.</source>
+        <translation>يقع «&#x2068;%1$@&#x2069;» داخل مخزن أحد الحسابات. اختر مجلدًا آخر.</translation>
+    </message>
+    <message>
+        <source>There is no file of certificates at “%1$@”.</source>
+        <translation>لا يوجد ملف شهادات في «&#x2068;%1$@&#x2069;».</translation>
+    </message>
+    <message>
+        <source>The server lets you read here, and change nothing.</source>
+        <translation>يسمح لك الخادم بالقراءة هنا ولا يسمح بالتغيير.</translation>
+    </message>
+    <message>
+        <source>No password is kept here for this account.</source>
+        <translation>لا توجد كلمة مرور محفوظة هنا لهذا الحساب.</translation>
     </message>
     <!-- The store and its documents -->
     <message>

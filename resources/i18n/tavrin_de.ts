@@ -46,6 +46,34 @@
         </translation>
     </message>
     <message numerus="yes">
+        <source>.DICT.SENDING.%d</source>
+        <translation>
+            <numerusform>%n Dokument wird gesendet</numerusform>
+            <numerusform>%n Dokumente werden gesendet</numerusform>
+        </translation>
+    </message>
+    <message numerus="yes">
+        <source>.DICT.RECEIVING.%d</source>
+        <translation>
+            <numerusform>%n Dokument wird empfangen</numerusform>
+            <numerusform>%n Dokumente werden empfangen</numerusform>
+        </translation>
+    </message>
+    <message numerus="yes">
+        <source>.DICT.MORE.%d</source>
+        <translation>
+            <numerusform>und %n weiteres</numerusform>
+            <numerusform>und %n weitere</numerusform>
+        </translation>
+    </message>
+    <message numerus="yes">
+        <source>.DICT.WAITING.%d</source>
+        <translation>
+            <numerusform>%n Dokument wartet</numerusform>
+            <numerusform>%n Dokumente warten</numerusform>
+        </translation>
+    </message>
+    <message numerus="yes">
         <source>.DICT.AVAILABLE.%g</source>
         <translation>
             <numerusform>%@ frei</numerusform>
@@ -768,6 +796,266 @@
     <message>
         <source>The store has work in it that was interrupted. Use it once more, so that it comes to its end, and sign out then.</source>
         <translation>Im Speicher liegt noch unterbrochene Arbeit. Benutzen Sie ihn noch einmal, damit sie zu Ende kommt, und melden Sie sich dann ab.</translation>
+    </message>
+    <message>
+        <source>Waits for a network that is not metered. “Sync Now” does not wait.</source>
+        <translation>Wartet auf ein Netz ohne Volumenbegrenzung. „Jetzt abgleichen“ wartet nicht.</translation>
+    </message>
+    <message>
+        <source>Your documents can be on a server, or in a folder such as a disk or a network folder.</source>
+        <translation>Ihre Dokumente können auf einem Server liegen oder in einem Ordner, etwa auf einem Laufwerk oder im Netz.</translation>
+    </message>
+    <message>
+        <source>Sending “%1$@”</source>
+        <translation>„%1$@“ wird gesendet</translation>
+    </message>
+    <message>
+        <source>Receiving “%1$@”</source>
+        <translation>„%1$@“ wird empfangen</translation>
+    </message>
+    <message>
+        <source>“%1$@”: %2$@</source>
+        <translation>„%1$@“: %2$@</translation>
+    </message>
+    <message>
+        <source>%1$@ at %2$@</source>
+        <translation>%1$@ auf %2$@</translation>
+    </message>
+    <message>
+        <source>Account</source>
+        <translation>Account</translation>
+    </message>
+    <message>
+        <source>On Its Way</source>
+        <translation>Unterwegs</translation>
+    </message>
+    <message>
+        <source>Waiting</source>
+        <translation>Wartet</translation>
+    </message>
+    <message>
+        <source>Sync Now</source>
+        <translation>Jetzt abgleichen</translation>
+    </message>
+    <message>
+        <source>Sign In to Another Account…</source>
+        <translation>Bei einem anderen Account anmelden …</translation>
+    </message>
+    <message>
+        <source>Sign Out…</source>
+        <translation>Abmelden …</translation>
+    </message>
+    <message>
+        <source>The Password Is Wanted</source>
+        <translation>Das Passwort wird gebraucht</translation>
+    </message>
+    <message>
+        <source>Enter Password…</source>
+        <translation>Passwort eingeben …</translation>
+    </message>
+    <message>
+        <source>Delete on Both Sides</source>
+        <translation>Auf beiden Seiten löschen</translation>
+    </message>
+    <message>
+        <source>Changed on Both Sides</source>
+        <translation>Auf beiden Seiten geändert</translation>
+    </message>
+    <message>
+        <source>Show the First</source>
+        <translation>Das erste zeigen</translation>
+    </message>
+    <message>
+        <source>Names That Cannot Be Kept</source>
+        <translation>Namen, die nicht möglich sind</translation>
+    </message>
+    <message>
+        <source>Use “%1$@”</source>
+        <translation>„%1$@“ verwenden</translation>
+    </message>
+    <message>
+        <source>The server does not accept the password that is kept here. Nothing is sent or received before it has the right one.</source>
+        <translation>Der Server nimmt das hier aufbewahrte Passwort nicht an. Nichts wird gesendet oder empfangen, bevor er das richtige hat.</translation>
+    </message>
+    <message>
+        <source>Both versions are kept side by side. Compare them and delete the one that you do not want.</source>
+        <translation>Beide Fassungen liegen nebeneinander. Vergleichen Sie sie und löschen Sie die, die Sie nicht wollen.</translation>
+    </message>
+    <message>
+        <source>Comparing both sides…</source>
+        <translation>Beide Seiten werden verglichen …</translation>
+    </message>
+    <message>
+        <source>Something waits. It is tried again by itself.</source>
+        <translation>Etwas wartet. Es wird von selbst erneut versucht.</translation>
+    </message>
+    <message>
+        <source>Everything is on both sides.</source>
+        <translation>Alles ist auf beiden Seiten.</translation>
+    </message>
+    <message>
+        <source>Sign In to a Server…</source>
+        <translation>Bei einem Server anmelden …</translation>
+    </message>
+    <message>
+        <source>Use a Folder…</source>
+        <translation>Einen Ordner verwenden …</translation>
+    </message>
+    <message>
+        <source>Sign Out of “%1$@”?</source>
+        <translation>Von „%1$@“ abmelden?</translation>
+    </message>
+    <message>
+        <source>The account keeps its documents. Those on this device can stay in their folder or be removed.</source>
+        <translation>Der Account behält seine Dokumente. Die auf diesem Gerät können in ihrem Ordner bleiben oder entfernt werden.</translation>
+    </message>
+    <message>
+        <source>Keep Files on This Device</source>
+        <translation>Dateien auf dem Gerät behalten</translation>
+    </message>
+    <message>
+        <source>Remove Files from This Device</source>
+        <translation>Dateien vom Gerät entfernen</translation>
+    </message>
+    <message>
+        <source>Some Documents Stayed on This Device</source>
+        <translation>Einige Dokumente blieben auf diesem Gerät</translation>
+    </message>
+    <message>
+        <source>Not Everything Has Been Sent</source>
+        <translation>Nicht alles wurde gesendet</translation>
+    </message>
+    <message>
+        <source>These are on this device alone, so nothing was removed:</source>
+        <translation>Diese sind nur auf diesem Gerät, daher wurde nichts entfernt:</translation>
+    </message>
+    <message>
+        <source>Keep Files and Sign Out</source>
+        <translation>Dateien behalten und abmelden</translation>
+    </message>
+    <message>
+        <source>Stay Signed In</source>
+        <translation>Angemeldet bleiben</translation>
+    </message>
+    <message>
+        <source>Keep the Password in a File?</source>
+        <translation>Passwort in einer Datei aufbewahren?</translation>
+    </message>
+    <message>
+        <source>It can lie in a file that you alone may read. The file is not encrypted: whoever has this disk in his hands can read it.</source>
+        <translation>Es kann in einer Datei liegen, die nur Sie lesen dürfen. Die Datei ist nicht verschlüsselt: Wer diesen Datenträger in Händen hat, kann sie lesen.</translation>
+    </message>
+    <message>
+        <source>Keep It in a File</source>
+        <translation>In einer Datei aufbewahren</translation>
+    </message>
+    <message>
+        <source>Password for “%1$@”</source>
+        <translation>Passwort für „%1$@“</translation>
+    </message>
+    <message>
+        <source>Password</source>
+        <translation>Passwort</translation>
+    </message>
+    <message>
+        <source>Sign In</source>
+        <translation>Anmelden</translation>
+    </message>
+    <message>
+        <source>Not Now</source>
+        <translation>Nicht jetzt</translation>
+    </message>
+    <message>
+        <source>Server</source>
+        <translation>Server</translation>
+    </message>
+    <message>
+        <source>Your documents stay on a WebDAV server, such as one of your own or your company's.</source>
+        <translation>Ihre Dokumente bleiben auf einem WebDAV-Server, etwa einem eigenen oder dem Ihrer Firma.</translation>
+    </message>
+    <message>
+        <source>Your documents stay in a folder of this machine, of a disk, or of a network.</source>
+        <translation>Ihre Dokumente bleiben in einem Ordner dieses Rechners, eines Laufwerks oder im Netz.</translation>
+    </message>
+    <message>
+        <source>Address</source>
+        <translation>Adresse</translation>
+    </message>
+    <message>
+        <source>Path of the Folder</source>
+        <translation>Pfad des Ordners</translation>
+    </message>
+    <message>
+        <source>User</source>
+        <translation>Benutzer</translation>
+    </message>
+    <message>
+        <source>File of Certificates to Trust</source>
+        <translation>Datei mit vertrauenswürdigen Zertifikaten</translation>
+    </message>
+    <message>
+        <source>Give the address of the server.</source>
+        <translation>Geben Sie die Adresse des Servers an.</translation>
+    </message>
+    <message>
+        <source>Give the folder of the account.</source>
+        <translation>Geben Sie den Ordner des Accounts an.</translation>
+    </message>
+    <message>
+        <source>Give the name of the user.</source>
+        <translation>Geben Sie den Benutzernamen an.</translation>
+    </message>
+    <message>
+        <source>The Way to This Server Is Not Encrypted</source>
+        <translation>Der Weg zu diesem Server ist nicht verschlüsselt</translation>
+    </message>
+    <message>
+        <source>Everybody on the way can read the password and the documents. Use an address that begins with “https://” if the server has one.</source>
+        <translation>Jeder auf dem Weg kann das Passwort und die Dokumente lesen. Verwenden Sie eine Adresse, die mit „https://“ beginnt, wenn der Server eine hat.</translation>
+    </message>
+    <message>
+        <source>Sign In Anyway</source>
+        <translation>Trotzdem anmelden</translation>
+    </message>
+    <message>
+        <source>Looking at the server…</source>
+        <translation>Der Server wird geprüft …</translation>
+    </message>
+    <message>
+        <source>Looking at the folder…</source>
+        <translation>Der Ordner wird geprüft …</translation>
+    </message>
+    <message>
+        <source>Signing in…</source>
+        <translation>Anmeldung läuft …</translation>
+    </message>
+    <message>
+        <source>“%1$@” is not a folder. Make it first, or connect its disk.</source>
+        <translation>„%1$@“ ist kein Ordner. Legen Sie ihn zuerst an oder schließen Sie das Laufwerk an.</translation>
+    </message>
+    <message>
+        <source>The name of that folder is not UTF-8 text. Choose another folder.</source>
+        <translation>Der Name dieses Ordners ist kein UTF-8-Text. Wählen Sie einen anderen Ordner.</translation>
+    </message>
+    <message>
+        <source>“%1$@” holds the stores of accounts themselves. Choose another folder.</source>
+        <translation>„%1$@“ enthält die Speicher der Accounts selbst. Wählen Sie einen anderen Ordner.</translation>
+    </message>
+    <message>
+        <source>“%1$@” lies in the store of an account. Choose another folder.</source>
+        <translation>„%1$@“ liegt im Speicher eines Accounts. Wählen Sie einen anderen Ordner.</translation>
+    </message>
+    <message>
+        <source>There is no file of certificates at “%1$@”.</source>
+        <translation>Unter „%1$@“ liegt keine Datei mit Zertifikaten.</translation>
+    </message>
+    <message>
+        <source>The server lets you read here, and change nothing.</source>
+        <translation>Der Server lässt Sie hier lesen, aber nichts ändern.</translation>
+    </message>
+    <message>
+        <source>No password is kept here for this account.</source>
+        <translation>Für diesen Account wird hier kein Passwort aufbewahrt.</translation>
     </message>
     <!-- The store and its documents -->
     <message>

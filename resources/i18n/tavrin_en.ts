@@ -46,6 +46,34 @@
         </translation>
     </message>
     <message numerus="yes">
+        <source>.DICT.SENDING.%d</source>
+        <translation>
+            <numerusform>Sending %n document</numerusform>
+            <numerusform>Sending %n documents</numerusform>
+        </translation>
+    </message>
+    <message numerus="yes">
+        <source>.DICT.RECEIVING.%d</source>
+        <translation>
+            <numerusform>Receiving %n document</numerusform>
+            <numerusform>Receiving %n documents</numerusform>
+        </translation>
+    </message>
+    <message numerus="yes">
+        <source>.DICT.MORE.%d</source>
+        <translation>
+            <numerusform>and %n more</numerusform>
+            <numerusform>and %n more</numerusform>
+        </translation>
+    </message>
+    <message numerus="yes">
+        <source>.DICT.WAITING.%d</source>
+        <translation>
+            <numerusform>%n document waits</numerusform>
+            <numerusform>%n documents wait</numerusform>
+        </translation>
+    </message>
+    <message numerus="yes">
         <source>.DICT.AVAILABLE.%g</source>
         <translation>
             <numerusform>%@ available</numerusform>

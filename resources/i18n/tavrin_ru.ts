@@ -52,6 +52,38 @@
         </translation>
     </message>
     <message numerus="yes">
+        <source>.DICT.SENDING.%d</source>
+        <translation>
+            <numerusform>Отправляется %n документ</numerusform>
+            <numerusform>Отправляются %n документа</numerusform>
+            <numerusform>Отправляются %n документов</numerusform>
+        </translation>
+    </message>
+    <message numerus="yes">
+        <source>.DICT.RECEIVING.%d</source>
+        <translation>
+            <numerusform>Принимается %n документ</numerusform>
+            <numerusform>Принимаются %n документа</numerusform>
+            <numerusform>Принимаются %n документов</numerusform>
+        </translation>
+    </message>
+    <message numerus="yes">
+        <source>.DICT.MORE.%d</source>
+        <translation>
+            <numerusform>и ещё %n</numerusform>
+            <numerusform>и ещё %n</numerusform>
+            <numerusform>и ещё %n</numerusform>
+        </translation>
+    </message>
+    <message numerus="yes">
+        <source>.DICT.WAITING.%d</source>
+        <translation>
+            <numerusform>%n документ ожидает</numerusform>
+            <numerusform>%n документа ожидают</numerusform>
+            <numerusform>%n документов ожидают</numerusform>
+        </translation>
+    </message>
+    <message numerus="yes">
         <source>.DICT.AVAILABLE.%g</source>
         <translation>
             <numerusform>доступно %@</numerusform>
@@ -775,6 +807,266 @@
     <message>
         <source>The store has work in it that was interrupted. Use it once more, so that it comes to its end, and sign out then.</source>
         <translation>В хранилище осталась прерванная работа. Откройте его ещё раз, чтобы она завершилась, и затем выйдите.</translation>
+    </message>
+    <message>
+        <source>Waits for a network that is not metered. “Sync Now” does not wait.</source>
+        <translation>Ожидает сети без учёта трафика. «Синхронизировать» не ждёт.</translation>
+    </message>
+    <message>
+        <source>Your documents can be on a server, or in a folder such as a disk or a network folder.</source>
+        <translation>Ваши документы могут находиться на сервере или в папке, например на диске или в сети.</translation>
+    </message>
+    <message>
+        <source>Sending “%1$@”</source>
+        <translation>Отправляется «%1$@»</translation>
+    </message>
+    <message>
+        <source>Receiving “%1$@”</source>
+        <translation>Принимается «%1$@»</translation>
+    </message>
+    <message>
+        <source>“%1$@”: %2$@</source>
+        <translation>«%1$@»: %2$@</translation>
+    </message>
+    <message>
+        <source>%1$@ at %2$@</source>
+        <translation>%1$@ на %2$@</translation>
+    </message>
+    <message>
+        <source>Account</source>
+        <translation>Учётная запись</translation>
+    </message>
+    <message>
+        <source>On Its Way</source>
+        <translation>В пути</translation>
+    </message>
+    <message>
+        <source>Waiting</source>
+        <translation>Ожидает</translation>
+    </message>
+    <message>
+        <source>Sync Now</source>
+        <translation>Синхронизировать</translation>
+    </message>
+    <message>
+        <source>Sign In to Another Account…</source>
+        <translation>Войти в другую учётную запись…</translation>
+    </message>
+    <message>
+        <source>Sign Out…</source>
+        <translation>Выйти…</translation>
+    </message>
+    <message>
+        <source>The Password Is Wanted</source>
+        <translation>Нужен пароль</translation>
+    </message>
+    <message>
+        <source>Enter Password…</source>
+        <translation>Ввести пароль…</translation>
+    </message>
+    <message>
+        <source>Delete on Both Sides</source>
+        <translation>Удалить с обеих сторон</translation>
+    </message>
+    <message>
+        <source>Changed on Both Sides</source>
+        <translation>Изменено с обеих сторон</translation>
+    </message>
+    <message>
+        <source>Show the First</source>
+        <translation>Показать первый</translation>
+    </message>
+    <message>
+        <source>Names That Cannot Be Kept</source>
+        <translation>Недопустимые имена</translation>
+    </message>
+    <message>
+        <source>Use “%1$@”</source>
+        <translation>Использовать «%1$@»</translation>
+    </message>
+    <message>
+        <source>The server does not accept the password that is kept here. Nothing is sent or received before it has the right one.</source>
+        <translation>Сервер не принимает сохранённый здесь пароль. Ничего не отправляется и не принимается, пока не указан верный.</translation>
+    </message>
+    <message>
+        <source>Both versions are kept side by side. Compare them and delete the one that you do not want.</source>
+        <translation>Обе версии сохранены рядом. Сравните их и удалите ненужную.</translation>
+    </message>
+    <message>
+        <source>Comparing both sides…</source>
+        <translation>Сравнение обеих сторон…</translation>
+    </message>
+    <message>
+        <source>Something waits. It is tried again by itself.</source>
+        <translation>Что-то ожидает. Попытка повторится сама.</translation>
+    </message>
+    <message>
+        <source>Everything is on both sides.</source>
+        <translation>Всё есть на обеих сторонах.</translation>
+    </message>
+    <message>
+        <source>Sign In to a Server…</source>
+        <translation>Войти на сервер…</translation>
+    </message>
+    <message>
+        <source>Use a Folder…</source>
+        <translation>Использовать папку…</translation>
+    </message>
+    <message>
+        <source>Sign Out of “%1$@”?</source>
+        <translation>Выйти из «%1$@»?</translation>
+    </message>
+    <message>
+        <source>The account keeps its documents. Those on this device can stay in their folder or be removed.</source>
+        <translation>Документы останутся в учётной записи. Те, что на этом устройстве, можно оставить в папке или удалить.</translation>
+    </message>
+    <message>
+        <source>Keep Files on This Device</source>
+        <translation>Оставить файлы на устройстве</translation>
+    </message>
+    <message>
+        <source>Remove Files from This Device</source>
+        <translation>Удалить файлы с устройства</translation>
+    </message>
+    <message>
+        <source>Some Documents Stayed on This Device</source>
+        <translation>Некоторые документы остались на устройстве</translation>
+    </message>
+    <message>
+        <source>Not Everything Has Been Sent</source>
+        <translation>Отправлено не всё</translation>
+    </message>
+    <message>
+        <source>These are on this device alone, so nothing was removed:</source>
+        <translation>Эти документы есть только на этом устройстве, поэтому ничего не удалено:</translation>
+    </message>
+    <message>
+        <source>Keep Files and Sign Out</source>
+        <translation>Оставить файлы и выйти</translation>
+    </message>
+    <message>
+        <source>Stay Signed In</source>
+        <translation>Не выходить</translation>
+    </message>
+    <message>
+        <source>Keep the Password in a File?</source>
+        <translation>Хранить пароль в файле?</translation>
+    </message>
+    <message>
+        <source>It can lie in a file that you alone may read. The file is not encrypted: whoever has this disk in his hands can read it.</source>
+        <translation>Его можно хранить в файле, доступном только вам. Файл не зашифрован: его прочтёт любой, у кого в руках этот диск.</translation>
+    </message>
+    <message>
+        <source>Keep It in a File</source>
+        <translation>Хранить в файле</translation>
+    </message>
+    <message>
+        <source>Password for “%1$@”</source>
+        <translation>Пароль для «%1$@»</translation>
+    </message>
+    <message>
+        <source>Password</source>
+        <translation>Пароль</translation>
+    </message>
+    <message>
+        <source>Sign In</source>
+        <translation>Войти</translation>
+    </message>
+    <message>
+        <source>Not Now</source>
+        <translation>Не сейчас</translation>
+    </message>
+    <message>
+        <source>Server</source>
+        <translation>Сервер</translation>
+    </message>
+    <message>
+        <source>Your documents stay on a WebDAV server, such as one of your own or your company's.</source>
+        <translation>Документы остаются на сервере WebDAV, например вашем собственном или вашей компании.</translation>
+    </message>
+    <message>
+        <source>Your documents stay in a folder of this machine, of a disk, or of a network.</source>
+        <translation>Документы остаются в папке этого компьютера, диска или сети.</translation>
+    </message>
+    <message>
+        <source>Address</source>
+        <translation>Адрес</translation>
+    </message>
+    <message>
+        <source>Path of the Folder</source>
+        <translation>Путь к папке</translation>
+    </message>
+    <message>
+        <source>User</source>
+        <translation>Пользователь</translation>
+    </message>
+    <message>
+        <source>File of Certificates to Trust</source>
+        <translation>Файл доверенных сертификатов</translation>
+    </message>
+    <message>
+        <source>Give the address of the server.</source>
+        <translation>Укажите адрес сервера.</translation>
+    </message>
+    <message>
+        <source>Give the folder of the account.</source>
+        <translation>Укажите папку учётной записи.</translation>
+    </message>
+    <message>
+        <source>Give the name of the user.</source>
+        <translation>Укажите имя пользователя.</translation>
+    </message>
+    <message>
+        <source>The Way to This Server Is Not Encrypted</source>
+        <translation>Соединение с этим сервером не зашифровано</translation>
+    </message>
+    <message>
+        <source>Everybody on the way can read the password and the documents. Use an address that begins with “https://” if the server has one.</source>
+        <translation>Любой на пути может прочитать пароль и документы. Используйте адрес, начинающийся с «https://», если он есть у сервера.</translation>
+    </message>
+    <message>
+        <source>Sign In Anyway</source>
+        <translation>Всё равно войти</translation>
+    </message>
+    <message>
+        <source>Looking at the server…</source>
+        <translation>Проверка сервера…</translation>
+    </message>
+    <message>
+        <source>Looking at the folder…</source>
+        <translation>Проверка папки…</translation>
+    </message>
+    <message>
+        <source>Signing in…</source>
+        <translation>Выполняется вход…</translation>
+    </message>
+    <message>
+        <source>“%1$@” is not a folder. Make it first, or connect its disk.</source>
+        <translation>«%1$@» — не папка. Сначала создайте её или подключите диск.</translation>
+    </message>
+    <message>
+        <source>The name of that folder is not UTF-8 text. Choose another folder.</source>
+        <translation>Имя этой папки — не текст UTF-8. Выберите другую папку.</translation>
+    </message>
+    <message>
+        <source>“%1$@” holds the stores of accounts themselves. Choose another folder.</source>
+        <translation>В «%1$@» лежат сами хранилища учётных записей. Выберите другую папку.</translation>
+    </message>
+    <message>
+        <source>“%1$@” lies in the store of an account. Choose another folder.</source>
+        <translation>«%1$@» находится в хранилище учётной записи. Выберите другую папку.</translation>
+    </message>
+    <message>
+        <source>There is no file of certificates at “%1$@”.</source>
+        <translation>По пути «%1$@» нет файла сертификатов.</translation>
+    </message>
+    <message>
+        <source>The server lets you read here, and change nothing.</source>
+        <translation>Сервер разрешает здесь чтение, но не изменения.</translation>
+    </message>
+    <message>
+        <source>No password is kept here for this account.</source>
+        <translation>Для этой учётной записи здесь не сохранён пароль.</translation>
     </message>
     <!-- The store and its documents -->
     <message>

@@ -5,6 +5,8 @@
 #include "platform/cloud/AccountFile.h"
 #include "platform/cloud/CloudAccountService.h"
 #include "platform/system/ReachabilityService.h"
+#include "platform/system/SecretFile.h"
+#include "platform/system/SecretStore.h"
 #include "services/NetworkWatcher.h"
 #include "tests/product/LogCapture.h"
 
@@ -29,6 +31,30 @@ struct DeskWithoutApplications {
     TemporaryFolder share;
 };
 
+/// The file alone: the keyring of whoever runs the tests is none of their business.
+class SecretsWithoutKeyring final : public platform::SecretStore {
+public:
+    explicit SecretsWithoutKeyring(std::string file) : file_(std::move(file)) {}
+    bool hasKeyring() override { return false; }
+    bool isInFile(const std::string& account) override {
+        const auto kept = file_.lookUp(account);
+        return kept && *kept;
+    }
+    platform::Result<std::optional<std::string>> lookUp(const std::string& account) override {
+        return file_.lookUp(account);
+    }
+    platform::Failure store(const std::string& account, const std::string& /*label*/,
+                            const std::string& secret, platform::SecretPlace place) override {
+        if (place == platform::SecretPlace::keyring)
+            return platform::makeError(platform::ErrorCode::unsupportedOperation);
+        return file_.store(account, secret);
+    }
+    platform::Failure remove(const std::string& account) override { return file_.remove(account); }
+
+private:
+    platform::SecretFile file_;
+};
+
 } // namespace
 
 ProductHouse::ProductHouse() {
@@ -37,6 +63,8 @@ ProductHouse::ProductHouse() {
     adjustParts = [this](platform::PlatformParts& parts) {
         parts.jot = std::make_unique<CapturingJot>();
         parts.reachability = platform::makeScriptedReachability("file:" + (home / networkScript));
+        parts.secrets =
+            std::make_shared<SecretsWithoutKeyring>(home / "config/pelmora/secrets.json");
         parts.markerExists = [](const std::string&) { return false; };
         parts.managedSettingsFile = home / "managed-settings.json";
     };

@@ -109,6 +109,16 @@ TEST_F(Reach, everythingThatCanBeUsedHasANameOnEveryScreen) {
     press(Qt::Key_F, Qt::ControlModifier);
     EXPECT_THAT(nameless(), IsEmpty()) << "search";
     closePresented();
+    nav().showAccount();
+    advance(1s);
+    EXPECT_THAT(nameless(), IsEmpty()) << "account";
+    nav().showSignIn(tavrin::SignInViewController::Kind::server);
+    advance(1s);
+    EXPECT_THAT(nameless(), IsEmpty()) << "sign-in";
+    EXPECT_THAT(stops(), ElementsAre("Address", "User", "Password", "Sign In", "Cancel", "Back, Account"));
+    nav().popViewController(false);
+    nav().popViewController(false);
+    advance(1s);
     nav().showMoveTargetForItems({row("Report.txt")}, list()->presentedURL());
     advance(1s);
     EXPECT_THAT(nameless(), IsEmpty()) << "move";

@@ -3,6 +3,7 @@
 
 #include "platform/base/Text.h"
 #include "platform/cloud/CloudDocumentService.h"
+#include "platform/cloud/TransferActivity.h"
 #include "platform/documents/DocumentSearchController.h"
 #include "platform/files/FileCoordinator.h"
 #include "preview/PreviewDownloadViewController.h"
@@ -208,6 +209,34 @@ void signedOut(const Look& look) {
     house.launch(look.size);
     house.calmDown();
     house.savePicture(folder + "/nobody-" + look.name + ".png");
+    using Kind = tavrin::SignInViewController::Kind;
+    for (const auto& [kind, name] : {std::pair{Kind::server, "server"}, {Kind::folder, "folder"}}) {
+        house.nav().showSignIn(kind);
+        house.advance(1s);
+        house.tap(*house.button(platform::localized("Sign In"))); // with nothing filled in
+        house.advance(1s);
+        house.savePicture(folder + "/sign-in-" + name + "-" + look.name + ".png", look.scale);
+        house.nav().popViewController(false);
+        house.advance(1s);
+    }
+}
+
+/// What goes on with the account while a document comes.
+void account(const Look& look) {
+    std::future<void> fetching; // ends with the tour's platform
+    Tour tour(look, 6'291'456 / 10);
+    fetching = std::async(std::launch::async, [item = tour.url("Coast Panorama.png")] {
+        (void)platform::FileCoordinator().coordinateReading(item, {}, [](const platform::Url&) {});
+    });
+    tour.until([&] { return !tour.platform->cloud().transfers().empty(); });
+    tour.advance(2s);
+    tour.nav().showAccount();
+    tour.advance(1s);
+    tour.calmDown();
+    tour.picture("account");
+    tour.tap(*tour.button(platform::localized("Sign Out…")));
+    tour.advance(1s);
+    tour.picture("account-sign-out");
 }
 
 void show(const Look& look) {
@@ -240,10 +269,13 @@ int main(int argc, char** argv) {
          {phone, turned, tablet, arabic, Look{"phone-small", {360, 640}, "de_DE"},
           Look{"tablet-arabic", {768, 1024}, "ar_EG"}})
         details(look);
+    account(turned);
+    signedOut(turned);
     details({"phone-large-text", {360, 640}}, 2);
     details({"phone-landscape-large-text", {844, 390}}, 2);
     for (const Look& look : {phone, tablet, german, arabic}) {
         download(look);
+        account(look);
         signedOut(look);
     }
     return 0;
