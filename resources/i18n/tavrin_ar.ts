@@ -1385,38 +1385,6 @@
         <source>The folder “%1$@” belongs to somebody else. Remove it, or have it removed, and start again.</source>
         <translation>المجلد «&#x2068;%1$@&#x2069;» يخص شخصًا آخر. أزله أو اطلب إزالته، ثم شغّل البرنامج من جديد.</translation>
     </message>
-</context>
-<!-- The menu of a text field is the toolkit's own. -->
-<context>
-    <name>QLineEdit</name>
-    <message>
-        <source>&amp;Undo</source>
-        <translation>&amp;تراجع</translation>
-    </message>
-    <message>
-        <source>&amp;Redo</source>
-        <translation>إ&amp;عادة</translation>
-    </message>
-    <message>
-        <source>Cu&amp;t</source>
-        <translation>&amp;قص</translation>
-    </message>
-    <message>
-        <source>&amp;Copy</source>
-        <translation>&amp;نسخ</translation>
-    </message>
-    <message>
-        <source>&amp;Paste</source>
-        <translation>&amp;لصق</translation>
-    </message>
-    <message>
-        <source>Delete</source>
-        <translation>حذف</translation>
-    </message>
-    <message>
-        <source>Select All</source>
-        <translation>تحديد الكل</translation>
-    </message>
     <!-- A WebDAV server -->
     <message>
         <source>This is not the address of a server. It begins with “https://”.</source>
@@ -1561,6 +1529,38 @@
     <message>
         <source>The server has a fault of its own and does not answer for “%1$@”. It is tried again.</source>
         <translation>في الخادم خلل ولا يجيب عن «%1$@». ستُعاد المحاولة.</translation>
+    </message>
+</context>
+<!-- The menu of a text field is the toolkit's own. -->
+<context>
+    <name>QLineEdit</name>
+    <message>
+        <source>&amp;Undo</source>
+        <translation>&amp;تراجع</translation>
+    </message>
+    <message>
+        <source>&amp;Redo</source>
+        <translation>إ&amp;عادة</translation>
+    </message>
+    <message>
+        <source>Cu&amp;t</source>
+        <translation>&amp;قص</translation>
+    </message>
+    <message>
+        <source>&amp;Copy</source>
+        <translation>&amp;نسخ</translation>
+    </message>
+    <message>
+        <source>&amp;Paste</source>
+        <translation>&amp;لصق</translation>
+    </message>
+    <message>
+        <source>Delete</source>
+        <translation>حذف</translation>
+    </message>
+    <message>
+        <source>Select All</source>
+        <translation>تحديد الكل</translation>
     </message>
 </context>
 </TS>

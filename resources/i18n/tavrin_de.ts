@@ -1341,38 +1341,6 @@
         <source>The folder “%1$@” belongs to somebody else. Remove it, or have it removed, and start again.</source>
         <translation>Der Ordner „%1$@“ gehört jemand anderem. Entfernen Sie ihn oder lassen Sie ihn entfernen, und starten Sie erneut.</translation>
     </message>
-</context>
-<!-- The menu of a text field is the toolkit's own. -->
-<context>
-    <name>QLineEdit</name>
-    <message>
-        <source>&amp;Undo</source>
-        <translation>&amp;Rückgängig</translation>
-    </message>
-    <message>
-        <source>&amp;Redo</source>
-        <translation>&amp;Wiederherstellen</translation>
-    </message>
-    <message>
-        <source>Cu&amp;t</source>
-        <translation>&amp;Ausschneiden</translation>
-    </message>
-    <message>
-        <source>&amp;Copy</source>
-        <translation>&amp;Kopieren</translation>
-    </message>
-    <message>
-        <source>&amp;Paste</source>
-        <translation>&amp;Einfügen</translation>
-    </message>
-    <message>
-        <source>Delete</source>
-        <translation>Löschen</translation>
-    </message>
-    <message>
-        <source>Select All</source>
-        <translation>Alles auswählen</translation>
-    </message>
     <!-- A WebDAV server -->
     <message>
         <source>This is not the address of a server. It begins with “https://”.</source>
@@ -1517,6 +1485,38 @@
     <message>
         <source>The server has a fault of its own and does not answer for “%1$@”. It is tried again.</source>
         <translation>Der Server hat einen eigenen Fehler und antwortet nicht für „%1$@“. Es wird wieder versucht.</translation>
+    </message>
+</context>
+<!-- The menu of a text field is the toolkit's own. -->
+<context>
+    <name>QLineEdit</name>
+    <message>
+        <source>&amp;Undo</source>
+        <translation>&amp;Rückgängig</translation>
+    </message>
+    <message>
+        <source>&amp;Redo</source>
+        <translation>&amp;Wiederherstellen</translation>
+    </message>
+    <message>
+        <source>Cu&amp;t</source>
+        <translation>&amp;Ausschneiden</translation>
+    </message>
+    <message>
+        <source>&amp;Copy</source>
+        <translation>&amp;Kopieren</translation>
+    </message>
+    <message>
+        <source>&amp;Paste</source>
+        <translation>&amp;Einfügen</translation>
+    </message>
+    <message>
+        <source>Delete</source>
+        <translation>Löschen</translation>
+    </message>
+    <message>
+        <source>Select All</source>
+        <translation>Alles auswählen</translation>
     </message>
 </context>
 </TS>

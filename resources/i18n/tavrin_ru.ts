@@ -1352,38 +1352,6 @@
         <source>The folder “%1$@” belongs to somebody else. Remove it, or have it removed, and start again.</source>
         <translation>Папка «%1$@» принадлежит другому пользователю. Удалите её (или попросите удалить) и запустите программу снова.</translation>
     </message>
-</context>
-<!-- The menu of a text field is the toolkit's own. -->
-<context>
-    <name>QLineEdit</name>
-    <message>
-        <source>&amp;Undo</source>
-        <translation>&amp;Отменить</translation>
-    </message>
-    <message>
-        <source>&amp;Redo</source>
-        <translation>&amp;Повторить</translation>
-    </message>
-    <message>
-        <source>Cu&amp;t</source>
-        <translation>&amp;Вырезать</translation>
-    </message>
-    <message>
-        <source>&amp;Copy</source>
-        <translation>&amp;Скопировать</translation>
-    </message>
-    <message>
-        <source>&amp;Paste</source>
-        <translation>Вст&amp;авить</translation>
-    </message>
-    <message>
-        <source>Delete</source>
-        <translation>Удалить</translation>
-    </message>
-    <message>
-        <source>Select All</source>
-        <translation>Выбрать всё</translation>
-    </message>
     <!-- A WebDAV server -->
     <message>
         <source>This is not the address of a server. It begins with “https://”.</source>
@@ -1528,6 +1496,38 @@
     <message>
         <source>The server has a fault of its own and does not answer for “%1$@”. It is tried again.</source>
         <translation>На сервере неполадка, и по адресу «%1$@» он не отвечает. Попытка будет повторена.</translation>
+    </message>
+</context>
+<!-- The menu of a text field is the toolkit's own. -->
+<context>
+    <name>QLineEdit</name>
+    <message>
+        <source>&amp;Undo</source>
+        <translation>&amp;Отменить</translation>
+    </message>
+    <message>
+        <source>&amp;Redo</source>
+        <translation>&amp;Повторить</translation>
+    </message>
+    <message>
+        <source>Cu&amp;t</source>
+        <translation>&amp;Вырезать</translation>
+    </message>
+    <message>
+        <source>&amp;Copy</source>
+        <translation>&amp;Скопировать</translation>
+    </message>
+    <message>
+        <source>&amp;Paste</source>
+        <translation>Вст&amp;авить</translation>
+    </message>
+    <message>
+        <source>Delete</source>
+        <translation>Удалить</translation>
+    </message>
+    <message>
+        <source>Select All</source>
+        <translation>Выбрать всё</translation>
     </message>
 </context>
 </TS>
