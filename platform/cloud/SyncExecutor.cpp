@@ -84,7 +84,8 @@ SyncExecutor::Outcome SyncExecutor::run(const std::vector<SyncStep>& steps) {
     CancelFlag own;
     const Failure failure = flush(own);
     const std::lock_guard lock(mutex_);
-    if (failure && !outcome_.stopped)
+    // What turned out not to be ours is no agreement, and is looked at anew: no reason to stop.
+    if (failure && !outcome_.stopped && !failure->is(ErrorCode::changedRemotely))
         outcome_.stopped = failure;
     return std::move(outcome_);
 }

@@ -70,7 +70,7 @@ private:
         step("Starts Tavrin with nobody signed in: it says what to do.");
         person_.launch();
         person_.reads("Pelmora is not enabled");
-        person_.reads("pelmora sign-in folder PATH");
+        person_.reads("Your documents can be on a server");
     }
 
     void signIn() {

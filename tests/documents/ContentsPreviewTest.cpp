@@ -245,9 +245,10 @@ struct Children : ::testing::Test {
         return std::async(std::launch::async, [this, script] {
             return runChild({{"sh", "-c", script}, "/"}, *token, clock, 5s,
                             [this](std::string_view bytes) {
-                                if (output.empty() && !bytes.empty())
-                                    spoke.set_value();
+                                const bool first = output.empty() && !bytes.empty();
                                 output += bytes;
+                                if (first)
+                                    spoke.set_value();
                                 return true;
                             });
         });

@@ -294,7 +294,7 @@ TEST_F(Download, takesAFloodOfReportsOnceAFrame) {
     advance(16ms);
     EXPECT_EQ(shown.text(), "9 KB of 10 KB") << "it waits for the next step of the pie";
     advance(34ms);
-    EXPECT_EQ(shown.text(), "9.5 KB of 10 KB");
+    EXPECT_EQ(shown.text(), "10 KB of 10 KB");
 }
 
 /// The widgets alone, on the screen of nobody's store.

@@ -62,6 +62,9 @@ struct Watching : HouseTest {
         };
         withoutAccount();
         tavrin::VXSetLogLevel(tavrin::vxInfo);
+        // The store's own target, made before.
+        network->hosts.clear();
+        network->living = 0;
     }
     PlayedNetwork* network = nullptr;
 };
